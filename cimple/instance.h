@@ -1,0 +1,202 @@
+// Instances: the head of every generated structure, and the generic operations on them.
+//
+// A generated structure derives from its base class's structure and adds the members the class
+// declares, so a VLNMPCA_Card* is a CIM_Card* is an Instance*. Instances live on the heap, are made by
+// create or clone, and are counted: whoever gets one from an operation here owns one count. None of
+// these operations locks; an instance that two threads share must not be written.
+#ifndef CIMPLE_INSTANCE_H
+#define CIMPLE_INSTANCE_H
+
+#include "cimple/array.h"
+#include "cimple/assert.h"
+#include "cimple/datetime.h"
+#include "cimple/meta.h"
+#include "cimple/string.h"
+
+#include <cstdio>
+
+namespace cimple {
+
+// A value followed by its null flag. A nulled property keeps a valid, empty value.
+template <class T>
+struct Property {
+    T value;
+    uint8 null;
+
+    void set(const T& v) {
+        value = v;
+        null = 0;
+    }
+    void clear() {
+        value = T();
+        null = 1;
+    }
+    // Appends to an array property and makes it non-null.
+    template <class U>
+    void append(const U& item) {
+        value.append(item);
+        null = 0;
+    }
+    bool is_null() const { return null != 0; }
+};
+
+inline constexpr uint32 INSTANCE_MAGIC = 0xF00DFACE;
+
+struct Instance {
+    uint32 __magic;
+    mutable Atomic __refs;
+    // For a method instance this is the Meta_Method seen as a class: only what Meta_Features holds
+    // may be read through it then, as its flag Method tells.
+    const Meta_Class* __meta_class;
+    String __name_space;
+
+    // The pseudo-class "Instance", ancestor of every class.
+    static const Meta_Class static_meta_class;
+
+    Instance() = delete; // create and clone make instances
+    ~Instance() = delete;
+    Instance(const Instance&) = delete;
+    Instance& operator=(const Instance&) = delete;
+};
+
+// ---- Life ----
+
+// A new instance. Without defaults every member is zero or empty and not null; with defaults a
+// property takes its default, and is null without one. Throws std::bad_alloc.
+Instance* create(const Meta_Class* meta_class, bool defaults = false);
+// Deep copy with a count of its own; references are cloned, nulls stay null.
+Instance* clone(const Instance* instance);
+void ref(const Instance* instance) noexcept;
+// Drops one count and destroys at zero. A null pointer is allowed here and in destroy.
+void unref(const Instance* instance) noexcept;
+// Tears down and frees whatever the count.
+void destroy(Instance* instance) noexcept;
+
+template <class T>
+T* create(bool defaults = false) {
+    return static_cast<T*>(create(&T::static_meta_class, defaults));
+}
+
+// A new instance with every property null, as map builders start from.
+template <class T>
+T* create_null();
+
+// The instance as a T, or null if its class is no subclass of T's.
+template <class T>
+T* cast(Instance* instance) {
+    return instance && is_subclass(&T::static_meta_class, instance->__meta_class)
+               ? static_cast<T*>(instance)
+               : nullptr;
+}
+template <class T>
+const T* cast(const Instance* instance) {
+    return cast<T>(const_cast<Instance*>(instance));
+}
+
+// ---- Contents ----
+
+// Copies value and null flag of each feature, references as clones; features that are null in model
+// are skipped. Does nothing unless dest and src are of one class.
+void copy(Instance* dest, const Instance* src, const Instance* model = nullptr);
+void copy_keys(Instance* dest, const Instance* src);
+// Sets the null flag of the selected members to value; references are emptied when value is non-zero.
+void nullify(Instance* instance, bool keys, bool non_keys, uint8 value = 1);
+void nullify_keys(Instance* instance);
+void nullify_non_keys(Instance* instance);
+void clear(Instance* instance);
+// Sets the namespace of the instance and of everything it references; an existing one stays unless
+// overwrite is set.
+void set_name_space_recursive(Instance* instance, const char* name_space, bool overwrite);
+// Leaves non-null what the list (null-terminated; null: everything) names, and keys if keep_keys.
+// Answers -1 for a name that is neither property nor reference.
+int filter_properties(Instance* instance, const char* const* names, bool keep_keys);
+// A new instance of the class with everything null but the keys, copied from source.
+Instance* create_model(const Meta_Class* meta_class, const Instance* source);
+
+// ---- Comparison ----
+
+bool keys_all_set(const Instance* instance);
+// Equal keys; the classes may differ as long as they name the same keys, so a subclass instance
+// matches a base-class key.
+bool key_eq(const Instance* a, const Instance* b);
+// A hash with this property: key_eq(a, b) implies key_hash(a) == key_hash(b).
+std::size_t key_hash(const Instance* instance);
+bool identical(const Instance* a, const Instance* b);
+// Whether a scalar reference of the association points to the instance; an empty or null role means
+// any reference.
+bool is_reference_to(const Instance* association, const Instance* instance, const char* role);
+
+// ---- Text ----
+
+// "Class.key=value,key=value" to an instance of a class of meta_class's repository, null on any fault.
+Instance* model_path_to_instance(const Meta_Class* meta_class, const char* path);
+// The reverse; 0, or -1 for a class without keys or a null or array key.
+int instance_to_model_path(const Instance* instance, String& out);
+void print(const Instance* instance, std::FILE* stream = stdout, bool keys_only = false);
+
+// ---- Members by description ----
+
+inline const void* member(const Instance* instance, uint32 offset) {
+    return reinterpret_cast<const char*>(instance) + offset;
+}
+inline void* member(Instance* instance, uint32 offset) {
+    return reinterpret_cast<char*>(instance) + offset;
+}
+// The null flag of a property, or of an array of references.
+uint8* null_flag(Instance* instance, const Meta_Feature* feature);
+const uint8* null_flag(const Instance* instance, const Meta_Feature* feature);
+// A feature's value is null: its flag, or the null pointer of a scalar reference.
+bool is_null(const Instance* instance, const Meta_Feature* feature);
+// The pointer of a scalar reference member.
+Instance*& reference(Instance* instance, const Meta_Reference* feature);
+Instance* reference(const Instance* instance, const Meta_Reference* feature);
+
+template <class T>
+T* create_null() {
+    T* instance = create<T>();
+    nullify(instance, true, true);
+    return instance;
+}
+
+// A counted pointer. Made from a raw pointer it takes over the caller's count, and holds null if the
+// instance is not of T's class.
+template <class T>
+class Ref {
+public:
+    Ref() noexcept = default;
+    Ref(Instance* instance) noexcept : _ptr(cast<T>(instance)) {
+        if (instance && !_ptr)
+            unref(instance);
+    }
+    Ref(const Ref& other) noexcept : _ptr(other._ptr) {
+        if (_ptr)
+            cimple::ref(_ptr);
+    }
+    Ref(Ref&& other) noexcept : _ptr(other._ptr) { other._ptr = nullptr; }
+    ~Ref() { unref(_ptr); }
+    Ref& operator=(Ref other) noexcept {
+        T* mine = _ptr;
+        _ptr = other._ptr;
+        other._ptr = mine;
+        return *this;
+    }
+
+    T* get() const noexcept { return _ptr; }
+    T* operator->() const noexcept { return _ptr; }
+    T& operator*() const noexcept { return *_ptr; }
+    explicit operator bool() const noexcept { return _ptr != nullptr; }
+    // Hands the count to the caller.
+    T* release() noexcept {
+        T* mine = _ptr;
+        _ptr = nullptr;
+        return mine;
+    }
+    void reset(T* instance = nullptr) noexcept { *this = Ref(instance); }
+
+private:
+    T* _ptr = nullptr;
+};
+
+} // namespace cimple
+
+#endif // CIMPLE_INSTANCE_H

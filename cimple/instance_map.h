@@ -1,0 +1,58 @@
+// A store: instances of one class in insertion order, found by their keys.
+//
+// The store owns its members. Its operations answer the status numbers of providers directly. Not
+// locked: the owner's mutex guards it.
+#ifndef CIMPLE_INSTANCE_MAP_H
+#define CIMPLE_INSTANCE_MAP_H
+
+#include "cimple/registration.h"
+
+#include <memory>
+
+namespace cimple {
+
+class Instance_Map_Base {
+public:
+    explicit Instance_Map_Base(const Meta_Class* meta_class);
+    ~Instance_Map_Base();
+    Instance_Map_Base(const Instance_Map_Base&) = delete;
+    Instance_Map_Base& operator=(const Instance_Map_Base&) = delete;
+
+    const Meta_Class* meta_class() const noexcept { return _meta_class; }
+    uint32 size() const noexcept;
+    Instance* at(uint32 index) const noexcept;
+
+    sint32 find(const Instance* keys) const; // index or -1
+    Instance* lookup(const Instance* keys) const; // borrowed, or null
+
+    // Provider-visible operations. What goes in is copied, what comes out is the caller's.
+    sint32 get_instance(const Instance* keys, Instance*& out) const; // 0 or 60
+    sint32 enum_instances(const Enum_Instances_Handler& handler) const; // 0
+    sint32 create_instance(const Instance* instance); // 0 or 80
+    sint32 delete_instance(const Instance* keys); // 0 or 90
+    sint32 modify_instance(const Instance* model, const Instance* instance); // 0 or 100
+
+    // Takes over the instance and answers its index; -1 if its key is present: then the caller keeps it.
+    sint32 insert(Instance* instance);
+    // Takes the slot out without destroying its instance; a bad index is ignored.
+    void remove(uint32 index);
+    void clear() noexcept; // destroys all members
+
+private:
+    struct Key_Index; // hash of the key values to positions
+    const Meta_Class* _meta_class;
+    Array<Instance*> _members;
+    std::unique_ptr<Key_Index> _index;
+};
+
+template <class T>
+class Instance_Map : public Instance_Map_Base {
+public:
+    Instance_Map() : Instance_Map_Base(&T::static_meta_class) {}
+    T* operator[](uint32 index) const noexcept { return static_cast<T*>(at(index)); }
+    T* lookup(const Instance* keys) const { return static_cast<T*>(Instance_Map_Base::lookup(keys)); }
+};
+
+} // namespace cimple
+
+#endif // CIMPLE_INSTANCE_MAP_H

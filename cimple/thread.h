@@ -1,0 +1,103 @@
+// Mutexes, conditions, threads, clocks: a thin layer over POSIX threads.
+#ifndef CIMPLE_THREAD_H
+#define CIMPLE_THREAD_H
+
+#include "cimple/types.h"
+
+#include <pthread.h>
+
+namespace cimple {
+
+// A mutex with an optional place in a lock order. In builds with CIMPLE_CHECK_LOCKS a thread that
+// takes a ranked mutex while it holds one of the same or a higher rank ends the process with both
+// names; rank 0 takes no part in the order.
+class Mutex {
+public:
+    explicit Mutex(bool recursive = false, int rank = 0, const char* name = "");
+    ~Mutex();
+    Mutex(const Mutex&) = delete;
+    Mutex& operator=(const Mutex&) = delete;
+
+    void lock();    // a failure ends the process
+    int try_lock(); // 0, 16 (EBUSY) or -1
+    void unlock();
+
+    // std::lock_guard and friends may be used with it.
+
+private:
+    friend class Cond;
+    pthread_mutex_t _mutex;
+    int _rank;
+    const char* _name;
+};
+
+class Auto_Mutex {
+public:
+    explicit Auto_Mutex(Mutex& mutex) : _mutex(&mutex) { mutex.lock(); }
+    ~Auto_Mutex() { unlock(); }
+    Auto_Mutex(const Auto_Mutex&) = delete;
+    Auto_Mutex& operator=(const Auto_Mutex&) = delete;
+    void unlock() {
+        if (_mutex)
+            _mutex->unlock();
+        _mutex = nullptr;
+    }
+
+private:
+    Mutex* _mutex;
+};
+
+class Cond {
+public:
+    Cond();
+    ~Cond();
+    Cond(const Cond&) = delete;
+    Cond& operator=(const Cond&) = delete;
+
+    void signal();
+    void broadcast();
+    // One wait, no time-out, no loop: the caller tests its condition itself.
+    void wait(Mutex& mutex);
+
+private:
+    pthread_cond_t _cond;
+};
+
+using Thread_Proc = void* (*)(void* argument);
+
+class Thread {
+public:
+    Thread() noexcept = default;
+
+    // Starts a thread; 0 or the error of pthread_create. Started on a thread that has a context, the
+    // new thread gets one of its own and is attached to the object manager around its function.
+    static int create_joinable(Thread& thread, Thread_Proc proc, void* argument);
+    static int create_detached(Thread& thread, Thread_Proc proc, void* argument);
+
+    static int join(Thread& thread, void*& value); // value is 0 before the join
+    [[noreturn]] static void exit(void* value);
+    static Thread self();
+    friend bool operator==(const Thread& a, const Thread& b) {
+        return pthread_equal(a._thread, b._thread) != 0;
+    }
+
+private:
+    pthread_t _thread{};
+};
+
+// The process's clock. Tests replace it; the product never does.
+class Time {
+public:
+    static uint64 now();            // microseconds since the epoch, 0 if the clock fails
+    static void sleep(uint64 usec); // a signal ends it early
+
+    struct Clock {
+        uint64 (*now)();
+        void (*sleep)(uint64 usec);
+    };
+    static void replace_clock(const Clock* clock); // null: the system's own
+};
+
+} // namespace cimple
+
+#endif // CIMPLE_THREAD_H

@@ -1,7 +1,9 @@
 // Arrays of property values: an untyped core driven by traits, and a thin typed wrapper.
 //
-// One handle. The array owns its elements: copying it copies every element by its traits. Elements of
-// an array of references are plain pointers that the array does not count.
+// One handle. The array owns its elements: copying it copies every element by its traits. Elements
+// of an array of references are plain pointers that the array does not count. An empty array that
+// was never written to owns no memory. Allocation failure throws std::bad_alloc and changes
+// nothing.
 #ifndef CIMPLE_ARRAY_H
 #define CIMPLE_ARRAY_H
 
@@ -16,8 +18,9 @@ class Datetime;
 struct Instance;
 struct Array_Rep; // traits, size, capacity, elements
 
+// All elements are relocatable: the core moves them by their bytes.
 struct Array_Traits {
-    uint32 size;                                 // bytes of an element
+    uint32 size;                                   // bytes of an element
     void (*construct)(void* to, const void* from); // null: plain copy
     void (*destruct)(void* element);               // null: nothing
     bool (*equal)(const void* a, const void* b);   // null: byte comparison
@@ -28,7 +31,7 @@ const Array_Traits* array_traits(uint32 type);
 
 class Array_Base {
 public:
-    explicit Array_Base(const Array_Traits* traits) noexcept;
+    explicit Array_Base(const Array_Traits* traits) noexcept; // one that array_traits gave
     Array_Base(const Array_Base& other);
     Array_Base(Array_Base&& other) noexcept;
     ~Array_Base();
@@ -41,6 +44,7 @@ public:
     const void* data() const noexcept;
     void* data() noexcept; // makes the elements writable in place
 
+    // Items may be elements of this array. A position behind the end means the end.
     void reserve(uint32 capacity); // exactly that many when it exceeds the present capacity
     void insert(uint32 position, const void* items, uint32 count);
     void append(const void* items, uint32 count);
@@ -56,6 +60,8 @@ public:
     const Array_Traits* traits() const noexcept;
 
 private:
+    void make_room(uint32 count);
+
     Array_Rep* _rep;
 };
 

@@ -1,9 +1,9 @@
 // Instances: the head of every generated structure, and the generic operations on them.
 //
 // A generated structure derives from its base class's structure and adds the members the class
-// declares, so a VLNMPCA_Card* is a CIM_Card* is an Instance*. Instances live on the heap, are made by
-// create or clone, and are counted: whoever gets one from an operation here owns one count. None of
-// these operations locks; an instance that two threads share must not be written.
+// declares, so a VLNMPCA_Card* is a CIM_Card* is an Instance*. Instances live on the heap, are made
+// by create or clone, and are counted: whoever gets one from an operation here owns one count. None
+// of these operations locks; an instance that two threads share must not be written.
 #ifndef CIMPLE_INSTANCE_H
 #define CIMPLE_INSTANCE_H
 
@@ -62,9 +62,11 @@ struct Instance {
 // ---- Life ----
 
 // A new instance. Without defaults every member is zero or empty and not null; with defaults a
-// property takes its default, and is null without one. Throws std::bad_alloc.
+// property takes its default, and is null without one. Counts the class. Throws std::bad_alloc.
 Instance* create(const Meta_Class* meta_class, bool defaults = false);
-// Deep copy with a count of its own; references are cloned, nulls stay null.
+// Deep copy with a count of its own; references are cloned, nulls stay null. A clone does not count
+// its class, though its end releases it: whoever clones an instance of a class made at run time
+// calls ref(class) for it. Generated classes are not counted at all. Throws std::bad_alloc.
 Instance* clone(const Instance* instance);
 void ref(const Instance* instance) noexcept;
 // Drops one count and destroys at zero. A null pointer is allowed here and in destroy.
@@ -96,42 +98,55 @@ const T* cast(const Instance* instance) {
 // ---- Contents ----
 
 // Copies value and null flag of each feature, references as clones; features that are null in model
-// are skipped. Does nothing unless dest and src are of one class.
+// are skipped. Does nothing unless dest, src and model are of one class.
 void copy(Instance* dest, const Instance* src, const Instance* model = nullptr);
 void copy_keys(Instance* dest, const Instance* src);
-// Sets the null flag of the selected members to value; references are emptied when value is non-zero.
+// Sets the null flag of the selected members to value. A scalar reference has no flag and stays as
+// it is, so that narrowing an instance to some properties never loses what it refers to.
 void nullify(Instance* instance, bool keys, bool non_keys, uint8 value = 1);
 void nullify_keys(Instance* instance);
 void nullify_non_keys(Instance* instance);
+// The namespace, every value and every reference empty, everything null.
 void clear(Instance* instance);
 // Sets the namespace of the instance and of everything it references; an existing one stays unless
 // overwrite is set.
 void set_name_space_recursive(Instance* instance, const char* name_space, bool overwrite);
-// Leaves non-null what the list (null-terminated; null: everything) names, and keys if keep_keys.
-// Answers -1 for a name that is neither property nor reference.
+// Leaves non-null what the list (null-terminated; null: everything) names, and keys if keep_keys. A
+// named null scalar reference gets an empty instance of its class. 0, or -1 at the first name that
+// is neither property nor reference; unknown names are ignored.
 int filter_properties(Instance* instance, const char* const* names, bool keep_keys);
-// A new instance of the class with everything null but the keys, copied from source.
+// A new instance of the class with everything null but the keys, copied from source if that is of
+// the same class.
 Instance* create_model(const Meta_Class* meta_class, const Instance* source);
 
 // ---- Comparison ----
 
 bool keys_all_set(const Instance* instance);
-// Equal keys; the classes may differ as long as they name the same keys, so a subclass instance
-// matches a base-class key.
+// Whether b has each key of a, under its name without regard to case, with the same type and value;
+// null flags play no part. The classes may differ, so a subclass instance matches a base-class key.
+// Null references equal each other; others match by their keys if one's class is the other's
+// subclass. Arrays of references are skipped.
 bool key_eq(const Instance* a, const Instance* b);
-// A hash with this property: key_eq(a, b) implies key_hash(a) == key_hash(b).
+// A hash of what key_eq compares: key_eq(a, b) implies equal hashes when both have the same keys,
+// in whatever order and case.
 std::size_t key_hash(const Instance* instance);
+// Same class, namespace and members; two null members are equal whatever they held.
 bool identical(const Instance* a, const Instance* b);
-// Whether a scalar reference of the association points to the instance; an empty or null role means
-// any reference.
+// Whether a scalar reference of the association points to the instance: the reference accepts its
+// class and the keys are equal. An empty or null role means any reference.
 bool is_reference_to(const Instance* association, const Instance* instance, const char* role);
 
 // ---- Text ----
 
-// "Class.key=value,key=value" to an instance of a class of meta_class's repository, null on any fault.
+// "Class.key=value,key=value" to an instance of meta_class, one of its super classes or a class of
+// its repository, everything null but the keys; null on any fault. All keys must be there, once
+// each, and nothing else. Numbers are decimal, or hexadecimal if they do not read as decimal, and
+// must fit their type; a back-slash in a string stands for the character behind it. Safe on any
+// bytes; quoted paths nest eight deep at most.
 Instance* model_path_to_instance(const Meta_Class* meta_class, const char* path);
-// The reverse; 0, or -1 for a class without keys or a null or array key.
+// The reverse; 0, or -1 for a class without keys or a null or array key, and out is left alone.
 int instance_to_model_path(const Instance* instance, String& out);
+// A diagnostic form. References are printed as nested blocks.
 void print(const Instance* instance, std::FILE* stream = stdout, bool keys_only = false);
 
 // ---- Members by description ----
@@ -158,8 +173,8 @@ T* create_null() {
     return instance;
 }
 
-// A counted pointer. Made from a raw pointer it takes over the caller's count, and holds null if the
-// instance is not of T's class.
+// A counted pointer. Made from a raw pointer it takes over the caller's count, and holds null if
+// the instance is not of T's class.
 template <class T>
 class Ref {
 public:

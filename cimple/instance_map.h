@@ -1,7 +1,10 @@
 // A store: instances of one class in insertion order, found by their keys.
 //
-// The store owns its members. Its operations answer the status numbers of providers directly. Not
-// locked: the owner's mutex guards it.
+// The store owns its members, one count of each. Its operations answer the status numbers of
+// providers directly. Not locked: the owner's mutex guards it. Whoever holds that may change a
+// member in place, but not its keys: the store looks members up by the keys they came with. Filling
+// a store and copying it are linear in its size, a look-up is constant, taking a member out is
+// linear.
 #ifndef CIMPLE_INSTANCE_MAP_H
 #define CIMPLE_INSTANCE_MAP_H
 
@@ -10,6 +13,10 @@
 #include <memory>
 
 namespace cimple {
+
+namespace detail {
+struct Key_Signature;
+}
 
 class Instance_Map_Base {
 public:
@@ -20,26 +27,29 @@ public:
 
     const Meta_Class* meta_class() const noexcept { return _meta_class; }
     uint32 size() const noexcept;
-    Instance* at(uint32 index) const noexcept;
+    Instance* at(uint32 index) const noexcept; // borrowed, or null
 
-    sint32 find(const Instance* keys) const; // index or -1
+    sint32 find(const Instance* keys) const;      // first index with key_eq(keys, member), or -1
     Instance* lookup(const Instance* keys) const; // borrowed, or null
 
     // Provider-visible operations. What goes in is copied, what comes out is the caller's.
-    sint32 get_instance(const Instance* keys, Instance*& out) const; // 0 or 60
-    sint32 enum_instances(const Enum_Instances_Handler& handler) const; // 0
-    sint32 create_instance(const Instance* instance); // 0 or 80
-    sint32 delete_instance(const Instance* keys); // 0 or 90
+    sint32 get_instance(const Instance* keys, Instance*& out) const;    // 0 or 60
+    sint32 enum_instances(const Enum_Instances_Handler& handler) const; // 0; ends when told to stop
+    sint32 create_instance(const Instance* instance);                   // 0 or 80
+    sint32 delete_instance(const Instance* keys);                       // 0 or 90
     sint32 modify_instance(const Instance* model, const Instance* instance); // 0 or 100
 
-    // Takes over the instance and answers its index; -1 if its key is present: then the caller keeps it.
+    // Takes over the instance and answers its index; -1 if its key is present: then the caller
+    // keeps it.
     sint32 insert(Instance* instance);
     // Takes the slot out without destroying its instance; a bad index is ignored.
     void remove(uint32 index);
-    void clear() noexcept; // destroys all members
+    void clear() noexcept; // destroys all members, in order
 
 private:
     struct Key_Index; // hash of the key values to positions
+    sint32 find_match(const Instance* keys, const detail::Key_Signature& signature) const;
+
     const Meta_Class* _meta_class;
     Array<Instance*> _members;
     std::unique_ptr<Key_Index> _index;
@@ -50,7 +60,9 @@ class Instance_Map : public Instance_Map_Base {
 public:
     Instance_Map() : Instance_Map_Base(&T::static_meta_class) {}
     T* operator[](uint32 index) const noexcept { return static_cast<T*>(at(index)); }
-    T* lookup(const Instance* keys) const { return static_cast<T*>(Instance_Map_Base::lookup(keys)); }
+    T* lookup(const Instance* keys) const {
+        return static_cast<T*>(Instance_Map_Base::lookup(keys));
+    }
 };
 
 } // namespace cimple

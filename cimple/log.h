@@ -1,8 +1,9 @@
-// The engine's own message log and trace, off unless the administrator turns it on.
+// The engine's own message log, off unless the administrator turns it on.
 //
 // The folder that CIMPLE_HOME names may hold ".cimplerc" with LOG_LEVEL=word; the log is then
 // ".cimple/messages" there. It is meant for those who debug the binding to an object manager; the
-// provider's own logs are elsewhere.
+// provider's own logs are elsewhere. Several processes may share one log: each line is written
+// under a file lock. The environment is read once, at the first message.
 #ifndef CIMPLE_LOG_H
 #define CIMPLE_LOG_H
 
@@ -20,11 +21,15 @@ bool log_enabled();
 } // namespace cimple
 
 #define CIMPLE_ERR(...) ::cimple::log_msg(::cimple::LL_ERR, __FILE__, __LINE__, __VA_ARGS__)
+// Conversion messages: these two are gated by log_enabled.
 #define CIMPLE_WARN(...)                                                                           \
     (::cimple::log_enabled()                                                                       \
          ? ::cimple::log_msg(::cimple::LL_WARN, __FILE__, __LINE__, __VA_ARGS__)                   \
          : static_cast<void>(0))
-#define CIMPLE_INFO(...) ::cimple::log_msg(::cimple::LL_INFO, __FILE__, __LINE__, __VA_ARGS__)
+#define CIMPLE_INFO(...)                                                                           \
+    (::cimple::log_enabled()                                                                       \
+         ? ::cimple::log_msg(::cimple::LL_INFO, __FILE__, __LINE__, __VA_ARGS__)                   \
+         : static_cast<void>(0))
 #define CIMPLE_DBG(...) ::cimple::log_msg(::cimple::LL_DBG, __FILE__, __LINE__, __VA_ARGS__)
 
 #endif // CIMPLE_LOG_H

@@ -1,8 +1,8 @@
 // The meta model: static records that describe every class the library serves.
 //
-// One Meta_Class per class, with its features and qualifiers, written by the generator into constant
-// tables. All handling of instances (create, copy, compare, convert) is driven by these records.
-// Static records hold refs 0 and are neither counted nor freed; heap copies start at 1.
+// One Meta_Class per class, with its features and qualifiers, written by the generator into
+// constant tables. All handling of instances (create, copy, compare, convert) is driven by these
+// records. Static records hold refs 0 and are neither counted nor freed; heap copies start at 1.
 #ifndef CIMPLE_META_H
 #define CIMPLE_META_H
 
@@ -94,9 +94,9 @@ struct Meta_Feature {
 };
 
 struct Meta_Property : Meta_Feature {
-    uint16 type;     // a Type
-    sint16 subscript; // 0 scalar, -1 variable array, above 0 fixed array of that length
-    uint32 offset;    // of the Property in the instance
+    uint16 type;             // a Type
+    sint16 subscript;        // 0 scalar, -1 variable array, above 0 fixed array of that length
+    uint32 offset;           // of the Property in the instance
     const Meta_Value* value; // null: no default
 };
 
@@ -114,8 +114,8 @@ struct Meta_Features : Meta_Feature {
     uint32 size; // bytes of the generated instance structure
 };
 
-// A method is a class-like record: the adapter builds a method instance from it. Its last feature is
-// always the property "return_value" with the flag Out.
+// A method is a class-like record: the adapter builds a method instance from it. Its last feature
+// is always the property "return_value" with the flag Out.
 struct Meta_Method : Meta_Features {
     uint16 return_type;
 };
@@ -132,7 +132,8 @@ struct Meta_Repository {
     uint32 num_meta_classes;
 };
 
-// ---- Counting. A static record (refs 0) stays at 0; dropping the last count frees a heap copy. ----
+// ---- Counting. A static record (refs 0) stays at 0; dropping the last count frees a heap copy.
+// ----
 
 void ref(const Meta_Class* meta_class);
 void unref(const Meta_Class* meta_class);
@@ -141,14 +142,20 @@ void unref(const Meta_Class* meta_class);
 
 const Meta_Class* find_meta_class(const Meta_Repository* repository, const char* name);
 const Meta_Class* find_class_in_tree(const Meta_Class* meta_class, const char* name);
-// First feature of that name whose flags share a bit with mask. Searches the class's own table, which
-// holds the inherited features as well.
+// First feature of that name whose flags share a bit with mask. Searches the class's own table,
+// which holds the inherited features as well.
 const Meta_Feature* find_feature(const Meta_Features* features, const char* name, uint32 mask);
 const Meta_Property* find_property(const Meta_Features* features, const char* name);
 const Meta_Reference* find_reference(const Meta_Features* features, const char* name);
 const Meta_Method* find_method(const Meta_Class* meta_class, const char* name);
 
 bool has_feature_flag(const Meta_Features* features, uint32 mask);
+
+// The method as the class of its method instances: only what Meta_Features holds may be read
+// through the result, as its flag Method tells.
+inline const Meta_Class* as_class(const Meta_Method* method) {
+    return static_cast<const Meta_Class*>(static_cast<const Meta_Features*>(method));
+}
 
 // ---- Relations ----
 
@@ -178,12 +185,13 @@ bool name_equal(const char* a, const char* b);
 
 // ---- Classes made at run time ----
 
-// A new class: empty without a base (refs 1, the given flags, the size of the instance head), else a
-// deep copy of the base, no longer abstract, with the base as its counted super class and no local
-// features. The caller owns one count.
+// A new class: empty without a base (refs 1, the given flags, the size of the instance head), else
+// a deep copy of the base with the base's flags, no longer abstract, with the base as its counted
+// super class and no local features. The caller owns one count, and is the only one who may change
+// the class. Throws std::bad_alloc.
 Meta_Class* create_meta_class(const char* name, const Meta_Class* base, uint32 flags);
-// Removes the named qualifiers, or all when names is null, from a heap class and from the parameters
-// of its methods.
+// Removes the named qualifiers, or all when names is null, from a class made at run time, from its
+// features and from the parameters of its methods. A static class is left alone.
 void remove_qualifiers(Meta_Class* meta_class, const char* const* names, uint32 count);
 
 // ---- Printing, a diagnostic facility (standard output) ----

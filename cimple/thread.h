@@ -8,12 +8,21 @@
 
 namespace cimple {
 
+// The engine's own places in the lock order. Both are leaves: they may be taken while any lock of
+// the layers above is held, and nothing but the log is taken under them. An adapter's lock has no
+// place: an up-call may take another provider's on the same thread.
+inline constexpr int LOCK_RANK_FACTORY = 900;
+inline constexpr int LOCK_RANK_LOG = 1000;
+
 // A mutex with an optional place in a lock order. In builds with CIMPLE_CHECK_LOCKS a thread that
-// takes a ranked mutex while it holds one of the same or a higher rank ends the process with both
-// names; rank 0 takes no part in the order.
+// takes a ranked mutex while it holds another of the same or a higher rank ends the process with
+// both names; rank 0 takes no part in the order.
 class Mutex {
 public:
-    explicit Mutex(bool recursive = false, int rank = 0, const char* name = "");
+    // Constant initialisation, so that a mutex with static storage needs no constructor at load
+    // time.
+    constexpr explicit Mutex(bool recursive = false, int rank = 0, const char* name = "") noexcept
+        : _mutex(recursive ? RECURSIVE : PLAIN), _rank(rank), _name(name) {}
     ~Mutex();
     Mutex(const Mutex&) = delete;
     Mutex& operator=(const Mutex&) = delete;
@@ -22,10 +31,10 @@ public:
     int try_lock(); // 0, 16 (EBUSY) or -1
     void unlock();
 
-    // std::lock_guard and friends may be used with it.
-
 private:
     friend class Cond;
+    static constexpr pthread_mutex_t PLAIN = PTHREAD_MUTEX_INITIALIZER;
+    static constexpr pthread_mutex_t RECURSIVE = PTHREAD_RECURSIVE_MUTEX_INITIALIZER_NP;
     pthread_mutex_t _mutex;
     int _rank;
     const char* _name;
@@ -49,7 +58,7 @@ private:
 
 class Cond {
 public:
-    Cond();
+    constexpr Cond() noexcept = default;
     ~Cond();
     Cond(const Cond&) = delete;
     Cond& operator=(const Cond&) = delete;
@@ -60,7 +69,26 @@ public:
     void wait(Mutex& mutex);
 
 private:
-    pthread_cond_t _cond;
+    pthread_cond_t _cond = PTHREAD_COND_INITIALIZER;
+};
+
+// Static storage that is initialised at compile time and never destroyed: a thread may still run
+// when the process or the module ends, and must find its locks whole.
+//     constinit Process_Wide<Mutex> the_mutex(false, 0, "name");
+//     Auto_Mutex guard(*the_mutex);
+template <class T>
+class Process_Wide {
+public:
+    template <class... Args>
+    constexpr explicit Process_Wide(Args... args) noexcept : _value(args...) {}
+    constexpr ~Process_Wide() {}
+    T& operator*() { return _value; }
+    T* operator->() { return &_value; }
+
+private:
+    union {
+        T _value;
+    };
 };
 
 using Thread_Proc = void* (*)(void* argument);
@@ -69,8 +97,9 @@ class Thread {
 public:
     Thread() noexcept = default;
 
-    // Starts a thread; 0 or the error of pthread_create. Started on a thread that has a context, the
-    // new thread gets one of its own and is attached to the object manager around its function.
+    // Starts a thread; 0 or the error of pthread_create. Started on a thread that has a context,
+    // the new thread gets one of its own and is attached to the object manager around its function.
+    // An exception that the function lets out ends the thread with the value null, not the process.
     static int create_joinable(Thread& thread, Thread_Proc proc, void* argument);
     static int create_detached(Thread& thread, Thread_Proc proc, void* argument);
 
@@ -95,8 +124,12 @@ public:
         uint64 (*now)();
         void (*sleep)(uint64 usec);
     };
-    static void replace_clock(const Clock* clock); // null: the system's own
+    static void replace_clock(const Clock* clock); // null: system_clock
 };
+
+// The clock that Time starts with. It has a translation unit of its own, so that a variant of the
+// module can be linked with another one.
+extern const Time::Clock system_clock;
 
 } // namespace cimple
 

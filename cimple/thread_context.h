@@ -9,7 +9,10 @@
 
 namespace cimple {
 
-struct Instance_Enumerator_Rep;
+// An enumeration in progress; each kind of context has its own.
+struct Instance_Enumerator_Rep {
+    virtual ~Instance_Enumerator_Rep() = default;
+};
 
 class Thread_Context {
 public:
@@ -20,6 +23,7 @@ public:
     virtual void thread_start_hook() = 0; // first on the new thread
     virtual void thread_exit_hook() = 0;  // last on the new thread
 
+    // Null on any failure; the caller gives the result to destroy_enum.
     virtual Instance_Enumerator_Rep* start_enum(const char* name_space, const Instance* model) = 0;
     virtual void destroy_enum(Instance_Enumerator_Rep* rep) = 0;
     virtual bool more(Instance_Enumerator_Rep* rep) = 0;
@@ -35,6 +39,7 @@ public:
     virtual void allow_unload(bool flag) = 0;
     virtual bool get_username(String& user) = 0;
 
+    // The caller keeps ownership of what it pushes.
     static void push(Thread_Context* context);
     static void pop(); // an empty stack is left alone
     static Thread_Context* top();

@@ -1,0 +1,96 @@
+// The adapter pass: turns the device model into the CIM picture of the host, in named steps.
+//
+// One builder lives for one pass, on the refresh thread, with the adapter maps' ready mutex and
+// m_DataMutex held. What it keeps are borrowed pointers into the stores that it fills. A step
+// answers 0, SKIP_DEVICE or END_PASS; the stores stay as far as they were filled, since a partial
+// picture is better than none. The properties of each class stand in a function of their own, in
+// one order.
+#ifndef VLN_AGENT_ADAPTER_MAP_BUILDER_H
+#define VLN_AGENT_ADAPTER_MAP_BUILDER_H
+
+#include "agent/provider_agent.h"
+#include "classes/CIM_Chassis.h"
+#include "classes/CIM_ComputerSystem.h"
+#include "classes/VLNMPCA_Card.h"
+#include "classes/VLNMPCA_EthernetPort.h"
+#include "classes/VLNMPCA_LANEndpoint.h"
+#include "classes/VLNMPCA_PhysicalConnector.h"
+#include "classes/VLNMPCA_PortController.h"
+#include "classes/VLNMPCA_Product.h"
+#include "device/nic_adapter.h"
+
+namespace cimple {
+
+enum Map_Status : uint32 {
+    MAP_OK = 0,
+    SKIP_DEVICE = 32768, // the present port or device is left out
+    END_PASS = 32769,    // the pass ends here
+};
+
+class Adapter_Map_Builder {
+public:
+    explicit Adapter_Map_Builder(ProviderAgent& agent) : _agent(agent) {}
+
+    // The whole pass. Exceptions of the card loop end that loop only.
+    uint32 run();
+
+private:
+    // A NIC function on its way through the card loop, with what its card shares with others.
+    struct NIC_Function {
+        NICAdapter* adapter;
+        const NICAdapterAttributes* attributes;
+        VLNMPCA_Product* product;
+        VLNMPCA_Card* card;
+        bool new_card; // made for this function, and not yet tied to its surroundings
+    };
+    // One port of it.
+    struct NIC_Port {
+        const NIC_Function& function;
+        const NICPortAttributes* attributes;
+        String name;              // of the device model: 16 digits
+        String serial_and_number; // "serial:port number", which functions of one connector share
+        VLNMPCA_PhysicalConnector* connector = nullptr;
+        VLNMPCA_EthernetPort* ethernet_port = nullptr;
+        VLNMPCA_LANEndpoint* lan_endpoint = nullptr;
+        VLNMPCA_PortController* port_controller = nullptr;
+    };
+
+    // platform_maps.cpp
+    uint32 createComputerSystem();
+    Ref<CIM_ComputerSystem> ownComputerSystem() const;
+    void findChassis();
+    uint32 createChassis();
+    Ref<CIM_Chassis> ownChassis() const;
+
+    // configuration_maps.cpp
+    uint32 createConfigurationSettings();
+
+    // card_maps.cpp
+    void createNICCards();
+    void createNICCard(NICAdapter& adapter);
+    VLNMPCA_Product* findOrMakeProduct(const NICAdapterAttributes& attributes);
+    VLNMPCA_Card* CreateMPCACardInstance(const NICAdapterAttributes& attributes);
+    void tieNewCard(NIC_Function& function);
+    void findOrMakeConnector(NIC_Port& port);
+    void joinConnector(const NIC_Port& port);
+
+    // port_maps.cpp
+    void createNICPort(NIC_Function& function, Port& port);
+    Ref<VLNMPCA_EthernetPort> CreateEthernetPort(const NIC_Port& port) const;
+    void createLANEndpoint(NIC_Port& port);
+    void joinLANEndpoint(const NIC_Port& port);
+
+    // port_controller_maps.cpp
+    void findOrMakePortController(NIC_Port& port);
+    void joinPortController(const NIC_Port& port);
+    void joinControlledBy(const NIC_Port& port);
+
+    ProviderAgent& _agent;
+    CIM_ComputerSystem* _system = nullptr; // in its store
+    Ref<CIM_Chassis> _platform_chassis;    // found by the up-call, not yet in its store
+    CIM_Chassis* _chassis = nullptr;       // in its store
+};
+
+} // namespace cimple
+
+#endif // VLN_AGENT_ADAPTER_MAP_BUILDER_H

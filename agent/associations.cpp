@@ -1,0 +1,68 @@
+#include "agent/associations.h"
+
+namespace cimple {
+
+namespace {
+
+// Sets the next reference of the association, from the given feature on, to a clone of the end.
+// Answers the feature after it, or -1 if there is none left or the end does not fit.
+sint32 set_reference(Instance* association, uint32 feature, const Instance* end) {
+    const Meta_Class* meta_class = association->__meta_class;
+    for (; feature < meta_class->num_meta_features; ++feature) {
+        const Meta_Feature* candidate = meta_class->meta_features[feature];
+        if (!(candidate->flags & FLAG_REFERENCE))
+            continue;
+        const auto* description = static_cast<const Meta_Reference*>(candidate);
+        if (!is_subclass(description->meta_class, end->__meta_class))
+            return -1;
+        reference(association, description) = clone(end);
+        return static_cast<sint32>(feature + 1);
+    }
+    return -1;
+}
+
+bool set_ends(Instance* association, const Instance* first, const Instance* second) {
+    if (!first || !second)
+        return false;
+    const sint32 next = set_reference(association, 0, first);
+    return next >= 0 && set_reference(association, static_cast<uint32>(next), second) >= 0;
+}
+
+} // namespace
+
+Instance* make_instance(const Meta_Class* meta_class) {
+    static const String name_space(VORLAN_NAME_SPACE);
+    Instance* instance = create(meta_class);
+    nullify(instance, true, true);
+    instance->__name_space = name_space;
+    return instance;
+}
+
+Instance* insert_instance(Instance_Map_Base& store, Ref<Instance> instance,
+                          const Insert_Failure& failure) {
+    if (!instance)
+        return nullptr;
+    if (store.insert(instance.get()) >= 0)
+        return instance.release();
+    if (failure.text)
+        VLN_LOG(failure.level, "%s", failure.text);
+    else
+        VLN_LOG(failure.level, "Insert Failed : m_%s_map", store.meta_class()->name);
+    return nullptr;
+}
+
+Instance* associate(Instance_Map_Base& store, const Instance* first, const Instance* second,
+                    const Insert_Failure& failure) {
+    Ref<Instance> association(make_instance(store.meta_class()));
+    if (!association) {
+        VLN_LOG(VLN_CRIT, "Could not create the instance of the Association class");
+        return nullptr;
+    }
+    if (!set_ends(association.get(), first, second)) {
+        VLN_LOG(VLN_CRIT, "Wrong input for %s", store.meta_class()->name);
+        return nullptr;
+    }
+    return insert_instance(store, association, failure);
+}
+
+} // namespace cimple

@@ -1,0 +1,55 @@
+// The one way in which the agent makes instances, and the one way in which it joins two of them.
+//
+// The stores named here are written: m_DataMutex and the ready mutex of their group are held.
+#ifndef VLN_AGENT_ASSOCIATIONS_H
+#define VLN_AGENT_ASSOCIATIONS_H
+
+#include "cimple/instance_map.h"
+#include "foundation/logger.h"
+
+namespace cimple {
+
+inline constexpr char VORLAN_NAME_SPACE[] = "root/vorlan";
+inline constexpr char INTEROP_NAME_SPACE[] = "root/pg_interop";
+inline constexpr char PLATFORM_NAME_SPACE[] = "root/ibmse";
+
+// A new instance in "root/vorlan" with every property null, as each map builder starts from.
+Instance* make_instance(const Meta_Class* meta_class);
+
+template <class T>
+Ref<T> make_instance() {
+    return Ref<T>(make_instance(&T::static_meta_class));
+}
+
+// What a failed insertion says, and at which level; a null text stands for "Insert Failed :
+// m_<class>_map".
+struct Insert_Failure {
+    const char* text = nullptr;
+    int level = VLN_CRIT;
+
+    Insert_Failure() = default;
+    Insert_Failure(const char* failure_text, int failure_level = VLN_CRIT)
+        : text(failure_text), level(failure_level) {}
+};
+
+// Hands the instance to the store. On a duplicate key it logs the failure, destroys the instance
+// and answers null; otherwise the store owns what is answered.
+Instance* insert_instance(Instance_Map_Base& store, Ref<Instance> instance,
+                          const Insert_Failure& failure = {});
+
+template <class T>
+T* insert_instance(Instance_Map<T>& store, Ref<T> instance, const Insert_Failure& failure = {}) {
+    return static_cast<T*>(insert_instance(static_cast<Instance_Map_Base&>(store),
+                                           Ref<Instance>(instance.release()), failure));
+}
+
+// Joins two instances: makes an instance of the store's class whose references, in the order in
+// which the class declares them, are clones of the ends. Answers the instance, owned by the store,
+// or null with a line in the log: an end is null or not of the class that the reference wants, or
+// the store holds the association already.
+Instance* associate(Instance_Map_Base& store, const Instance* first, const Instance* second,
+                    const Insert_Failure& failure = {});
+
+} // namespace cimple
+
+#endif // VLN_AGENT_ASSOCIATIONS_H

@@ -1,0 +1,25 @@
+// The table that the status thread and the status updates share: what each logical port last
+// reported.
+#ifndef VLN_AGENT_DYNAMIC_PORT_STATUS_H
+#define VLN_AGENT_DYNAMIC_PORT_STATUS_H
+
+#include "cimple/types.h"
+
+#include <vector>
+
+namespace cimple {
+
+struct Dynamic_Port_Row {
+    uint32 functional_state;
+    uint32 physical_state;
+    char name[24]; // port name, at most 20 characters and the end mark
+};
+static_assert(sizeof(Dynamic_Port_Row) == 32);
+
+struct Dynamic_Port_Status {
+    std::vector<Dynamic_Port_Row> rows;
+};
+
+} // namespace cimple
+
+#endif // VLN_AGENT_DYNAMIC_PORT_STATUS_H

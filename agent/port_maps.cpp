@@ -1,0 +1,172 @@
+// The ports of a NIC function and the endpoints on them.
+
+#include "agent/adapter_map_builder.h"
+#include "agent/associations.h"
+#include "agent/beacon.h"
+#include "agent/mac_text.h"
+#include "agent/state_tables.h"
+#include "agent/text.h"
+#include "classes/VLNMPCA_EnabledLogicalElementCapabilities.h"
+
+namespace cimple {
+
+namespace {
+
+constexpr uint16 REQUESTED_STATE_NOT_APPLICABLE = 12; // CIM_EnabledLogicalElement.RequestedState
+constexpr uint16 REQUESTED_STATE_ENABLED = 2;
+constexpr uint16 LINK_TECHNOLOGY_ETHERNET = 2; // CIM_NetworkPort.LinkTechnology
+constexpr uint16 LINK_TECHNOLOGY_UNKNOWN = 0;
+constexpr uint16 IF_TYPE_ETHERNET_CSMACD = 6; // IANAifType
+constexpr uint16 IF_TYPE_OTHER = 1;
+
+struct Capability_Word {
+    const char* word;
+    uint16 value; // CIM_EthernetPort.Capabilities
+};
+
+constexpr Capability_Word CAPABILITY_WORDS[] = {
+    {"AlertOnLan", 2},
+    {"WakeOnLan", 3},
+    {"FailOver", 4},
+};
+
+void append_capabilities(Property<Array<uint16>>& capabilities, const std::string& words) {
+    for (const Capability_Word& row : CAPABILITY_WORDS)
+        if (words.find(row.word) != std::string::npos)
+            capabilities.append(row.value);
+}
+
+// Who the port is besides its key. Later look-ups match the texts by their position.
+void append_identities(VLNMPCA_EthernetPort& port, const NICAdapterAttributes& adapter,
+                       const String& serial_and_number) {
+    std::string serial_and_sub_adapter = adapter.SerialNumber;
+    if (!adapter.Subadapter_number.empty())
+        serial_and_sub_adapter += ":" + adapter.Subadapter_number;
+    port.OtherIdentifyingInfo.append(text(serial_and_sub_adapter));
+    port.IdentifyingDescriptions.append(String("SerialNumber + Sub-AdapterID"));
+    port.OtherIdentifyingInfo.append(serial_and_number);
+    port.IdentifyingDescriptions.append(String("SerialNumber:PhysicalPortNumber"));
+    port.OtherIdentifyingInfo.append(text(adapter.SerialNumber));
+    port.IdentifyingDescriptions.append(String("SerialNumber"));
+}
+
+Ref<VLNMPCA_LANEndpoint> lan_endpoint_instance(const NICAdapterAttributes& adapter,
+                                               const NICPortAttributes& attributes,
+                                               const String& port_name,
+                                               const CIM_ComputerSystem& system) {
+    auto endpoint = make_instance<VLNMPCA_LANEndpoint>();
+    endpoint->Description.set(text(adapter.ModelDescription));
+    endpoint->SystemCreationClassName.set(system.CreationClassName.value);
+    endpoint->SystemName.set(system.Name.value);
+    endpoint->CreationClassName.set("VLNMPCA_LANEndpoint");
+    endpoint->ElementName.set(port_name);
+    endpoint->Name.set(port_name);
+    endpoint->NameFormat.set("Ethernet");
+    endpoint->ProtocolIFType.set(
+        attributes.ProtocolIFType == "Ethernet CSMA/CD" ? IF_TYPE_ETHERNET_CSMACD : IF_TYPE_OTHER);
+    endpoint->MACAddress.set(text(attributes.CurrentMACAddress));
+    endpoint->RequestedState.set(REQUESTED_STATE_NOT_APPLICABLE);
+    endpoint->EnabledState.set(enabled_state(attributes.FunctionalPortState));
+    return endpoint;
+}
+
+Ref<VLNMPCA_EnabledLogicalElementCapabilities> capabilities_instance(const String& port_name) {
+    auto capabilities = make_instance<VLNMPCA_EnabledLogicalElementCapabilities>();
+    capabilities->InstanceID.set(format_text("Capabilities:%s", port_name.c_str()));
+    capabilities->ElementNameEditSupported.set(false);
+    capabilities->RequestedStatesSupported.append(REQUESTED_STATE_ENABLED);
+    return capabilities;
+}
+
+} // namespace
+
+// The steps of one port, in order. A port whose Ethernet port can't be made is left out from there
+// on.
+void Adapter_Map_Builder::createNICPort(NIC_Function& function, Port& nic_port) {
+    VLN_LOG(VLN_DBG, "Creating classes for Adapter# %d # --- NIC port# %d #",
+            static_cast<int>(function.adapter->getAdapterNumber()),
+            static_cast<int>(nic_port.getPortIndex()));
+    const auto& attributes = static_cast<const NICPortAttributes&>(*nic_port.getPortAttributes());
+    NIC_Port port{function, &attributes, text(nic_port.getPortName()),
+                  format_text("%s:%d", function.attributes->SerialNumber.c_str(),
+                              static_cast<int>(function.attributes->PortNumber))};
+    tieNewCard(function);
+    findOrMakeConnector(port);
+    joinConnector(port);
+    port.ethernet_port =
+        insert_instance(_agent.m_VLNMPCA_EthernetPort_map, CreateEthernetPort(port));
+    if (!port.ethernet_port)
+        return;
+    associate(_agent.m_VLNMPCA_Realizes_map, port.connector, port.ethernet_port,
+              "Insert Failed (CNA): m_VLNMPCA_Realizes_map");
+    createLANEndpoint(port);
+    joinLANEndpoint(port);
+    VLN_LOG(VLN_DBG, "Adding the port controller classes");
+    findOrMakePortController(port);
+    VLN_LOG(VLN_DBG, "Creating controlledby");
+    joinControlledBy(port);
+}
+
+// Null for a port whose address is no MAC address.
+Ref<VLNMPCA_EthernetPort> Adapter_Map_Builder::CreateEthernetPort(const NIC_Port& nic_port) const {
+    const NICAdapterAttributes& adapter = *nic_port.function.attributes;
+    const NICPortAttributes& attributes = *nic_port.attributes;
+    const String& port_name = nic_port.name;
+    String permanent_address;
+    String current_address;
+    if (!removeSeptr(attributes.PermanentMACAddress, permanent_address) ||
+        !removeSeptr(attributes.CurrentMACAddress, current_address))
+        return {};
+
+    auto port = make_instance<VLNMPCA_EthernetPort>();
+    port->PortNumber.set(static_cast<uint16>(adapter.PortNumber));
+    port->InstanceID.set(format_text("%s:%s", adapter.Model.c_str(), port_name.c_str()));
+    port->Description.set(text(adapter.ModelDescription));
+    port->SystemCreationClassName.set(_system->CreationClassName.value);
+    port->SystemName.set(_system->Name.value);
+    port->ElementName.set(text(attributes.IfName));
+    port->Name.set(text(attributes.IfName));
+    port->CreationClassName.set("VLNMPCA_EthernetPort");
+    port->DeviceID.set(port_name);
+    append_port_state(port.get(), find_port_state(portStateMap, attributes.FunctionalPortState));
+    port->PermanentAddress.set(permanent_address);
+    port->NetworkAddresses.append(current_address.substr(0, MAC_DIGITS));
+    port->LinkTechnology.set(attributes.LinkTechnology == "Ethernet" ? LINK_TECHNOLOGY_ETHERNET
+                                                                     : LINK_TECHNOLOGY_UNKNOWN);
+    append_capabilities(port->Capabilities, attributes.Capabilities);
+    append_capabilities(port->EnabledCapabilities, attributes.EnabledCapabilities);
+    port->RequestedState.set(REQUESTED_STATE_NOT_APPLICABLE);
+    port->EnabledState.set(enabled_state(attributes.FunctionalPortState));
+    port->Speed.set(speed_of_code(attributes.PortSpeed));
+    port->MaxSpeed.set(max_speed_of_mask(attributes.PortSupportedSpeed));
+    port->FunctionalPortSpeed.set(text(attributes.FuncPortSpeed));
+    port->PortType.set(0);
+    port->SupportedMaximumTransmissionUnit.set(attributes.MaximumMTU);
+    port->ActiveMaximumTransmissionUnit.set(attributes.CurrentMTU);
+    port->Generation.set(adapter.PCIFunctionNumber);
+    append_identities(*port, adapter, nic_port.serial_and_number);
+    port->FunctionalQosBandwidth.set(text(attributes.FuncQosBandwidth));
+    port->FunctionalQosMinBandwidth.set(text(attributes.FuncQosMinBandwidth));
+    port->PCIBusNumber.set(adapter.PCIBusNumber);
+    read_beacon(*port);
+    return port;
+}
+
+void Adapter_Map_Builder::createLANEndpoint(NIC_Port& port) {
+    port.lan_endpoint = insert_instance(
+        _agent.m_VLNMPCA_LANEndpoint_map,
+        lan_endpoint_instance(*port.function.attributes, *port.attributes, port.name, *_system));
+}
+
+// The endpoint's capabilities, and what ties endpoint, port and computer system together.
+void Adapter_Map_Builder::joinLANEndpoint(const NIC_Port& port) {
+    const auto* capabilities = insert_instance(
+        _agent.m_VLNMPCA_EnabledLogicalElementCapabilities_map, capabilities_instance(port.name));
+    associate(_agent.m_VLNMPCA_NICCapabilities_map, port.ethernet_port, capabilities);
+    associate(_agent.m_VLNMPCA_EndpointCapabilities_map, port.lan_endpoint, capabilities);
+    associate(_agent.m_VLNMPCA_NICSAPImplementation_map, port.ethernet_port, port.lan_endpoint);
+    associate(_agent.m_VLNMPCA_HostedLANEndpoint_map, _system, port.lan_endpoint);
+    associate(_agent.m_VLNMPCA_EthernetPortSystemDevice_map, _system, port.ethernet_port);
+}
+
+} // namespace cimple

@@ -1,0 +1,144 @@
+// The hub of the provider: owns the device model, the operations on the library, the loggers, the
+// configuration and all instance stores, and keeps the stores fresh.
+//
+// A refresh happens only as a side effect of a client's call: BuildCimpleInfo starts at most one
+// DataFetch_Handler thread, which rebuilds the model and the stores and ends. Readers wait at a
+// gate (gates.h) while what they need is being built. The flags are plain bytes without atomics:
+// the locks around them, or the harmlessness of a late reading, are what they rely on. Lock order:
+// lock_order.h.
+#ifndef VLN_AGENT_PROVIDER_AGENT_H
+#define VLN_AGENT_PROVIDER_AGENT_H
+
+#include "agent/dynamic_port_status.h"
+#include "agent/stores.h"
+#include "cimple/thread.h"
+#include "device/data.h"
+#include "foundation/config_file.h"
+#include "foundation/logger.h"
+#include "operations/method_wrapper.h"
+
+#include <memory>
+#include <string>
+
+namespace cimple {
+
+class ProviderAgent : public Instance_Stores {
+public:
+    // ---- The one agent of the process ----
+
+    // The agent, built on first use under s_AgentMutex. Counts no reference. The constructor does
+    // not fail when the libraries do: then m_bLibraryLoaded stays false.
+    static ProviderAgent* instance();
+    // The agent, or null when there is none; builds nothing.
+    static ProviderAgent* current() noexcept;
+    // instance and addRef in one step, so that the last release on another thread can't come
+    // between. False, and no reference, when the libraries are not usable.
+    static bool acquire();
+
+    // One reference for each class provider that is loaded. The last release destroys the agent: it
+    // joins a running refresh and waits at the gates, with s_AgentMutex held.
+    void addRef();
+    void releaseRef();
+
+    // ---- Refresh ----
+
+    // Every class operation calls this before it reads anything: decides whether a refresh is due
+    // and starts it. Takes m_DataFetchMutex; answers 0 always and waits for no refresh.
+    int BuildCimpleInfo();
+
+    // Clears the stores of both refresh passes, each under its ready mutex. For the destructor
+    // only.
+    void ClearMaps();
+    // The caller holds the group's ready mutex and, on the refresh thread, m_DataMutex.
+    void clearAdapterMaps();
+    void clearSANMaps();
+
+    // ---- Members ----
+
+    bool m_bAdapterRefreshRequested = true; // one-shot: the first refresh always has adapter data
+    bool m_bRefreshAdapterData = false;     // every refresh runs the adapter pass
+    bool m_bSANRefreshRequested = false;    // one-shot
+    bool m_bRefreshSANData = true;          // every refresh runs the SAN pass
+    uint32 m_CacheTimeout = 10;             // minutes
+    bool m_bLibraryLoaded = false;          // the device layer may be used
+
+    std::unique_ptr<VLN_Data> m_pData;
+    std::unique_ptr<VLN_MethodWrapper> m_pMethodWrapper;
+    Provider_Loggers m_Loggers; // file, ring and system log, in this order
+    VlnConfigFile m_ConfigFile; // saved when the agent goes
+
+    Mutex m_DataMutex; // guards m_pData and every store
+
+    bool m_bIsAdapterDataReady = false;
+    bool m_bIsAdapterDataBuilding = false;
+    Mutex m_AdapterDataReadyMutex;
+    Cond m_AdapterDataReadyCond;
+
+    bool m_bIsAdapterMapsReady = false;
+    bool m_bIsAdapterMapsBuilding = false;
+    Mutex m_AdapterMapsReadyMutex;
+    Cond m_AdapterMapsReadyCond;
+
+    bool m_bIsSANMapsReady = false;
+    bool m_bIsSANMapsBuilding = false;
+    Mutex m_SANMapsReadyMutex;
+    Cond m_SANMapsReadyCond;
+
+    // Holds the refresh back. Nothing sets it today: the test in BuildCimpleInfo is the one place
+    // that a future writer has to reach.
+    bool m_bDiagnosticsRunning = false;
+
+    bool m_DynamicPortThreadInitialized = false;
+    bool m_bStopDynamicThread = false;
+    std::unique_ptr<Dynamic_Port_Status> m_pDynamicPortStatus;
+    Mutex m_DynamicPortStatusMutex;
+    Thread m_DynamicPortThread;
+
+    bool m_bFirstAdapterPass = true;
+    std::string m_OSName;
+    std::string m_OSVersion;
+
+    Datetime m_LoadedTime; // end of the last refresh; all zero before the first
+    Thread m_DataFetchThread;
+    Mutex m_DataFetchMutex; // guards the refresh decision and the members around it
+    bool m_bDataFetchRunning = false;
+    bool m_bOwnComputerSystem = false;
+
+private:
+    ProviderAgent();
+    ~ProviderAgent();
+
+    // provider_agent.cpp: steps of construction and destruction
+    void copyConfiguration();
+    void loadLibraries();
+    void shutDown();
+    void stopDynamicThread();
+    void stopDataFetch();
+    void destroyDeviceModel();
+    void clearRecords();
+    static ProviderAgent* instanceLocked();
+
+    // refresh.cpp
+    static void* DataFetch_Handler(void* agent);
+    bool isCacheTimedOut();
+    bool claimRefresh();
+    void joinDataFetch();
+    void runAdapterPass();
+    void rebuildAdapterData();
+    void rebuildAdapterMaps();
+    void runSANPass();
+    void rebuildSANMaps();
+    void finishRefresh();
+
+    // The two map builders, on the refresh thread, under m_DataMutex. 0 or 32769.
+    uint32 updateAdapterMaps();
+    uint32 updateSANMaps();
+
+    // There is a thread that nobody has joined yet. A start that failed leaves m_bDataFetchRunning
+    // set and this one clear, so that no thread that never was gets joined.
+    bool m_bDataFetchJoinable = false;
+};
+
+} // namespace cimple
+
+#endif // VLN_AGENT_PROVIDER_AGENT_H

@@ -1,0 +1,191 @@
+// When a refresh is due, and what the refresh thread does.
+
+#include "agent/provider_agent.h"
+
+namespace cimple {
+
+namespace {
+
+constexpr uint32 USEC_PER_MINUTE = 60000000;
+
+// A builder that throws must cost its stores or its model, never the object manager's process.
+template <class Build>
+void guarded(const char* what, Build build) {
+    try {
+        build();
+    } catch (...) {
+        VLN_LOG(VLN_ERR, "Exception in %s", what);
+    }
+}
+
+} // namespace
+
+// ---- The decision ----
+
+bool ProviderAgent::isCacheTimedOut() {
+    VLN_LOG(VLN_DBG, "Checking if TimeOut...");
+    const Datetime now = Datetime::now();
+    VLN_LOG(VLN_DBG, "loadedtime = %s; currenttime = %s; cache timeout = %d",
+            m_LoadedTime.ascii().c_str(), now.ascii().c_str(), static_cast<int>(m_CacheTimeout));
+    const uint64 difference = now.usec() - m_LoadedTime.usec();
+    // The product is meant to be 32 bits wide, and so wraps from 72 minutes on; a difference that
+    // needs more bits is a time-out whatever the limit.
+    const uint32 limit = m_CacheTimeout * USEC_PER_MINUTE;
+    if (difference <= 0xFFFFFFFFu && difference < limit) {
+        VLN_LOG(VLN_DBG, "PERF: Refresh Not yet required");
+        return false;
+    }
+    VLN_LOG(VLN_DBG, "PERF: TimeOut");
+    return true;
+}
+
+// Whether the caller has to start the refresh thread. It then owns m_bDataFetchRunning: no other
+// call comes past this test until that thread has ended, so the thread's handle needs no lock.
+bool ProviderAgent::claimRefresh() {
+    Auto_Mutex lock(m_DataFetchMutex);
+    if (!isCacheTimedOut() && !m_bAdapterRefreshRequested && !m_bSANRefreshRequested) {
+        VLN_LOG(VLN_DBG, "PERF: ---No timeout BuildCimpleInfo END---");
+        return false;
+    }
+    if (m_bDiagnosticsRunning) {
+        VLN_LOG(VLN_DBG, "Diagnostics is running.. Skip the internal refresh till it ends");
+        return false;
+    }
+    if (m_bDataFetchRunning) {
+        VLN_LOG(VLN_DBG, "DataFetch_Handler thread already running-BuildCimpleInfo");
+        return false;
+    }
+    m_bDataFetchRunning = true;
+    if (!(m_LoadedTime == Datetime()))
+        VLN_LOG(VLN_DBG, "PERF: Clearing the previous thread...with join");
+    // The previous thread has cleared the running flag in its last locked step: this join is
+    // prompt.
+    joinDataFetch();
+    m_bDataFetchJoinable = true;
+    return true;
+}
+
+void ProviderAgent::joinDataFetch() {
+    if (!m_bDataFetchJoinable)
+        return;
+    void* value = nullptr;
+    Thread::join(m_DataFetchThread, value);
+    m_bDataFetchJoinable = false;
+}
+
+int ProviderAgent::BuildCimpleInfo() {
+    VLN_LOG(VLN_INFO, " Entering BuildCimpleInfo()");
+    // Without the libraries the refresh still runs: it raises the ready flags over empty stores, so
+    // that no client hangs at a gate.
+    if (!m_bLibraryLoaded)
+        VLN_LOG(VLN_DBG,
+                "Vorlan Provider dependent library load has failed..do nothing is the only "
+                "option");
+    if (!claimRefresh())
+        return 0;
+    // Only a pending SAN request alone may leave the adapter data as they are.
+    if (!m_bSANRefreshRequested)
+        m_bAdapterRefreshRequested = true;
+    // A start that fails is not reported, and the running flag stays up: the stores keep what they
+    // hold. All that is noted is that there is no thread to join.
+    if (Thread::create_joinable(m_DataFetchThread, DataFetch_Handler, this) != 0)
+        m_bDataFetchJoinable = false;
+    VLN_LOG(VLN_DBG, "PERF: ---Created DataFetch_Handler thread -- BuildCimpleInfo END---");
+    return 0;
+}
+
+// ---- The thread ----
+
+void* ProviderAgent::DataFetch_Handler(void* argument) {
+    VLN_LOG(VLN_DBG, "PERF: DataFetch_Handler Thread BEGIN");
+    auto* agent = static_cast<ProviderAgent*>(argument);
+    if (agent->m_bRefreshAdapterData || agent->m_bAdapterRefreshRequested)
+        agent->runAdapterPass();
+    if (agent->m_bRefreshSANData || agent->m_bSANRefreshRequested)
+        agent->runSANPass();
+    agent->finishRefresh();
+    VLN_LOG(VLN_DBG, "PERF: DataFetch_Handler Thread END");
+    return nullptr;
+}
+
+void ProviderAgent::runAdapterPass() {
+    rebuildAdapterData();
+    {
+        // New adapter data always make the SAN stores stale.
+        Auto_Mutex lock(m_SANMapsReadyMutex);
+        m_bIsSANMapsReady = false;
+    }
+    rebuildAdapterMaps();
+}
+
+void ProviderAgent::rebuildAdapterData() {
+    VLN_LOG(VLN_DBG, "PERF: Building Adapter Data...");
+    Auto_Mutex gate(m_AdapterDataReadyMutex);
+    m_bAdapterRefreshRequested = false;
+    m_bIsAdapterDataReady = false;
+    // Without its own mutex: a reader may see the old value for a moment and read the old stores,
+    // which are still whole.
+    m_bIsAdapterMapsReady = false;
+    m_bIsAdapterDataBuilding = true;
+    if (m_bLibraryLoaded) {
+        Auto_Mutex data(m_DataMutex);
+        guarded("buildAdapterData", [this] { m_pData->buildAdapterData(); });
+    }
+    m_bIsAdapterDataReady = true;
+    m_bIsAdapterDataBuilding = false;
+    m_AdapterDataReadyCond.broadcast();
+}
+
+void ProviderAgent::rebuildAdapterMaps() {
+    Auto_Mutex gate(m_AdapterMapsReadyMutex);
+    m_bIsAdapterMapsBuilding = true;
+    if (m_bLibraryLoaded) {
+        VLN_LOG(VLN_DBG, "PERF: Updating Adapter Maps...");
+        Auto_Mutex data(m_DataMutex);
+        guarded("updateAdapterMaps", [this] { updateAdapterMaps(); });
+    }
+    m_bIsAdapterMapsReady = true;
+    m_bIsAdapterMapsBuilding = false;
+    m_AdapterMapsReadyCond.broadcast();
+}
+
+// Holds the gates of the adapter data and maps for its whole length, so operations and adapter
+// class clients wait for it as well.
+void ProviderAgent::runSANPass() {
+    Auto_Mutex data_gate(m_AdapterDataReadyMutex);
+    m_bSANRefreshRequested = false;
+    m_bIsSANMapsReady = false; // without its own mutex, as above
+    if (!m_bIsAdapterDataReady)
+        m_AdapterDataReadyCond.wait(m_AdapterDataReadyMutex);
+    Auto_Mutex maps_gate(m_AdapterMapsReadyMutex);
+    if (!m_bIsAdapterMapsReady)
+        m_AdapterMapsReadyCond.wait(m_AdapterMapsReadyMutex);
+    rebuildSANMaps();
+}
+
+void ProviderAgent::rebuildSANMaps() {
+    Auto_Mutex gate(m_SANMapsReadyMutex);
+    m_bIsSANMapsBuilding = true;
+    if (m_bLibraryLoaded) {
+        Auto_Mutex data(m_DataMutex);
+        VLN_LOG(VLN_DBG, "PERF: Updating SAN Maps...");
+        guarded("updateSANMaps", [this] { updateSANMaps(); });
+    }
+    m_bIsSANMapsReady = true;
+    m_bIsSANMapsBuilding = false;
+    m_SANMapsReadyCond.broadcast();
+}
+
+uint32 ProviderAgent::updateSANMaps() {
+    clearSANMaps();
+    return 0;
+}
+
+// The time-out counts from here: from the end of a refresh, not from its start.
+void ProviderAgent::finishRefresh() {
+    Auto_Mutex lock(m_DataFetchMutex);
+    m_bDataFetchRunning = false;
+    m_LoadedTime = Datetime::now();
+}
+
+} // namespace cimple

@@ -1,0 +1,100 @@
+// What a port's numbers mean in CIM: states, enabled states and speeds, as tables.
+#ifndef VLN_AGENT_STATE_TABLES_H
+#define VLN_AGENT_STATE_TABLES_H
+
+#include "cimple/instance.h"
+
+namespace cimple {
+
+struct Port_State {
+    uint32 state; // as the library reports it
+    uint16 operational_status;
+    const char* description;
+};
+
+inline constexpr Port_State UNKNOWN_PORT_STATE = {0, 0, "Unknown"};
+
+// Functional state of a port. 8 says the same as 5 in a number of the vendor's range; that is
+// meant.
+inline constexpr Port_State portStateMap[] = {
+    {2, 2, "OK"},
+    {3, 10, "Stopped"},
+    {4, 1, "Other"},
+    {5, 11, "InService"},
+    {6, 3, "Link Down"},
+    {7, 6, "Error"},
+    {8, 32776, "InService"},
+    {20, 32788, "Operational. Need RESET"},
+    {21, 32789, "Link down. Need RESET"},
+    {22, 32790, "Disable"},
+};
+
+// Functional state of the port as its controller shows it.
+inline constexpr Port_State portControllerStateMap[] = {
+    {2, 2, "OK"},         {3, 10, "Stopped"},   {4, 1, "Other"}, {6, 1, "Other"},
+    {5, 11, "InService"}, {8, 11, "InService"}, {7, 6, "Error"},
+};
+
+struct Enabled_State {
+    uint32 state;
+    uint16 enabled_state;
+};
+
+inline constexpr uint16 OTHER_ENABLED_STATE = 1;
+
+inline constexpr Enabled_State enabledStateMap[] = {
+    {2, 2}, {5, 7}, {1, 0}, {3, 3}, {6, 3}, {21, 3}, {22, 3},
+};
+
+struct Speed_Code {
+    uint32 code; // a bit of the library's speed masks
+    uint64 bits_per_second;
+};
+
+// In the order in which the highest supported speed is sought: 10 Gbit/s first, and 8 Gbit/s before
+// 4 Gbit/s.
+inline constexpr Speed_Code speedCodes[] = {
+    {4, 10000000000}, {16, 8000000000}, {8, 4000000000}, {2, 2000000000}, {1, 1000000000},
+};
+
+template <uint32 N>
+constexpr const Port_State& find_port_state(const Port_State (&map)[N], uint32 state) {
+    for (const Port_State& row : map)
+        if (row.state == state)
+            return row;
+    return UNKNOWN_PORT_STATE;
+}
+
+constexpr uint16 enabled_state(uint32 state) {
+    for (const Enabled_State& row : enabledStateMap)
+        if (row.state == state)
+            return row.enabled_state;
+    return OTHER_ENABLED_STATE;
+}
+
+// Bits per second of one speed code, 0 for a code outside the table.
+constexpr uint64 speed_of_code(uint32 code) {
+    for (const Speed_Code& row : speedCodes)
+        if (row.code == code)
+            return row.bits_per_second;
+    return 0;
+}
+
+// Bits per second of the first speed of the table that the mask supports, else 0.
+constexpr uint64 max_speed_of_mask(uint32 mask) {
+    for (const Speed_Code& row : speedCodes)
+        if (mask & row.code)
+            return row.bits_per_second;
+    return 0;
+}
+
+// Appends the state's number and text to the two status properties that every device has.
+template <class Device>
+void append_port_state(Device* device, const Port_State& state) {
+    device->OperationalStatus.append(state.operational_status);
+    device->StatusDescriptions.append(String(state.description));
+}
+
+} // namespace cimple
+
+#endif // VLN_AGENT_STATE_TABLES_H

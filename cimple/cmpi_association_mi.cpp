@@ -1,0 +1,330 @@
+// The association interface.
+//
+// The provider that answers is the association's own, so the association class of a request is not
+// looked at. Most association providers implement no association operation at all: the answer is
+// then derived by enumerating the association and matching its references with the source.
+//
+// No function here calls CMReturnDone: the object manager closes the result at the end of the call.
+#include "cimple/cmpi_frame.h"
+
+namespace cimple {
+
+namespace {
+
+constexpr Status_Row ASSOCIATOR_NAMES_STATUS[] = {
+    {ENUM_ASSOCIATOR_NAMES_FAILED, CMPI_RC_ERR_FAILED},
+    {ENUM_ASSOCIATOR_NAMES_UNSUPPORTED, CMPI_RC_ERR_NOT_SUPPORTED},
+    {ENUM_ASSOCIATOR_NAMES_ACCESS_DENIED, CMPI_RC_ERR_ACCESS_DENIED},
+};
+
+constexpr Status_Row REFERENCES_STATUS[] = {
+    {ENUM_REFERENCES_FAILED, CMPI_RC_ERR_FAILED},
+    {ENUM_REFERENCES_UNSUPPORTED, CMPI_RC_ERR_NOT_SUPPORTED},
+    {ENUM_REFERENCES_ACCESS_DENIED, CMPI_RC_ERR_ACCESS_DENIED},
+};
+
+// A source class that the library does not know has no associations: the answer is OK. The trace
+// of three of the functions shows 5 for it all the same, which is meant.
+constexpr Answer UNKNOWN_SOURCE(CMPI_RC_OK, CMPI_RC_ERR_INVALID_CLASS);
+
+// What an association operation is asked for; absent texts are "".
+struct Request {
+    const Instance* source;
+    const char* result_class;
+    const char* role;
+    const char* result_role;
+};
+
+const char* text(const char* argument) {
+    return argument ? argument : "";
+}
+
+bool name_accepted(const char* wanted, const char* name) {
+    return *wanted == '\0' || name_equal(wanted, name);
+}
+
+// ---- Matching ----
+
+// An association in this library has far fewer references.
+constexpr uint32 MAX_TARGETS = 16;
+
+bool has_ancestor(const Meta_Class* meta_class, const char* name) {
+    for (; meta_class; meta_class = meta_class->super_meta_class)
+        if (name_equal(meta_class->name, name))
+            return true;
+    return false;
+}
+
+bool is_source(const Request& request, const Meta_Reference* feature, const Instance* end) {
+    return is_subclass(feature->meta_class, request.source->__meta_class) &&
+           key_eq(request.source, end) && name_accepted(request.role, feature->name);
+}
+
+bool is_result(const Request& request, const Meta_Reference* feature, const Instance* end) {
+    return (*request.result_class == '\0' ||
+            has_ancestor(end->__meta_class, request.result_class)) &&
+           name_accepted(request.result_role, feature->name);
+}
+
+// Finds the ends of the association that answer the request, uncounted. The number of them, or -1
+// if the association does not start from the request's source.
+int collect_associators(const Request& request, const Instance* association,
+                        const Instance* (&targets)[MAX_TARGETS]) {
+    const Meta_Class* meta = association->__meta_class;
+    bool source_found = false;
+    uint32 count = 0;
+    for (uint32 i = 0; i < meta->num_meta_features; i++) {
+        if (!(meta->meta_features[i]->flags & FLAG_REFERENCE))
+            continue;
+        const auto* feature = static_cast<const Meta_Reference*>(meta->meta_features[i]);
+        if (feature->subscript != 0)
+            continue;
+        const Instance* end = reference(association, feature);
+        if (!end)
+            continue;
+        if (is_source(request, feature, end))
+            source_found = true;
+        else if (is_result(request, feature, end) && count < MAX_TARGETS)
+            targets[count++] = end;
+    }
+    return source_found ? static_cast<int>(count) : -1;
+}
+
+// ---- Operations with their fallbacks ----
+
+bool is_association(const Call& call) {
+    return call.adapter.meta_class && (call.adapter.meta_class->flags & FLAG_ASSOCIATION);
+}
+
+// A model of the association class for an enumeration: the keys are wanted.
+Ref<Instance> make_association_model(const Call& call) {
+    Ref<Instance> model(create(call.adapter.meta_class));
+    nullify_non_keys(model.get());
+    return model;
+}
+
+struct Associator_Match {
+    const Request& request;
+    Instance_Proc handler;
+    void* client_data;
+};
+
+bool pass_associators(Instance* instance, sint32, void* client_data) {
+    const Ref<Instance> association(instance);
+    if (!instance)
+        return false;
+    const auto* match = static_cast<Associator_Match*>(client_data);
+    const Instance* targets[MAX_TARGETS];
+    const int count = collect_associators(match->request, instance, targets);
+    for (int i = 0; i < count; i++) {
+        ref(targets[i]);
+        match->handler(const_cast<Instance*>(targets[i]), 0, match->client_data);
+    }
+    return true; // whatever the handler says: it forwards nothing after an error
+}
+
+sint32 enum_associator_names_with_fallback(const Call& call, const Request& request,
+                                           Instance_Proc handler, void* client_data) {
+    if (!is_association(call))
+        return ENUM_ASSOCIATOR_NAMES_FAILED;
+    const sint32 status =
+        call.provider(OP_ENUM_ASSOCIATOR_NAMES, request.source, request.result_class, request.role,
+                      request.result_role, handler, client_data);
+    // Denied access becomes a failure here, while the fallback tells the two apart: it is to stay
+    // so.
+    if (status == ENUM_ASSOCIATOR_NAMES_FAILED || status == ENUM_ASSOCIATOR_NAMES_ACCESS_DENIED)
+        return ENUM_ASSOCIATOR_NAMES_FAILED;
+    if (status == ENUM_ASSOCIATOR_NAMES_OK)
+        return status;
+
+    const Ref<Instance> model = make_association_model(call);
+    Associator_Match match = {request, handler, client_data};
+    const sint32 enum_status =
+        call.provider(OP_ENUM_INSTANCES, model.get(), &pass_associators, &match);
+    const sint32 answer = enum_status == ENUM_INSTANCES_FAILED ? ENUM_ASSOCIATOR_NAMES_FAILED
+                          : enum_status == ENUM_INSTANCES_ACCESS_DENIED
+                              ? ENUM_ASSOCIATOR_NAMES_ACCESS_DENIED
+                              : ENUM_ASSOCIATOR_NAMES_OK;
+    handler(nullptr, answer, client_data);
+    return answer;
+}
+
+struct Reference_Match {
+    const Instance* source;
+    const char* role;
+    Instance_Proc handler;
+    void* client_data;
+};
+
+bool pass_reference(Instance* instance, sint32, void* client_data) {
+    Ref<Instance> association(instance);
+    if (!instance)
+        return false;
+    const auto* match = static_cast<Reference_Match*>(client_data);
+    if (is_reference_to(instance, match->source, match->role))
+        match->handler(association.release(), 0, match->client_data);
+    return true;
+}
+
+sint32 enum_references_with_fallback(const Call& call, const Instance* source,
+                                     const Instance* model, const char* role, Instance_Proc handler,
+                                     void* client_data) {
+    if (!is_association(call))
+        return ENUM_REFERENCES_FAILED;
+    const sint32 status =
+        call.provider(OP_ENUM_REFERENCES, source, model, role, handler, client_data);
+    if (status == ENUM_REFERENCES_FAILED || status == ENUM_REFERENCES_ACCESS_DENIED ||
+        status == ENUM_REFERENCES_OK)
+        return status;
+
+    Reference_Match match = {source, role, handler, client_data};
+    const sint32 enum_status = call.provider(OP_ENUM_INSTANCES, model, &pass_reference, &match);
+    const sint32 answer = enum_status == ENUM_INSTANCES_FAILED ? ENUM_REFERENCES_FAILED
+                          : enum_status == ENUM_INSTANCES_ACCESS_DENIED
+                              ? ENUM_REFERENCES_ACCESS_DENIED
+                              : ENUM_REFERENCES_OK;
+    handler(nullptr, answer, client_data);
+    return answer;
+}
+
+// ---- Delivery ----
+
+bool deliver_associator_name(Delivery& delivery, Instance* instance) {
+    return deliver_path(delivery, instance, own_name_space(instance, delivery.name_space));
+}
+
+bool deliver_associator(Delivery& delivery, Instance* instance) {
+    return deliver_instance(delivery, instance, delivery.name_space);
+}
+
+// An association holds no more of its ends than their keys are sure to be: the object manager is
+// asked for the rest. One that is gone meanwhile is left out.
+bool deliver_fetched_associator(Delivery& delivery, Instance* instance) {
+    const CMPIBroker* broker = delivery.call.broker;
+    cmpi::Scoped<CMPIObjectPath> path;
+    delivery.error = make_cmpi_object_path(
+        broker, instance, own_name_space(instance, delivery.name_space), path.out());
+    if (delivery.error != CMPI_RC_OK)
+        return false;
+    CMPIStatus status = cmpi::GOOD_STATUS;
+    const CMPIInstance* found = broker->bft->getInstance(broker, delivery.call.context, path.get(),
+                                                         delivery.properties, &status);
+    if (found && cmpi::good(status))
+        cmpi::return_instance(delivery.result, found);
+    return true;
+}
+
+bool deliver_reference(Delivery& delivery, Instance* instance) {
+    if (delivery.properties)
+        filter_properties(instance, delivery.properties, true);
+    return deliver_instance(delivery, instance, delivery.name_space);
+}
+
+bool deliver_reference_name(Delivery& delivery, Instance* instance) {
+    nullify_non_keys(instance);
+    return deliver_path(delivery, instance, delivery.name_space);
+}
+
+// ---- The functions ----
+
+// The source instance of a request. Keys that the path lacks are null.
+int make_source(const Call& call, const Meta_Class* meta_class, const CMPIObjectPath* path,
+                Ref<Instance>& source) {
+    Instance* instance = nullptr;
+    const int rc = make_cimple_reference(call.converter(path), meta_class, path, instance);
+    source.reset(instance);
+    return rc;
+}
+
+CMPIStatus associator_names(CMPIAssociationMI* mi, const CMPIContext* context,
+                            const CMPIResult* result, const CMPIObjectPath* path, const char*,
+                            const char* result_class, const char* role, const char* result_role) {
+    return run_call(mi, context, "associatorNames", [&](const Call& call) -> Answer {
+        const Meta_Class* meta_class = call.find_class(path);
+        if (!meta_class)
+            return UNKNOWN_SOURCE;
+        Ref<Instance> source;
+        if (const int rc = make_source(call, meta_class, path, source); rc != CMPI_RC_OK)
+            return rc;
+        Delivery delivery = {call, result, path, nullptr, cmpi::name_space(path)};
+        const Request request = {source.get(), text(result_class), text(role), text(result_role)};
+        return map_status(ASSOCIATOR_NAMES_STATUS,
+                          enum_associator_names_with_fallback(
+                              call, request, delivery_handler<deliver_associator_name>, &delivery));
+    });
+}
+
+CMPIStatus associators(CMPIAssociationMI* mi, const CMPIContext* context, const CMPIResult* result,
+                       const CMPIObjectPath* path, const char*, const char* result_class,
+                       const char* role, const char* result_role, const char** properties) {
+    return run_call(mi, context, "associators", [&](const Call& call) -> Answer {
+        const Meta_Class* meta_class = call.find_class(path);
+        if (!meta_class)
+            return CMPI_RC_OK; // here the trace shows the answer, unlike in the other functions
+        Ref<Instance> source;
+        if (const int rc = make_source(call, meta_class, path, source); rc != CMPI_RC_OK)
+            return rc;
+        Delivery delivery = {call, result, path, properties, cmpi::name_space(path)};
+        const Request request = {source.get(), text(result_class), text(role), text(result_role)};
+        const sint32 status =
+            call.provider(OP_ENUM_ASSOCIATORS, request.source, request.result_class, request.role,
+                          request.result_role, &delivery_handler<deliver_associator>, &delivery);
+        switch (status) {
+        case ENUM_ASSOCIATORS_OK:
+            return CMPI_RC_OK;
+        case ENUM_ASSOCIATORS_FAILED:
+            return CMPI_RC_ERR_FAILED;
+        case ENUM_ASSOCIATORS_ACCESS_DENIED:
+            return CMPI_RC_ERR_ACCESS_DENIED;
+        default: // unsupported is one of these
+            return map_status(
+                ASSOCIATOR_NAMES_STATUS,
+                enum_associator_names_with_fallback(
+                    call, request, delivery_handler<deliver_fetched_associator>, &delivery));
+        }
+    });
+}
+
+// references and referenceNames differ in what they deliver only.
+CMPIStatus run_references(CMPIAssociationMI* mi, const CMPIContext* context, const char* function,
+                          const CMPIResult* result, const CMPIObjectPath* path, const char* role,
+                          const char** properties, Instance_Proc handler) {
+    return run_call(mi, context, function, [&](const Call& call) -> Answer {
+        const Meta_Class* meta_class = call.find_class(path);
+        if (!meta_class)
+            return UNKNOWN_SOURCE;
+        Ref<Instance> source;
+        if (const int rc = make_source(call, meta_class, path, source); rc != CMPI_RC_OK)
+            return rc;
+        const Ref<Instance> model = make_association_model(call);
+        if (properties)
+            filter_properties(model.get(), properties, true);
+        Delivery delivery = {call, result, path, properties, cmpi::name_space(path)};
+        return map_status(REFERENCES_STATUS,
+                          enum_references_with_fallback(call, source.get(), model.get(), text(role),
+                                                        handler, &delivery));
+    });
+}
+
+CMPIStatus references(CMPIAssociationMI* mi, const CMPIContext* context, const CMPIResult* result,
+                      const CMPIObjectPath* path, const char*, const char* role,
+                      const char** properties) {
+    return run_references(mi, context, "references", result, path, role, properties,
+                          delivery_handler<deliver_reference>);
+}
+
+CMPIStatus reference_names(CMPIAssociationMI* mi, const CMPIContext* context,
+                           const CMPIResult* result, const CMPIObjectPath* path, const char*,
+                           const char* role) {
+    return run_references(mi, context, "referenceNames", result, path, role, nullptr,
+                          delivery_handler<deliver_reference_name>);
+}
+
+} // namespace
+
+const CMPIAssociationMIFT ASSOCIATION_FUNCTIONS = {
+    CMPICurrentVersion, CMPICurrentVersion, nullptr,    cleanup<CMPIAssociationMI>,
+    associators,        associator_names,   references, reference_names,
+};
+
+} // namespace cimple

@@ -1,0 +1,60 @@
+// Conversion between CMPI data and instances, both ways, driven by the meta classes.
+//
+// Members are written straight from the instance to the broker and back: there is no value in
+// between. A member that cannot be converted is left out with a warning in the engine's log; it
+// never fails the rest. Functions answer CMPI_RC_OK or CMPI_RC_ERR_FAILED. Nothing here locks; all
+// may throw std::bad_alloc.
+#ifndef CIMPLE_CONVERSION_H
+#define CIMPLE_CONVERSION_H
+
+#include "cimple/instance.h"
+#include "cmpi/cmpi.h"
+
+namespace cimple {
+
+// What every conversion needs to know.
+struct Converter {
+    const CMPIBroker* broker;
+    const Meta_Repository* repository; // where classes of references are looked up
+    const char* name_space;            // of what is converted; "" for none
+};
+
+// ---- Types: one table, conversion_to_cmpi.cpp ----
+
+// CMPI's code of a scalar type; 0 for one that has none.
+CMPIType to_cmpi_type(uint32 type);
+// The engine's code of a CMPI type, arrays included; TYPE_NONE for one it does not know.
+sint32 from_cmpi_type(CMPIType type);
+// "UINT8", "STRING_ARRAY", "NONE".
+const char* type_word(sint32 type);
+
+// ---- From CMPI; the caller owns what out receives, null on failure ----
+
+int make_cimple_reference(const Converter& converter, const Meta_Class* meta_class,
+                          const CMPIObjectPath* path, Instance*& out);
+int make_cimple_instance(const Converter& converter, const Meta_Class* meta_class,
+                         const CMPIInstance* instance, Instance*& out);
+// A method instance with its In parameters.
+int make_method_instance(const Converter& converter, const Meta_Method* method,
+                         const CMPIArgs* args, Instance*& out);
+// Reads the Out parameters of a method that was called, and its return value, into the instance.
+int read_method_out(const Converter& converter, const CMPIArgs* args, const CMPIData& return_value,
+                    Instance* method);
+
+// ---- To CMPI; the objects are the broker's, out is null on failure ----
+
+int make_cmpi_object_path(const CMPIBroker* broker, const Instance* instance,
+                          const char* name_space, CMPIObjectPath*& out);
+// With a list only the properties it names, and the keys, reach the CMPI instance.
+int make_CMPI_instance(const CMPIBroker* broker, const Instance* instance, const char* name_space,
+                       CMPIObjectPath* path, const char** properties, CMPIInstance*& out);
+// Fills args with the parameters of a method instance that have the flag (In or Out).
+int make_method_args(const CMPIBroker* broker, const char* name_space, const Instance* method,
+                     uint32 flag, CMPIArgs* args);
+// Out parameters go to args; the return value to out_value. out_type 0: the method returned null.
+int make_method_out(const CMPIBroker* broker, const char* name_space, const Instance* method,
+                    CMPIArgs* args, CMPIValue& out_value, CMPIType& out_type);
+
+} // namespace cimple
+
+#endif // CIMPLE_CONVERSION_H

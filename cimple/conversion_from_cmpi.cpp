@@ -1,0 +1,446 @@
+// CMPI objects to instances.
+#include "cimple/conversion.h"
+
+#include "cimple/cmpi_call.h"
+#include "cimple/log.h"
+
+#include <cstdlib>
+#include <cstring>
+#include <strings.h>
+
+namespace cimple {
+
+namespace {
+
+bool usable(const CMPIData& data) {
+    return !(data.state & cmpi::UNUSABLE);
+}
+
+bool is_integer(sint32 type) {
+    return type >= TYPE_UINT8 && type <= TYPE_SINT64;
+}
+
+// Makes the value an integer of the type, by plain truncation.
+void narrow(CMPIData& data, sint32 type, uint64 value) {
+    data.type = to_cmpi_type(static_cast<uint32>(type));
+    switch (type_size(static_cast<uint32>(type))) {
+    case 1:
+        data.value.uint8 = static_cast<uint8>(value);
+        break;
+    case 2:
+        data.value.uint16 = static_cast<uint16>(value);
+        break;
+    case 4:
+        data.value.uint32 = static_cast<uint32>(value);
+        break;
+    default:
+        data.value.uint64 = value;
+        break;
+    }
+}
+
+// ---- Carriers: where a member comes from. adjust fits a value to the type its member has. ----
+
+struct From_Instance {
+    const CMPIInstance* source;
+    bool count(CMPICount& count) const {
+        CMPIStatus status = cmpi::GOOD_STATUS;
+        count = source->ft->getPropertyCount(source, &status);
+        return cmpi::good(status);
+    }
+    CMPIData at(CMPICount index, CMPIString*& name, CMPIStatus& status) const {
+        return source->ft->getPropertyAt(source, index, &name, &status);
+    }
+    static void adjust(CMPIData&, sint32) {}
+};
+
+struct From_Path {
+    const CMPIObjectPath* source;
+    bool count(CMPICount& count) const {
+        CMPIStatus status = cmpi::GOOD_STATUS;
+        count = source->ft->getKeyCount(source, &status);
+        return cmpi::good(status);
+    }
+    CMPIData at(CMPICount index, CMPIString*& name, CMPIStatus& status) const {
+        return source->ft->getKeyAt(source, index, &name, &status);
+    }
+    // Key values arrive in the widest form: whoever parsed the path did not know the class.
+    static void adjust(CMPIData& data, sint32 expected) {
+        if (!usable(data))
+            return;
+        if (data.type == CMPI_uint64 && is_integer(expected))
+            narrow(data, expected, data.value.uint64);
+        else if (data.type == CMPI_sint64 && expected == TYPE_UINT32)
+            narrow(data, expected, static_cast<uint64>(data.value.sint64));
+    }
+};
+
+// A string in the type that the method's parameter has; clients send them so. What cannot be cast
+// is left alone, and fails the type test that follows.
+void cast_string_to_scalar(CMPIData& data, sint32 expected) {
+    const char* text = cmpi::chars(data.value.string);
+    if (!text)
+        return;
+    if (expected == TYPE_BOOLEAN) {
+        const bool is_true = strncasecmp(text, "true", 4) == 0;
+        if (!is_true && strncasecmp(text, "false", 5) != 0)
+            return;
+        data.type = CMPI_boolean;
+        data.value.boolean = is_true;
+    } else if (expected <= TYPE_SINT32) {
+        narrow(data, expected, static_cast<uint64>(std::strtoll(text, nullptr, 10)));
+    } else if (expected <= TYPE_REAL64) {
+        CIMPLE_WARN("Default case - unsupported type");
+        return;
+    } else {
+        CIMPLE_INFO("cast_cmpi_string_to_scalar(): Not supported");
+        return;
+    }
+    CIMPLE_WARN("converting string to registered parameter type");
+}
+
+struct From_Args {
+    const CMPIArgs* source;
+    bool count(CMPICount& count) const {
+        CMPIStatus status = cmpi::GOOD_STATUS;
+        count = source->ft->getArgCount(source, &status);
+        return cmpi::good(status);
+    }
+    CMPIData at(CMPICount index, CMPIString*& name, CMPIStatus& status) const {
+        return source->ft->getArgAt(source, index, &name, &status);
+    }
+    static void adjust(CMPIData& data, sint32 expected) {
+        if (from_cmpi_type(data.type) == TYPE_NONE && expected == TYPE_INSTANCE + TYPE_ARRAY) {
+            data.type = CMPI_refA;
+            data.state = CMPI_nullValue;
+        } else if (usable(data) && data.type == CMPI_string && expected != TYPE_STRING &&
+                   !(expected & TYPE_ARRAY)) {
+            cast_string_to_scalar(data, expected);
+        }
+    }
+};
+
+template <class Carrier>
+int convert_to_instance(const Converter& converter, const Meta_Features* meta, uint32 flags,
+                        Carrier carrier, Instance* out);
+
+// ---- Values ----
+
+bool read_string(const CMPIString* string, String& out) {
+    if (!string) {
+        CIMPLE_INFO("ignored null CMPI string");
+        out.clear();
+        return true;
+    }
+    const char* text = cmpi::chars(string);
+    if (!text) {
+        CIMPLE_WARN("CMGetCharsPtr() failed");
+        return false;
+    }
+    out = text;
+    return true;
+}
+
+bool read_datetime(const CMPIDateTime* datetime, Datetime& out) {
+    const CMPIString* string = cmpi::string_format(datetime);
+    if (!string) {
+        CIMPLE_WARN("CMGetStringFormat() failed");
+        return false;
+    }
+    const char* text = cmpi::chars(string);
+    if (!text) {
+        CIMPLE_WARN("CMGetCharsPtr() failed");
+        return false;
+    }
+    if (!out.set(text)) {
+        CIMPLE_WARN("conversion error");
+        return false;
+    }
+    return true;
+}
+
+// The object path that tells the class of a reference or an embedded object.
+const CMPIObjectPath* path_of(const CMPIValue& value, bool is_path) {
+    if (is_path ? !value.ref : !value.inst) {
+        CIMPLE_WARN("null instance");
+        return nullptr;
+    }
+    if (is_path)
+        return value.ref;
+    const CMPIObjectPath* path = cmpi::object_path(value.inst);
+    if (!path)
+        CIMPLE_WARN("CMGetObjectPath() failed");
+    return path;
+}
+
+// A new instance of the object's own class, with its own namespace if it has one; null on failure.
+Instance* read_instance(const Converter& converter, const CMPIValue& value, bool is_path) {
+    const CMPIObjectPath* path = path_of(value, is_path);
+    if (!path)
+        return nullptr;
+    const char* name = cmpi::class_name(path);
+    if (!name) {
+        CIMPLE_WARN("CMGetClassName() failed");
+        return nullptr;
+    }
+    const Meta_Class* meta_class = find_meta_class(converter.repository, name);
+    if (!meta_class) {
+        CIMPLE_WARN("failed to find meta class: %s", name);
+        return nullptr;
+    }
+    const Converter inner = {converter.broker, converter.repository, cmpi::name_space(path)};
+    Instance* instance = nullptr;
+    const int rc = is_path ? make_cimple_reference(inner, meta_class, value.ref, instance)
+                           : make_cimple_instance(inner, meta_class, value.inst, instance);
+    if (rc != CMPI_RC_OK)
+        CIMPLE_WARN("failed to create CIMPLE instance");
+    return instance;
+}
+
+bool accepts(const Meta_Features* meta, const Meta_Reference* feature, const Instance* instance) {
+    if (is_subclass(feature->meta_class, instance->__meta_class))
+        return true;
+    CIMPLE_WARN("failed to assign instance of %s to %s.%s", instance->__meta_class->name,
+                meta->name, feature->name);
+    return false;
+}
+
+// The elements of an array, each read by read_element(element); false for the first that fails.
+template <class Read>
+bool read_elements(const CMPIArray* array, Read read_element) {
+    CMPICount size = 0;
+    if (!cmpi::array_size(array, size)) {
+        CIMPLE_WARN("CMGetArrayCount() failed");
+        return false;
+    }
+    for (CMPICount i = 0; i < size; i++) {
+        CMPIData element;
+        if (!cmpi::get_element(array, i, element)) {
+            CIMPLE_WARN("CMGetArrayElementAt() failed");
+            return false;
+        }
+        if (!read_element(element))
+            return false;
+    }
+    return true;
+}
+
+bool read_scalar_array(const CMPIArray* array, CMPIType element_type, uint32 type,
+                       Array_Base& out) {
+    return read_elements(array, [&](const CMPIData& element) {
+        if (element.type != element_type) {
+            CIMPLE_WARN("type mismatch");
+            return false;
+        }
+        if (!usable(element)) {
+            CIMPLE_WARN("encountered null array element");
+            return false;
+        }
+        if (type == TYPE_STRING) {
+            String text;
+            if (!read_string(element.value.string, text))
+                return false;
+            out.append(&text, 1);
+        } else if (type == TYPE_DATETIME) {
+            Datetime datetime;
+            if (!read_datetime(element.value.dateTime, datetime))
+                return false;
+            out.append(&datetime, 1);
+        } else if (type == TYPE_BOOLEAN) {
+            const boolean flag = element.value.boolean != 0;
+            out.append(&flag, 1);
+        } else {
+            out.append(&element.value, 1); // every member starts at the union's first byte
+        }
+        return true;
+    });
+}
+
+// Instances on their way into an array; freed unless taken.
+struct Instance_List {
+    Array<Instance*> items;
+    ~Instance_List() {
+        for (Instance* instance : items)
+            unref(instance);
+    }
+};
+
+bool read_instance_array(const Converter& converter, const Meta_Features* meta,
+                         const Meta_Reference* feature, const CMPIData& data, Array_Base& out) {
+    const CMPIType element_type = data.type & static_cast<CMPIType>(~CMPI_ARRAY);
+    Instance_List list;
+    const bool complete = read_elements(data.value.array, [&](const CMPIData& element) {
+        list.items.append(nullptr); // stays null for a null element
+        if (!usable(element)) {
+            CIMPLE_WARN("encountered null instance element");
+            return true;
+        }
+        if (element.type != element_type) {
+            CIMPLE_WARN("array element type mismatch");
+            return false;
+        }
+        Instance* instance = read_instance(converter, element.value, element_type == CMPI_ref);
+        list.items[list.items.size() - 1] = instance;
+        return instance && accepts(meta, feature, instance);
+    });
+    if (complete)
+        out.swap(list.items);
+    return complete;
+}
+
+// ---- Members ----
+
+bool assign_property(const Meta_Property* property, const CMPIData& data, Instance* instance) {
+    void* to = member(instance, property->offset);
+    bool read = true;
+    if (property->subscript != 0) {
+        Array_Base items(array_traits(property->type));
+        read = read_scalar_array(data.value.array, to_cmpi_type(property->type), property->type,
+                                 items);
+        if (read)
+            static_cast<Array_Base*>(to)->swap(items);
+    } else if (property->type == TYPE_STRING) {
+        read = read_string(data.value.string, *static_cast<String*>(to));
+    } else if (property->type == TYPE_DATETIME) {
+        read = read_datetime(data.value.dateTime, *static_cast<Datetime*>(to));
+    } else if (property->type == TYPE_BOOLEAN) {
+        *static_cast<boolean*>(to) = data.value.boolean != 0;
+    } else {
+        std::memcpy(to, &data.value, type_size(property->type));
+    }
+    if (read)
+        *null_flag(instance, property) = 0;
+    return read;
+}
+
+bool assign_reference(const Converter& converter, const Meta_Features* meta,
+                      const Meta_Reference* feature, const CMPIData& data, Instance* instance) {
+    if (feature->subscript != 0) {
+        auto* items = static_cast<Array_Base*>(member(instance, feature->offset));
+        if (!read_instance_array(converter, meta, feature, data, *items))
+            return false;
+        *null_flag(instance, feature) = 0;
+        return true;
+    }
+    Ref<Instance> target(read_instance(converter, data.value, data.type == CMPI_ref));
+    if (!target || !accepts(meta, feature, target.get()))
+        return false;
+    Instance*& slot = reference(instance, feature);
+    unref(slot);
+    slot = target.release();
+    return true;
+}
+
+// The type a member takes; TYPE_NONE for what is neither property nor reference.
+sint32 expected_type(const Meta_Feature* feature) {
+    if (feature->flags & FLAG_PROPERTY) {
+        const auto* property = static_cast<const Meta_Property*>(feature);
+        return property->type + (property->subscript != 0 ? TYPE_ARRAY : 0);
+    }
+    if (feature->flags & FLAG_REFERENCE)
+        return TYPE_INSTANCE +
+               (static_cast<const Meta_Reference*>(feature)->subscript != 0 ? TYPE_ARRAY : 0);
+    return TYPE_NONE;
+}
+
+// Assigns a value to a member that is null so far; a null value leaves it so.
+bool assign(const Converter& converter, const Meta_Features* meta, const Meta_Feature* feature,
+            const CMPIData& data, Instance* instance) {
+    const sint32 expected = expected_type(feature);
+    const sint32 actual = from_cmpi_type(data.type);
+    if (actual != expected) {
+        CIMPLE_WARN("type mismatch on %s: %s/%s", feature->name, type_word(actual),
+                    type_word(expected));
+        return false;
+    }
+    if (!usable(data))
+        return true;
+    if (feature->flags & FLAG_PROPERTY)
+        return assign_property(static_cast<const Meta_Property*>(feature), data, instance);
+    return assign_reference(converter, meta, static_cast<const Meta_Reference*>(feature), data,
+                            instance);
+}
+
+// Reads the members that share a bit with flags (0: all) from the carrier. Everything else is null
+// afterwards. meta is the class, or the method, whose structure out has. Names that it does not
+// have are ignored: other subclasses of a common base may have them.
+template <class Carrier>
+int convert_to_instance(const Converter& converter, const Meta_Features* meta, uint32 flags,
+                        Carrier carrier, Instance* out) {
+    nullify(out, true, true);
+    CMPICount count = 0;
+    if (!carrier.source || !carrier.count(count))
+        return CMPI_RC_ERR_FAILED;
+    for (CMPICount i = 0; i < count; i++) {
+        CMPIString* name = nullptr;
+        CMPIStatus status = cmpi::GOOD_STATUS;
+        CMPIData data = carrier.at(i, name, status);
+        const char* text = cmpi::good(status) ? cmpi::chars(name) : nullptr;
+        if (!text) {
+            CIMPLE_WARN("get_name() failed: class=%s, index=%u", meta->name, i);
+            continue;
+        }
+        const Meta_Feature* feature = find_feature(meta, text, FLAG_PROPERTY | FLAG_REFERENCE);
+        if (!feature) {
+            CIMPLE_WARN("unknown feature: %s.%s", meta->name, text);
+            continue;
+        }
+        if (flags && !(feature->flags & flags))
+            continue;
+        Carrier::adjust(data, expected_type(feature));
+        if (!assign(converter, meta, feature, data, out))
+            CIMPLE_WARN("conversion error: %s.%s", meta->name, text);
+    }
+    return CMPI_RC_OK;
+}
+
+template <class Carrier>
+int make_instance(const Converter& converter, const Meta_Class* meta_class, uint32 flags,
+                  Carrier carrier, Instance*& out) {
+    out = nullptr;
+    Ref<Instance> instance(create(meta_class));
+    const int rc = convert_to_instance(converter, meta_class, flags, carrier, instance.get());
+    if (rc == CMPI_RC_OK) {
+        set_name_space_recursive(instance.get(), converter.name_space, false);
+        out = instance.release();
+    }
+    return rc;
+}
+
+} // namespace
+
+// ---- Entry points ----
+
+int make_cimple_reference(const Converter& converter, const Meta_Class* meta_class,
+                          const CMPIObjectPath* path, Instance*& out) {
+    return make_instance(converter, meta_class, FLAG_KEY, From_Path{path}, out);
+}
+
+int make_cimple_instance(const Converter& converter, const Meta_Class* meta_class,
+                         const CMPIInstance* instance, Instance*& out) {
+    return make_instance(converter, meta_class, 0, From_Instance{instance}, out);
+}
+
+int make_method_instance(const Converter& converter, const Meta_Method* method,
+                         const CMPIArgs* args, Instance*& out) {
+    // A method stands in for the class of its instance; what both have is all that is read.
+    const Meta_Features* features = method;
+    return make_instance(converter, static_cast<const Meta_Class*>(features), FLAG_IN,
+                         From_Args{args}, out);
+}
+
+int read_method_out(const Converter& converter, const CMPIArgs* args, const CMPIData& return_value,
+                    Instance* method) {
+    const Meta_Features* meta = method->__meta_class;
+    const int rc = convert_to_instance(converter, meta, FLAG_OUT, From_Args{args}, method);
+    if (rc != CMPI_RC_OK)
+        return rc;
+    set_name_space_recursive(method, converter.name_space, false);
+    const Meta_Feature* feature = find_feature(meta, "return_value", FLAG_PROPERTY);
+    if (!usable(return_value))
+        return CMPI_RC_OK;
+    return feature && assign(converter, meta, feature, return_value, method) ? CMPI_RC_OK
+                                                                             : CMPI_RC_ERR_FAILED;
+}
+
+} // namespace cimple

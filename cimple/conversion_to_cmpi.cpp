@@ -1,0 +1,349 @@
+// Instances to CMPI objects, and the table of types that both directions share.
+#include "cimple/conversion.h"
+
+#include "cimple/cmpi_call.h"
+#include "cimple/log.h"
+
+#include <cstring>
+
+namespace cimple {
+
+// ---- Types ----
+
+namespace {
+
+struct Type_Row {
+    CMPIType cmpi_type;
+    const char* word;
+    const char* array_word;
+};
+
+// By type code.
+constexpr Type_Row TYPES[] = {
+    {CMPI_boolean, "BOOLEAN", "BOOLEAN_ARRAY"},    {CMPI_uint8, "UINT8", "UINT8_ARRAY"},
+    {CMPI_sint8, "SINT8", "SINT8_ARRAY"},          {CMPI_uint16, "UINT16", "UINT16_ARRAY"},
+    {CMPI_sint16, "SINT16", "SINT16_ARRAY"},       {CMPI_uint32, "UINT32", "UINT32_ARRAY"},
+    {CMPI_sint32, "SINT32", "SINT32_ARRAY"},       {CMPI_uint64, "UINT64", "UINT64_ARRAY"},
+    {CMPI_sint64, "SINT64", "SINT64_ARRAY"},       {CMPI_real32, "REAL32", "REAL32_ARRAY"},
+    {CMPI_real64, "REAL64", "REAL64_ARRAY"},       {CMPI_char16, "CHAR16", "CHAR16_ARRAY"},
+    {CMPI_string, "STRING", "STRING_ARRAY"},       {CMPI_dateTime, "DATETIME", "DATETIME_ARRAY"},
+    {CMPI_instance, "INSTANCE", "INSTANCE_ARRAY"},
+};
+static_assert(sizeof(TYPES) / sizeof(TYPES[0]) == TYPE_INSTANCE + 1);
+
+} // namespace
+
+CMPIType to_cmpi_type(uint32 type) {
+    return type < NUM_TYPES ? TYPES[type].cmpi_type : CMPI_null;
+}
+
+sint32 from_cmpi_type(CMPIType type) {
+    const sint32 array = type & CMPI_ARRAY ? TYPE_ARRAY : 0;
+    const CMPIType element = type & static_cast<CMPIType>(~CMPI_ARRAY);
+    if (element == CMPI_ref)
+        return TYPE_INSTANCE + array;
+    for (sint32 i = 0; i <= TYPE_INSTANCE; i++)
+        if (TYPES[i].cmpi_type == element)
+            return i + array;
+    return TYPE_NONE;
+}
+
+const char* type_word(sint32 type) {
+    const sint32 element = type & ~TYPE_ARRAY;
+    if (type < 0 || element > TYPE_INSTANCE)
+        return "NONE";
+    return type & TYPE_ARRAY ? TYPES[element].array_word : TYPES[element].word;
+}
+
+// ---- Carriers: where a converted member goes ----
+
+namespace {
+
+struct To_Instance {
+    CMPIInstance* target;
+    bool set(const char* name, const CMPIValue& value, CMPIType type) {
+        if (cmpi::good(target->ft->setProperty(target, name, &value, type)))
+            return true;
+        CIMPLE_WARN("CMSetProperty() failed: %s", name);
+        return false;
+    }
+};
+
+struct To_Path {
+    CMPIObjectPath* target;
+    bool set(const char* name, const CMPIValue& value, CMPIType type) {
+        if (cmpi::good(target->ft->addKey(target, name, &value, type)))
+            return true;
+        CIMPLE_WARN("CMAddKey() failed");
+        return false;
+    }
+};
+
+struct To_Args {
+    CMPIArgs* target;
+    CMPIValue* return_value; // the slot for the method's result
+    CMPIType* return_type;
+    bool set(const char* name, const CMPIValue& value, CMPIType type) {
+        if (return_value && name_equal(name, "return_value")) {
+            *return_value = value;
+            *return_type = type;
+            return true;
+        }
+        if (target && cmpi::good(target->ft->addArg(target, name, &value, type)))
+            return true;
+        CIMPLE_WARN("CMAddArg() failed");
+        return false;
+    }
+};
+
+// ---- Values ----
+
+// Where values come from: the broker makes the objects among them.
+struct Source {
+    const CMPIBroker* broker;
+    const char* name_space;
+};
+
+template <class Carrier>
+bool fill(const Source& source, const Instance* instance, uint32 flags, Carrier carrier);
+
+// A scalar in its natural width. Every member of the union starts at its first byte.
+inline void copy_scalar(CMPIValue& to, const void* from, uint32 type) {
+    switch (type) {
+    case TYPE_BOOLEAN:
+    case TYPE_UINT8:
+    case TYPE_SINT8:
+        std::memcpy(&to, from, 1);
+        break;
+    case TYPE_UINT16:
+    case TYPE_SINT16:
+    case TYPE_CHAR16:
+        std::memcpy(&to, from, 2);
+        break;
+    case TYPE_UINT32:
+    case TYPE_SINT32:
+    case TYPE_REAL32:
+        std::memcpy(&to, from, 4);
+        break;
+    default:
+        std::memcpy(&to, from, 8);
+        break;
+    }
+}
+
+// One value of a property's type, or one element of an array of them.
+bool scalar_value(const Source& source, const void* from, uint32 type, CMPIValue& value) {
+    switch (type) {
+    case TYPE_STRING:
+        value.string = cmpi::new_string(source.broker, static_cast<const String*>(from)->c_str());
+        return value.string != nullptr;
+    case TYPE_DATETIME:
+        value.dateTime =
+            cmpi::new_datetime(source.broker, static_cast<const Datetime*>(from)->ascii().c_str());
+        return value.dateTime != nullptr;
+    default:
+        value.uint64 = 0;
+        copy_scalar(value, from, type);
+        return true;
+    }
+}
+
+bool array_value(const Source& source, const Array_Base& items, uint32 type, CMPIValue& value) {
+    const CMPIType element_type = to_cmpi_type(type);
+    value.array = cmpi::new_array(source.broker, items.size(), element_type);
+    if (!value.array)
+        return false;
+    const char* item = static_cast<const char*>(items.data());
+    const uint32 step = type_size(type);
+    for (uint32 i = 0; i < items.size(); i++, item += step) {
+        CMPIValue element;
+        if (!scalar_value(source, item, type, element))
+            return false;
+        if (!cmpi::set_element(value.array, i, element, element_type)) {
+            CIMPLE_WARN("CMSetArrayElementAt() failed");
+            return false;
+        }
+    }
+    return true;
+}
+
+// A reference becomes an object path, an embedded object an instance. Each lies in its own
+// namespace, or in that of what contains it.
+bool instance_value(const Source& source, const Instance* instance, bool embedded,
+                    CMPIValue& value) {
+    if (!instance) {
+        CIMPLE_WARN("null instance argument");
+        return false;
+    }
+    const Source own = {source.broker, instance->__name_space.empty()
+                                           ? source.name_space
+                                           : instance->__name_space.c_str()};
+    if (!own.name_space || !instance->__meta_class->name) {
+        CIMPLE_WARN(own.name_space ? "null classname" : "null namespace");
+        return false;
+    }
+    CMPIObjectPath* path = cmpi::new_path(own.broker, own.name_space, instance->__meta_class->name);
+    if (!path) {
+        CIMPLE_WARN("CMNewObjectPath() failed");
+        return false;
+    }
+    if (!fill(own, instance, FLAG_KEY, To_Path{path})) {
+        CIMPLE_WARN("Container::convert() failed");
+        return false;
+    }
+    if (!embedded) {
+        value.ref = path;
+        return true;
+    }
+    value.inst = cmpi::new_instance(own.broker, path);
+    if (!value.inst) {
+        CIMPLE_WARN("CMNewInstance() failed");
+        return false;
+    }
+    return fill(own, instance, 0, To_Instance{value.inst});
+}
+
+bool instance_array_value(const Source& source, const Array_Base& items, bool embedded,
+                          CMPIType element_type, CMPIValue& value) {
+    value.array = cmpi::new_array(source.broker, items.size(), element_type);
+    if (!value.array)
+        return false;
+    const auto* item = static_cast<const Instance* const*>(items.data());
+    for (uint32 i = 0; i < items.size(); i++) {
+        CMPIValue element;
+        if (!instance_value(source, item[i], embedded, element)) {
+            CIMPLE_WARN("element conversion failed");
+            return false;
+        }
+        if (!cmpi::set_element(value.array, i, element, element_type)) {
+            CIMPLE_WARN("CMSetArrayElementAt() failed");
+            return false;
+        }
+    }
+    return true;
+}
+
+// The value of a member that is not null, with its CMPI type.
+bool to_cmpi_data(const Source& source, const Instance* instance, const Meta_Feature* feature,
+                  CMPIValue& value, CMPIType& type) {
+    if (feature->flags & FLAG_PROPERTY) {
+        const auto* property = static_cast<const Meta_Property*>(feature);
+        const void* from = member(instance, property->offset);
+        type = to_cmpi_type(property->type);
+        if (property->subscript == 0)
+            return scalar_value(source, from, property->type, value);
+        type |= CMPI_ARRAY;
+        return array_value(source, *static_cast<const Array_Base*>(from), property->type, value);
+    }
+    const auto* target = static_cast<const Meta_Reference*>(feature);
+    const bool embedded = (feature->flags & FLAG_EMBEDDED) != 0;
+    type = embedded ? CMPI_instance : CMPI_ref;
+    if (target->subscript == 0)
+        return instance_value(source, reference(instance, target), embedded, value);
+    const auto* items = static_cast<const Array_Base*>(member(instance, target->offset));
+    const CMPIType element_type = type;
+    type |= CMPI_ARRAY;
+    return instance_array_value(source, *items, embedded, element_type, value);
+}
+
+// Hands the members that share a bit with flags (0: all) and are not null to the carrier. Fails for
+// a null instance only.
+template <class Carrier>
+bool fill(const Source& source, const Instance* instance, uint32 flags, Carrier carrier) {
+    if (!instance) {
+        CIMPLE_WARN("ignored null instance arg");
+        return false;
+    }
+    const Meta_Features* meta = instance->__meta_class;
+    for (uint32 i = 0; i < meta->num_meta_features; i++) {
+        const Meta_Feature* feature = meta->meta_features[i];
+        if (flags && !(feature->flags & flags))
+            continue;
+        if ((feature->flags & FLAG_METHOD) || is_null(instance, feature))
+            continue;
+        CMPIValue value;
+        CMPIType type;
+        bool converted = to_cmpi_data(source, instance, feature, value, type);
+        if (!converted)
+            CIMPLE_WARN("_to_cmpi_data() failed: feature=%s", feature->name);
+        else
+            converted = carrier.set(feature->name, value, type);
+        if (!converted)
+            CIMPLE_WARN("conversion error: %s.%s", meta->name, feature->name);
+    }
+    return true;
+}
+
+// One broker needs the key names beside the list, or it would filter the keys out.
+void set_property_filter(CMPIInstance* target, const Meta_Features* meta, const char** properties) {
+    constexpr uint32 MAX_KEYS = 32;
+    const char* keys[MAX_KEYS + 1];
+    uint32 count = 0;
+    for (uint32 i = 0; i < meta->num_meta_features && count < MAX_KEYS; i++)
+        if (meta->meta_features[i]->flags & FLAG_KEY)
+            keys[count++] = meta->meta_features[i]->name;
+    keys[count] = nullptr;
+    target->ft->setPropertyFilter(target, properties, keys);
+}
+
+} // namespace
+
+// ---- Entry points ----
+
+int make_cmpi_object_path(const CMPIBroker* broker, const Instance* instance,
+                          const char* name_space, CMPIObjectPath*& out) {
+    out = nullptr;
+    if (!instance) {
+        CIMPLE_WARN("ignored null instance arg");
+        return CMPI_RC_ERR_FAILED;
+    }
+    CMPIObjectPath* path = cmpi::new_path(broker, name_space, instance->__meta_class->name);
+    if (!path) {
+        CIMPLE_WARN("CMNewObjectPath() failed");
+        return CMPI_RC_ERR_FAILED;
+    }
+    fill({broker, name_space}, instance, FLAG_KEY, To_Path{path});
+    out = path;
+    return CMPI_RC_OK;
+}
+
+int make_CMPI_instance(const CMPIBroker* broker, const Instance* instance, const char* name_space,
+                       CMPIObjectPath* path, const char** properties, CMPIInstance*& out) {
+    out = nullptr;
+    if (!instance) {
+        CIMPLE_WARN("ignored null instance arg");
+        return CMPI_RC_ERR_FAILED;
+    }
+    if (!path) {
+        CIMPLE_WARN("No ObjectPath built before call to make_CMPI_instance");
+        if (make_cmpi_object_path(broker, instance, name_space, path) != CMPI_RC_OK)
+            return CMPI_RC_ERR_FAILED;
+    }
+    CMPIInstance* target = cmpi::new_instance(broker, path);
+    if (!target) {
+        CIMPLE_WARN("CMNewInstance() failed");
+        return CMPI_RC_ERR_FAILED;
+    }
+    if (properties)
+        set_property_filter(target, instance->__meta_class, properties);
+    fill({broker, name_space}, instance, 0, To_Instance{target});
+    out = target;
+    return CMPI_RC_OK;
+}
+
+int make_method_args(const CMPIBroker* broker, const char* name_space, const Instance* method,
+                     uint32 flag, CMPIArgs* args) {
+    return fill({broker, name_space}, method, flag, To_Args{args, nullptr, nullptr})
+               ? CMPI_RC_OK
+               : CMPI_RC_ERR_FAILED;
+}
+
+int make_method_out(const CMPIBroker* broker, const char* name_space, const Instance* method,
+                    CMPIArgs* args, CMPIValue& out_value, CMPIType& out_type) {
+    out_type = CMPI_null;
+    return fill({broker, name_space}, method, FLAG_OUT, To_Args{args, &out_value, &out_type})
+               ? CMPI_RC_OK
+               : CMPI_RC_ERR_FAILED;
+}
+
+} // namespace cimple

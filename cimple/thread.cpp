@@ -1,0 +1,245 @@
+#include "cimple/thread.h"
+
+#include "cimple/assert.h"
+#include "cimple/log.h"
+#include "cimple/thread_context.h"
+
+#include <atomic>
+#include <cerrno>
+#include <cstdio>
+#include <cstring>
+#include <cxxabi.h>
+#include <memory>
+#include <new>
+
+namespace cimple {
+
+// ---- The lock order ----
+
+#ifdef CIMPLE_CHECK_LOCKS
+namespace {
+
+struct Held_Lock {
+    const Mutex* mutex;
+    int rank;
+    const char* name;
+};
+
+// The ranked locks of this thread, in the order they were taken. Plain data: nothing of it needs a
+// destructor when a thread of the object manager ends.
+constexpr unsigned MAX_HELD = 32;
+thread_local Held_Lock held_locks[MAX_HELD];
+thread_local unsigned num_held_locks = 0;
+
+void check_lock_order(const Mutex* mutex, int rank, const char* name) {
+    const Held_Lock* conflict = nullptr;
+    for (unsigned i = 0; i < num_held_locks; i++) {
+        if (held_locks[i].mutex == mutex)
+            return; // a recursive mutex may be taken again at any time
+        if (held_locks[i].rank >= rank)
+            conflict = &held_locks[i];
+    }
+    if (!conflict)
+        return;
+    char text[256];
+    std::snprintf(text, sizeof(text), "lock order: %s (rank %d) taken while %s (rank %d) is held",
+                  name, rank, conflict->name, conflict->rank);
+    __cimple_assert(__FILE__, __LINE__, "check_lock_order", text);
+}
+
+void note_locked(const Mutex* mutex, int rank, const char* name) {
+    CIMPLE_ASSERT(num_held_locks < MAX_HELD);
+    held_locks[num_held_locks++] = {mutex, rank, name};
+}
+
+void note_unlocked(const Mutex* mutex) {
+    unsigned i = num_held_locks;
+    while (i > 0 && held_locks[i - 1].mutex != mutex)
+        i--;
+    if (i == 0)
+        return;
+    for (; i < num_held_locks; i++)
+        held_locks[i - 1] = held_locks[i];
+    num_held_locks--;
+}
+
+} // namespace
+#else
+namespace {
+inline void check_lock_order(const Mutex*, int, const char*) {}
+inline void note_locked(const Mutex*, int, const char*) {}
+inline void note_unlocked(const Mutex*) {}
+} // namespace
+#endif
+
+// ---- Mutex, Cond ----
+
+Mutex::~Mutex() {
+    pthread_mutex_destroy(&_mutex);
+}
+
+void Mutex::lock() {
+    if (_rank)
+        check_lock_order(this, _rank, _name);
+    if (pthread_mutex_lock(&_mutex) != 0)
+        __cimple_assert("Mutex", __LINE__, "void cimple::Mutex::lock()",
+                        "pthread_mutex_lock(&((MutexRep*)_rep)->mutex) == 0");
+    if (_rank)
+        note_locked(this, _rank, _name);
+}
+
+int Mutex::try_lock() {
+    // An attempt cannot block, so it has no place in the order; what it takes has.
+    const int error = pthread_mutex_trylock(&_mutex);
+    if (error == 0 && _rank)
+        note_locked(this, _rank, _name);
+    return error == 0 || error == EBUSY ? error : -1;
+}
+
+void Mutex::unlock() {
+    if (_rank)
+        note_unlocked(this);
+    pthread_mutex_unlock(&_mutex);
+}
+
+Cond::~Cond() {
+    pthread_cond_destroy(&_cond);
+}
+
+void Cond::signal() {
+    pthread_cond_signal(&_cond);
+}
+
+void Cond::broadcast() {
+    pthread_cond_broadcast(&_cond);
+}
+
+void Cond::wait(Mutex& mutex) {
+    pthread_cond_wait(&_cond, &mutex._mutex);
+}
+
+// ---- Thread ----
+
+namespace {
+
+struct Thread_Start {
+    Thread_Proc proc;
+    void* argument;
+    Thread_Context* context;
+};
+
+// Keeps the new thread's context on its stack; runs on every way out, Thread::exit among them.
+class Context_Holder {
+public:
+    explicit Context_Holder(Thread_Context* context) : _context(context) {
+        if (context)
+            Thread_Context::push(context);
+    }
+    ~Context_Holder() {
+        if (_context) {
+            Thread_Context::pop();
+            delete _context;
+        }
+    }
+    Context_Holder(const Context_Holder&) = delete;
+    Context_Holder& operator=(const Context_Holder&) = delete;
+
+private:
+    Thread_Context* _context;
+};
+
+void* run_guarded(Thread_Proc proc, void* argument) {
+    try {
+        return proc(argument);
+    } catch (abi::__forced_unwind&) {
+        throw; // Thread::exit and cancellation unwind the stack this way
+    } catch (...) {
+        CIMPLE_ERR("exception in a thread");
+        return nullptr;
+    }
+}
+
+void* _thread_proc(void* start_record) {
+    const Thread_Start start = *static_cast<Thread_Start*>(start_record);
+    delete static_cast<Thread_Start*>(start_record);
+
+    Thread_Context* context = start.context;
+    const Context_Holder holder(context);
+    void* value;
+    if (context) {
+        context->thread_start_hook();
+        value = run_guarded(start.proc, start.argument);
+        context->thread_exit_hook();
+    } else {
+        value = run_guarded(start.proc, start.argument);
+    }
+    CIMPLE_ASSERT(context == Thread_Context::top());
+    return value;
+}
+
+int create_thread(pthread_t& thread, Thread_Proc proc, void* argument, int detach_state) {
+    std::unique_ptr<Thread_Start> start(new (std::nothrow) Thread_Start{proc, argument, nullptr});
+    if (!start)
+        return ENOMEM;
+    if (Thread_Context* parent = Thread_Context::top())
+        start->context = parent->thread_create_hook(argument);
+
+    pthread_attr_t attributes;
+    pthread_attr_init(&attributes);
+    pthread_attr_setdetachstate(&attributes, detach_state);
+    const int error = pthread_create(&thread, &attributes, _thread_proc, start.get());
+    pthread_attr_destroy(&attributes);
+
+    if (error == 0)
+        start.release(); // the new thread frees it
+    else
+        delete start->context;
+    return error;
+}
+
+} // namespace
+
+int Thread::create_joinable(Thread& thread, Thread_Proc proc, void* argument) {
+    return create_thread(thread._thread, proc, argument, PTHREAD_CREATE_JOINABLE);
+}
+
+int Thread::create_detached(Thread& thread, Thread_Proc proc, void* argument) {
+    return create_thread(thread._thread, proc, argument, PTHREAD_CREATE_DETACHED);
+}
+
+int Thread::join(Thread& thread, void*& value) {
+    value = nullptr;
+    return pthread_join(thread._thread, &value);
+}
+
+void Thread::exit(void* value) {
+    if (Thread_Context* context = Thread_Context::top())
+        context->thread_exit_hook();
+    pthread_exit(value);
+}
+
+Thread Thread::self() {
+    Thread thread;
+    thread._thread = pthread_self();
+    return thread;
+}
+
+// ---- Time ----
+
+namespace {
+std::atomic<const Time::Clock*> the_clock{&system_clock};
+}
+
+uint64 Time::now() {
+    return the_clock.load(std::memory_order_relaxed)->now();
+}
+
+void Time::sleep(uint64 usec) {
+    the_clock.load(std::memory_order_relaxed)->sleep(usec);
+}
+
+void Time::replace_clock(const Clock* clock) {
+    the_clock = clock ? clock : &system_clock;
+}
+
+} // namespace cimple

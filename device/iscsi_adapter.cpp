@@ -1,0 +1,54 @@
+#include "device/iscsi_adapter.h"
+
+#include "device/hba_api.h"
+
+namespace cimple {
+
+namespace {
+
+constexpr Cleanup_Texts ADAPTER_TEXTS = {"~iSCSIAdapter", "iSCSIAdapter _AdapterAttributes error",
+                                         "iSCSIAdapter _AdapterStatistics error",
+                                         "iSCSIAdapter Port cleanup error"};
+constexpr Cleanup_Texts PORT_TEXTS = {"~iSCSIPort", "Port Attribute delete error!!!",
+                                      "Port Statistics delete error!!!", nullptr};
+
+} // namespace
+
+iSCSIAdapter::iSCSIAdapter(const std::string& name, uint32 number,
+                           const HBAIdentifier& hbaIdentifier, const LocalHBAInfoV4& localHBAInfo)
+    : Adapter(name, number, ADAPTER_ISCSI) {
+    HBA_Name_Buffer hbaName;
+    if (readHbaAdapterName(number, hbaName) != HBA_STATUS_OK)
+        VLN_LOG(VLN_DBG, "AdapterName:%s:adapterNumber%d", hbaName.text, number);
+    hbaAdapterName = hbaName.text;
+
+    auto read = std::make_unique<iSCSIAdapterAttributes>(hbaIdentifier, localHBAInfo);
+    const uint32 count = read->numberOfPorts;
+    attributes = std::move(read);
+    statistics = std::make_unique<iSCSIAdapterStatistics>(*this);
+    makePorts<iSCSIPort>(count, hbaIdentifier, localHBAInfo);
+}
+
+iSCSIAdapter::~iSCSIAdapter() noexcept(false) {
+    releaseOwned(ADAPTER_TEXTS);
+}
+
+iSCSIPort::iSCSIPort(Adapter& owner, uint32 index, const HBAIdentifier& hbaIdentifier,
+                     const LocalHBAInfoV4& localHBAInfo)
+    : Port(owner, index) {
+    auto read = std::make_unique<iSCSIPortAttributes>(owner, index, hbaIdentifier, localHBAInfo);
+    portName = read->PortWWN;
+    nodeName = read->NodeWWN;
+    attributes = std::move(read);
+}
+
+iSCSIPort::~iSCSIPort() noexcept(false) {
+    releaseOwned(PORT_TEXTS);
+}
+
+PortStatistics* iSCSIPort::getPortStatistics() {
+    return refreshStatistics<iSCSIPortStatistics>(
+        "iSCSI Port statistics error occurred,retain the old statistics !!!");
+}
+
+} // namespace cimple

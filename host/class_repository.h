@@ -1,0 +1,96 @@
+// The classes that the object manager knows, read from MOF, in the form that its checks need.
+//
+// Built once, then read by any number of threads. Pointers to classes hold as long as the repository.
+#ifndef HOST_CLASS_REPOSITORY_H
+#define HOST_CLASS_REPOSITORY_H
+
+#include "host/text.h"
+#include "host/value.h"
+#include "schema/mof_parser/mof.h"
+
+#include <memory>
+#include <optional>
+#include <string>
+#include <string_view>
+#include <vector>
+
+namespace host {
+
+struct Class;
+
+// What a property, a parameter and the result of a method have in common.
+struct Slot_Type {
+    CMPIType type = CMPI_string; // an embedded object has the type string, as in MOF
+    bool embedded = false;
+    const Class* target = nullptr; // of a reference or an embedded instance; null: any class
+};
+
+struct Property : Slot_Type {
+    std::string name;
+    bool key = false;
+    bool is_reference() const { return (type & ~CMPI_ARRAY) == CMPI_ref; }
+};
+
+struct Parameter : Slot_Type {
+    std::string name;
+    bool in = true;
+    bool out = false;
+};
+
+struct Method {
+    std::string name;
+    Slot_Type result;
+    std::vector<Parameter> parameters;
+    const Parameter* find(std::string_view name) const;
+};
+
+struct Class {
+    std::string name;
+    const Class* superclass = nullptr;
+    std::vector<Property> properties; // inherited ones first; references are among them
+    std::vector<Method> methods;
+    std::vector<std::size_t> keys; // indices of properties
+    bool is_association = false;
+
+    static constexpr std::size_t npos = static_cast<std::size_t>(-1);
+    std::size_t index_of(std::string_view property) const; // npos: no such property
+    const Property* find_property(std::string_view name) const;
+    const Method* find_method(std::string_view name) const;
+    bool is_a(const Class* ancestor) const; // a class is itself, too
+    std::vector<std::string> property_names() const;
+
+    Name_Map<std::size_t> index; // of properties by name
+};
+
+class ClassRepository {
+public:
+    // One more class, without properties of its own, as a platform file may declare it.
+    struct Extra_Class {
+        std::string name;
+        std::string superclass; // empty: none
+    };
+
+    // Throws mof::Error for a file that cannot be read or is malformed.
+    explicit ClassRepository(const std::string& mof_path);
+    ClassRepository(const ClassRepository&) = delete;
+    ClassRepository& operator=(const ClassRepository&) = delete;
+
+    // Adds a class before the repository is shared; says what is wrong, or nothing.
+    std::optional<std::string> add(const Extra_Class& extra);
+
+    const Class* find(std::string_view name) const; // null: unknown
+    // In the order of the MOF, then the extra ones in the order of addition.
+    const std::vector<std::unique_ptr<Class>>& classes() const { return _classes; }
+    std::vector<std::string> names() const;
+
+private:
+    Class& append(std::string name, const Class* superclass);
+    void fill(Class& target, const mof::Schema_Class& source);
+
+    std::vector<std::unique_ptr<Class>> _classes;
+    Name_Map<const Class*> _by_name;
+};
+
+} // namespace host
+
+#endif // HOST_CLASS_REPOSITORY_H

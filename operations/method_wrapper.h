@@ -1,0 +1,87 @@
+// The operations over the management library: the one place where the services talk to it.
+//
+// VLN_MethodWrapper turns a request into bound calls: it converts identifiers, tests for the
+// feature needed, allocates the library's buffers, repeats a call whose buffer was too small, logs
+// the outcome and returns the library's status. The operations are static, hold no lock and may run
+// on any thread at the same time; they must not touch the device model, so what they need of it
+// their callers hand in. They fail by return value and throw nothing. A family of operations has a
+// file of its own, and all are written in the frame of operation_frame.h.
+//
+// Statuses that the operations return by themselves: 0 success; 1 general failure; 4 null output
+// pointer; 8 out of memory; 251 the adapter lacks the feature.
+#ifndef OPERATIONS_METHOD_WRAPPER_H
+#define OPERATIONS_METHOD_WRAPPER_H
+
+#include "cimple/types.h"
+#include "device/axapi.h"
+
+#include <string>
+
+namespace cimple {
+
+// An IP address: IPv4 in the first four bytes and the rest zero, or IPv6, in network order.
+struct VLN_IpInfo {
+    uint8 address[16];
+};
+
+class VLN_MethodWrapper {
+public:
+    // Bytes of a name in colon form with its end mark.
+    static constexpr std::size_t HBA_NAME_SIZE = 24;
+
+    // The object brackets the lifetime of the library; the ProviderAgent owns the only one. The
+    // constructor initialises the library once in this process, over a POSIX named semaphore, and
+    // throws std::exception when the library refuses. It waits, without end, for an
+    // initialisation that is under way on another thread.
+    VLN_MethodWrapper();
+    ~VLN_MethodWrapper();
+    VLN_MethodWrapper(const VLN_MethodWrapper&) = delete;
+    VLN_MethodWrapper& operator=(const VLN_MethodWrapper&) = delete;
+
+    // ---- Identifiers (identifiers.cpp) ----
+    //
+    // A device identifier is 16 hexadecimal digits, with or without a double quote in front; the
+    // colon form is "XX:XX:XX:XX:XX:XX:XX:XX". Mind the senses of the results.
+
+    // Device identifier to colon form; text has room for HBA_NAME_SIZE. 0, or 1 for a null
+    // argument. The characters are not tested: str2HBAName refuses what is no name.
+    static uint32 Id2HBAName(char* text, const char* deviceId);
+    // Colon form to binary. 0, or 1 when the text is not valid.
+    static uint32 str2HBAName(HBA_WWN* name, const char* text);
+    // 16 hexadecimal digits to binary. 1 for success and 0 for failure: the reverse of the others.
+    static uint32 string2HBAName(HBA_WWN* name, const char* text);
+    // Binary to colon form; text has room for HBA_NAME_SIZE. 0 always; a null text is left alone.
+    static uint32 HBAName2Str(char* text, const HBA_WWN* name);
+    // 0 when the name is a local adapter's, 1 otherwise.
+    static uint32 Validatewwpn(const HBA_WWN* name);
+    // Address or host name to binary; it may ask the resolver. 0, or 1 when that fails.
+    static uint32 ipAddr2IpInfo(const char* text, VLN_IpInfo* address);
+
+    // ---- Library and features (library_queries.cpp) ----
+
+    // The version text of the management library. The argument is the library asked for, which
+    // makes no difference: they are released as one. 8 when out of memory.
+    static AX_STATUS GetLibraryVersion(const char* library, std::string* text);
+    static AX_STATUS GetNIMALibVersion(std::string* text);
+    // True for the Tessel generation; false also when the adapter can't be asked.
+    static bool IsTesselCNA(const HBA_WWN* name);
+    // What the port does beside Ethernet. On failure the flags are as far as they were found, and
+    // isNicOnly is false.
+    static AX_STATUS GetCNAType(const HBA_WWN* name, bool& isNicOnly, bool& isISCSI, bool& isFCoE,
+                                bool& isRoCe);
+    // list: AX_FEATURE_LIST_SIZE bytes, one per feature.
+    static AX_STATUS GetHBAFeatureList(const HBA_WWN* name, uint8* list);
+
+    // ---- Port speed (port_speed.cpp) ----
+
+    // How the speed of the physical port is set. What the adapter does not tell is 0 or empty.
+    static AX_STATUS GetPhyPortSpeedAttributesValues(const HBA_WWN* name,
+                                                     AX_PhyPortSpeed* settings);
+
+    // Logs a status of the library with its text for it, if it has one, at level 5.
+    static void logStatus(AX_STATUS status);
+};
+
+} // namespace cimple
+
+#endif // OPERATIONS_METHOD_WRAPPER_H

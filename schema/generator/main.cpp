@@ -1,0 +1,52 @@
+// vln_generator CATALOGUE.mof OUTPUT-FOLDER SHARE-FOLDER META-FILES PROC-FILES ENTRY-FILES
+//
+// Exit status: 0 done, 1 a fault of the catalogue or of the file system (one line on standard
+// error, "file:line:column: what is wrong" for the catalogue), 2 wrong usage.
+#include "schema/generator/generator.h"
+
+#include <charconv>
+#include <cstdio>
+#include <cstring>
+
+namespace {
+
+constexpr std::size_t MAX_PARTS = 99;
+
+bool number(const char* text, std::size_t& value) {
+    const char* end = text + std::strlen(text);
+    auto [stop, fault] = std::from_chars(text, end, value);
+    return fault == std::errc() && stop == end && value >= 1 && value <= MAX_PARTS;
+}
+
+void generate(const char* source, const char* folder, const char* share,
+              const generator::Parts& parts) {
+    const generator::Catalogue catalogue = generator::load_catalogue(source);
+    if (catalogue.providers.empty())
+        throw std::runtime_error(std::string(source) + ":1:1: no class to provide");
+    const generator::Output output(folder);
+    generator::write_classes(catalogue, output);
+    generator::write_meta_tables(catalogue, output, parts.meta);
+    generator::write_providers(catalogue, output, parts.procs);
+    generator::write_entries(catalogue, output, parts.entries);
+    generator::write_share(catalogue, generator::Output(share));
+}
+
+} // namespace
+
+int main(int argc, char** argv) {
+    generator::Parts parts;
+    if (argc != 7 || !number(argv[4], parts.meta) || !number(argv[5], parts.procs) ||
+        !number(argv[6], parts.entries)) {
+        std::fputs("usage: vln_generator CATALOGUE.mof OUTPUT-FOLDER SHARE-FOLDER"
+                   " META-FILES PROC-FILES ENTRY-FILES\n",
+                   stderr);
+        return 2;
+    }
+    try {
+        generate(argv[1], argv[2], argv[3], parts);
+        return 0;
+    } catch (const std::exception& fault) {
+        std::fprintf(stderr, "%s\n", fault.what());
+        return 1;
+    }
+}

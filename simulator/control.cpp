@@ -1,0 +1,237 @@
+// The control interface: scenario, faults, counts, records.
+#include "simulator/call.h"
+#include "simulator/scenario.h"
+
+#include <algorithm>
+#include <set>
+
+namespace {
+
+using namespace vlnsim;
+
+int fail(const std::string& what, char* error, std::size_t size) {
+    if (error)
+        copy_text(what, error, size);
+    return 1;
+}
+
+int load(std::string text, std::string name, char* error, std::size_t size) {
+    Host host = read_scenario(text, name);
+    Simulator& simulator = Simulator::instance();
+    std::lock_guard lock(simulator.mutex);
+    simulator.replace_host(std::move(host), std::move(text), std::move(name));
+    if (error)
+        copy_text("", error, size);
+    return 0;
+}
+
+// Runs an action that answers 0 or 1; what it throws becomes 1 and a text.
+template <class Action>
+int guarded(char* error, std::size_t size, Action action) {
+    try {
+        return action();
+    } catch (const std::exception& e) {
+        return fail(e.what(), error, size);
+    }
+}
+
+int copy_line(const std::vector<std::string>& lines, std::size_t index, char* text,
+              std::size_t size) {
+    if (index >= lines.size() || !text)
+        return 1;
+    copy_text(lines[index], text, size);
+    return 0;
+}
+
+void set_attribute(Attribute_Map& map, std::span<const Identifier> table, const Node& value,
+                   const char* name) {
+    const std::uint32_t number = read_identifier(value, name, table);
+    const auto identifier = static_cast<std::uint16_t>(number);
+    if (value.is(Value::Kind::null))
+        map.erase(identifier);
+    else
+        map[identifier] = read_attribute(value, find_identifier(table, number));
+}
+
+void set_value(Function& function, const std::string& table, const char* name, const Node& value) {
+    if (table == "adapterAttributes") {
+        set_attribute(function.adapter_attributes, adapter_attribute_identifiers(), value, name);
+    } else if (table == "portAttributes") {
+        set_attribute(function.port_attributes, port_attribute_identifiers(), value, name);
+    } else if (table == "statistics") {
+        const auto id =
+            static_cast<std::uint16_t>(read_identifier(value, name, statistic_identifiers()));
+        if (value.is(Value::Kind::null))
+            function.statistics.erase(id);
+        else
+            function.statistics[id] = value.number();
+    } else if (table == "features") {
+        const std::uint32_t id = read_identifier(value, name, feature_identifiers());
+        if (value.is(Value::Kind::null))
+            function.features.erase(id);
+        else
+            function.features[id] = read_feature(value);
+    } else {
+        value.fail("unknown table \"" + table +
+                   "\"; known are: adapterAttributes, portAttributes, statistics, features");
+    }
+}
+
+// The text stays for ever once it was handed out, so it is kept once per folder.
+const std::string* host_root = nullptr;
+std::mutex host_root_mutex;
+
+} // namespace
+
+int vlnsim_load_scenario(const char* path, char* error, size_t size) {
+    return guarded(error, size, [&] { return load(read_file(path), path, error, size); });
+}
+
+int vlnsim_load_scenario_text(const char* text, const char* name, char* error, size_t size) {
+    return guarded(error, size, [&] { return load(text, name, error, size); });
+}
+
+void vlnsim_restart(void) {
+    Simulator& simulator = Simulator::instance();
+    std::string text, name;
+    {
+        std::lock_guard lock(simulator.mutex);
+        text = simulator.source;
+        name = simulator.source_name;
+    }
+    if (text.empty())
+        guarded(nullptr, 0, [&] { return load("{}", "nothing", nullptr, 0); });
+    else
+        guarded(nullptr, 0, [&] { return load(std::move(text), std::move(name), nullptr, 0); });
+}
+
+void vlnsim_reset(void) {
+    vlnsim_use_system_clock();
+    vlnsim_set_host_root(nullptr);
+    Simulator& simulator = Simulator::instance();
+    std::lock_guard lock(simulator.mutex);
+    simulator.replace_host(Host{}, "", "");
+    simulator.scenario_chosen = false;
+    simulator.trace = nullptr;
+    simulator.recording = false;
+}
+
+int vlnsim_set_value(const char* wwn, const char* table, const char* name, const char* value,
+                     char* error, size_t size) {
+    return guarded(error, size, [&] {
+        const Value source = value ? parse_source(value, name) : Value{};
+        const Scope scope;
+        const Node node(source, scope);
+        const auto number = wwn ? parse_number("0x" + std::string(wwn)) : std::nullopt;
+        Simulator& simulator = Simulator::instance();
+        std::lock_guard lock(simulator.mutex);
+        simulator.choose_scenario();
+        Function* function = number ? simulator.find_function(*number) : nullptr;
+        if (!function)
+            return fail("unknown WWN " + shown(wwn), error, size);
+        set_value(*function, table, name, node);
+        return 0;
+    });
+}
+
+void vlnsim_set_host_root(const char* folder) {
+    static std::set<std::string>* const folders = new std::set<std::string>;
+    std::lock_guard lock(host_root_mutex);
+    host_root = folder && *folder ? &*folders->insert(folder).first : nullptr;
+}
+
+const char* vlnsim_host_root(void) {
+    std::lock_guard lock(host_root_mutex);
+    return host_root ? host_root->c_str() : "";
+}
+
+int vlnsim_fault(const char* function, unsigned nth, enum vlnsim_fault_kind kind, uint64_t value) {
+    if (!function || kind < VLNSIM_STATUS || kind > VLNSIM_ABSENT)
+        return 1;
+    const std::string name = function;
+    if (name != "*" && !(kind == VLNSIM_ABSENT ? is_symbol_name(name) : is_entry_name(name)))
+        return 1;
+    Simulator& simulator = Simulator::instance();
+    std::lock_guard lock(simulator.mutex);
+    simulator.choose_scenario();
+    simulator.faults.push_back(Fault{name, nth, kind, value});
+    return 0;
+}
+
+void vlnsim_clear_faults(void) {
+    Simulator& simulator = Simulator::instance();
+    std::lock_guard lock(simulator.mutex);
+    simulator.faults.clear();
+}
+
+unsigned long vlnsim_calls(const char* function) {
+    Simulator& simulator = Simulator::instance();
+    std::lock_guard lock(simulator.mutex);
+    unsigned long count = 0;
+    for (unsigned i = 0; i < entry_count; ++i)
+        if (!function || std::string_view(function) == entry_name(static_cast<Entry>(i)))
+            count += simulator.calls[i];
+    return count;
+}
+
+void vlnsim_each_call(void (*visit)(void* context, const char* function, unsigned long count),
+                      void* context) {
+    Simulator& simulator = Simulator::instance();
+    std::map<std::string_view, unsigned long> counts;
+    {
+        std::lock_guard lock(simulator.mutex);
+        for (unsigned i = 0; i < entry_count; ++i)
+            if (simulator.calls[i])
+                counts[entry_name(static_cast<Entry>(i))] = simulator.calls[i];
+    }
+    for (const auto& [name, count] : counts)
+        visit(context, name.data(), count);
+}
+
+void vlnsim_clear_calls(void) {
+    Simulator& simulator = Simulator::instance();
+    std::lock_guard lock(simulator.mutex);
+    simulator.forget_calls();
+}
+
+void vlnsim_trace(FILE* stream) {
+    Simulator& simulator = Simulator::instance();
+    std::lock_guard lock(simulator.mutex);
+    simulator.trace = stream;
+}
+
+void vlnsim_record_calls(int on) {
+    Simulator& simulator = Simulator::instance();
+    std::lock_guard lock(simulator.mutex);
+    simulator.recording = on != 0;
+}
+
+size_t vlnsim_recorded_calls(void) {
+    Simulator& simulator = Simulator::instance();
+    std::lock_guard lock(simulator.mutex);
+    return simulator.recorded.size();
+}
+
+int vlnsim_recorded_call(size_t index, char* text, size_t size) {
+    Simulator& simulator = Simulator::instance();
+    std::lock_guard lock(simulator.mutex);
+    return copy_line(simulator.recorded, index, text, size);
+}
+
+size_t vlnsim_violations(void) {
+    Simulator& simulator = Simulator::instance();
+    std::lock_guard lock(simulator.mutex);
+    return simulator.violations.size();
+}
+
+int vlnsim_violation(size_t index, char* text, size_t size) {
+    Simulator& simulator = Simulator::instance();
+    std::lock_guard lock(simulator.mutex);
+    return copy_line(simulator.violations, index, text, size);
+}
+
+size_t vlnsim_open_handles(void) {
+    Simulator& simulator = Simulator::instance();
+    std::lock_guard lock(simulator.mutex);
+    return simulator.handles.size();
+}

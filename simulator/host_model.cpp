@@ -1,0 +1,53 @@
+#include "simulator/host_model.h"
+
+#include <cstring>
+
+namespace vlnsim {
+
+Attribute Attribute::of_number(std::uint32_t number) {
+    Attribute attribute;
+    attribute.bytes.resize(sizeof number);
+    std::memcpy(attribute.bytes.data(), &number, sizeof number);
+    attribute.length = sizeof number;
+    return attribute;
+}
+
+Attribute Attribute::of_text(const std::string& text) {
+    Attribute attribute;
+    attribute.bytes.assign(text.begin(), text.end());
+    attribute.bytes.push_back(0);
+    attribute.length = static_cast<std::uint16_t>(text.size());
+    return attribute;
+}
+
+Attribute Attribute::of_bytes(Bytes bytes) {
+    Attribute attribute;
+    attribute.length = static_cast<std::uint16_t>(bytes.size());
+    attribute.bytes = std::move(bytes);
+    return attribute;
+}
+
+std::uint32_t Attribute::number() const {
+    std::uint32_t number = 0;
+    if (length >= sizeof number)
+        std::memcpy(&number, bytes.data(), sizeof number);
+    return number;
+}
+
+std::string Attribute::text() const {
+    return std::string(bytes.begin(), bytes.begin() + length);
+}
+
+void put_name(std::uint64_t wwn, std::uint8_t* bytes) {
+    for (int i = 7; i >= 0; --i, wwn >>= 8)
+        bytes[i] = static_cast<std::uint8_t>(wwn);
+}
+
+std::uint64_t get_name(const std::uint8_t* bytes) {
+    std::uint64_t wwn = 0;
+    for (int i = 0; i < 8; ++i)
+        wwn = wwn << 8 | bytes[i];
+    return wwn;
+}
+
+} // namespace vlnsim

@@ -1,0 +1,130 @@
+// The simulated host: what a scenario describes and what the library calls read and change.
+//
+// Plain data. It is built by scenario.h and lives in the Simulator (simulator.h), under its mutex.
+#ifndef VLNSIM_HOST_MODEL_H
+#define VLNSIM_HOST_MODEL_H
+
+#include "device/axapi.h"
+
+#include <array>
+#include <cstdint>
+#include <map>
+#include <memory>
+#include <optional>
+#include <string>
+#include <utility>
+#include <vector>
+
+namespace vlnsim {
+
+using Bytes = std::vector<std::uint8_t>;
+
+// A value as the library hands it out. Of a text the terminating NUL is not counted in length, but
+// it is always there.
+struct Attribute {
+    Bytes bytes;
+    std::uint16_t length = 0;
+
+    static Attribute of_number(std::uint32_t number);
+    static Attribute of_text(const std::string& text);
+    static Attribute of_bytes(Bytes bytes);
+
+    std::uint32_t number() const; // 0 for anything shorter
+    std::string text() const;
+};
+using Attribute_Map = std::map<std::uint16_t, Attribute>;
+
+// One logical unit and how it answers SCSI commands.
+struct Unit {
+    std::uint64_t fcp_lun = 0; // the eight bytes of the LUN as SAM lays them out, as a memory image
+    std::uint32_t os_lun = 0;
+    std::string os_device_name;
+    Bytes inquiry;                      // standard inquiry data, SPC
+    std::optional<Bytes> serial_page;   // page 0x80
+    std::optional<Bytes> identity_page; // page 0x83
+    std::optional<Bytes> capacity;      // READ CAPACITY(10), SBC
+    std::uint32_t check_conditions = 0; // so many answers to each command come first
+    bool silent = false;                // every command fails
+    std::array<std::uint32_t, 4> checks_given{};
+};
+
+struct Target {
+    std::uint32_t fc_id = 0;
+    std::uint64_t node_wwn = 0;
+    std::uint64_t port_wwn = 0;
+    std::uint32_t bus = 0;
+    std::uint32_t number = 0;
+    std::vector<Unit> units;
+};
+
+// A feature's answer: a value, or a status alone.
+struct Feature {
+    std::uint32_t value = 0;
+    AX_STATUS status = AX_STATUS_OK;
+};
+
+// One instance of the management library: a PCI function of a card.
+struct Function {
+    std::uint32_t instance = 0;
+    std::uint32_t card = 0;
+    std::uint64_t wwpn = 0;
+    std::uint64_t wwnn = 0;
+    std::uint64_t fabric = 0;
+    std::uint32_t flags = 0;
+    std::uint32_t special_features = 0;
+    std::uint16_t sub_adapter = 0;
+    std::string model;
+    bool v4_record = true;
+    bool v3_record = true;
+
+    Attribute_Map adapter_attributes;
+    Attribute_Map port_attributes;
+    std::map<std::uint16_t, std::uint64_t> statistics;
+    std::map<std::uint32_t, Feature> features;
+    std::optional<std::uint32_t> driver_type;
+    std::vector<std::pair<std::string, Bytes>> fru_vpd; // AX_GetVPDV2: tag and value, in order
+    std::vector<std::pair<std::string, Bytes>> pci_vpd; // AX_GetVPD
+    std::optional<AX_iSCSI_InitiatorProperties> initiator;
+    std::optional<AX_Ini_NetworkProperties> network;
+    std::optional<AX_PCIRegisters> pci;
+    std::optional<AX_SffData> sff;
+    std::optional<std::uint32_t> beacon;
+
+    std::optional<std::string> hba_name; // the adapter's name in the HBA API, which then knows it
+    std::uint32_t hba_ports = 1;
+    std::uint32_t stale = 0; // refreshes that the target mapping waits for
+    std::vector<Target> targets;
+};
+
+// What a library file of the host exports beside or without what it would by itself.
+struct Library {
+    bool present = true;
+    std::vector<std::string> missing; // symbols
+    std::vector<std::string> extra;
+};
+
+// A rule of the fault script; see vlnsim_fault.
+struct Fault {
+    std::string function; // or "*"
+    unsigned nth = 0;     // counts down to the call that it is about; 0: every call
+    int kind = 0;
+    std::uint64_t value = 0;
+};
+
+struct Host {
+    std::array<Library, 3> libraries; // by vlnsim_library
+    AX_STATUS initialisation = AX_STATUS_OK;
+    std::string axapi_version = "10.2.261.13";
+    std::string nima_version = "10.2.261.13";
+    AX_ServerAttributes server{};
+    std::vector<Function> functions;
+    std::vector<Fault> faults;
+};
+
+// The eight bytes of a WWN, most significant first.
+void put_name(std::uint64_t wwn, std::uint8_t* bytes);
+std::uint64_t get_name(const std::uint8_t* bytes);
+
+} // namespace vlnsim
+
+#endif // VLNSIM_HOST_MODEL_H

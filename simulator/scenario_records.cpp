@@ -1,0 +1,263 @@
+// Records of the library, field by field: vital product data, PCI registers, initiator, network.
+#include "simulator/scenario.h"
+
+#include "simulator/call.h"
+
+#include <algorithm>
+#include <arpa/inet.h>
+#include <cstring>
+
+namespace vlnsim {
+namespace {
+
+// A numeric field of a record by its name; fields with an index are a list in a scenario.
+struct Field {
+    std::string_view name;
+    std::size_t offset;
+    std::size_t width;
+    std::size_t count;
+};
+
+template <class Element, std::size_t size>
+constexpr std::size_t element_width(const Element (&)[size]) {
+    return sizeof(Element);
+}
+template <class Element>
+constexpr std::size_t element_width(const Element&) {
+    return sizeof(Element);
+}
+
+#define FIELD(record, field)                                                                       \
+    Field {                                                                                        \
+#field, offsetof(record, field), element_width(record{}.field),                            \
+            sizeof(record{}.field) / element_width(record{}.field)                                 \
+    }
+
+#define PCI(field) FIELD(AX_PCIRegisters, field)
+const Field pci_fields[] = {
+    PCI(busNumber),
+    PCI(deviceNumber),
+    PCI(functionNumber),
+    PCI(pciType),
+    PCI(vendorID),
+    PCI(deviceID),
+    PCI(command),
+    PCI(status),
+    PCI(revisionID),
+    PCI(progIf),
+    PCI(subClass),
+    PCI(baseClass),
+    PCI(cacheLineSize),
+    PCI(latencyTimer),
+    PCI(headerType),
+    PCI(builtInSelfTest),
+    PCI(baseAddresses),
+    PCI(cis),
+    PCI(subVendorID),
+    PCI(subsystemID),
+    PCI(expansionROMBaseAddress),
+    PCI(capabilitiesPtr),
+    PCI(interruptLine),
+    PCI(interruptPin),
+    PCI(minimumGrant),
+    PCI(maximumLatency),
+    PCI(featureEnable),
+    PCI(pwrMgtCaps),
+    PCI(pwrMgtCtrl),
+    PCI(msiCtrl),
+    PCI(msiLowAddr),
+    PCI(msiHighAddr),
+    PCI(msiData),
+    PCI(msiMaskBits),
+    PCI(msiPendingBits),
+    PCI(msiXCtrl),
+    PCI(msiXTableOffset),
+    PCI(msiXPBAOffset),
+    PCI(vpdAddr),
+    PCI(vpdData),
+    PCI(pcieCap),
+    PCI(pcieDeviceCapReg),
+    PCI(pcieDeviceStatusCtrl),
+    PCI(pcieDeviceLinkCap),
+    PCI(pcieDeviceLinkStatusCtrl),
+    PCI(slotCap),
+    PCI(slotStatusCtrlReg),
+    PCI(rootCapCtrlReg),
+    PCI(rootStatusReg),
+    PCI(deviceCap2Reg),
+    PCI(deviceStatusCtl2Reg),
+    PCI(linkCap2Reg),
+    PCI(linkStatus2Ctl2Reg),
+    PCI(slotCap2Reg),
+    PCI(slotStatusCtl2Reg),
+    PCI(enhancedCapHdrAER),
+    PCI(uncorrectableErrStat),
+    PCI(uncorrectableErrMask),
+    PCI(uncorrectableErrSeverity),
+    PCI(correctableErrStat),
+    PCI(correctableErrMask),
+    PCI(advErrCapCtl),
+    PCI(headerLog),
+    PCI(enhancedCapHdrPBUDG),
+    PCI(dataSelectReg),
+    PCI(dataReg),
+    PCI(powerBudget),
+};
+#undef PCI
+
+#define LOGIN(field) FIELD(AX_iSCSI_LoginOptions, field)
+const Field login_fields[] = {
+    LOGIN(firstBurstLength),  LOGIN(maxBurstLength),      LOGIN(maxRecvDataSegmentLength),
+    LOGIN(defaultTime2Wait),  LOGIN(defaultTime2Retain),  LOGIN(maxConnections),
+    LOGIN(maxOutstandingR2T), LOGIN(initialR2T),          LOGIN(immediateData),
+    LOGIN(headerDigest),      LOGIN(dataDigest),          LOGIN(errorRecoveryLevel),
+    LOGIN(dataPDUInOrder),    LOGIN(dataSequenceInOrder),
+};
+#undef LOGIN
+
+void store(const Node& node, const Field& field, std::size_t index, void* record) {
+    const std::uint64_t maximum = field.width == 4 ? 0xFFFFFFFF : field.width == 2 ? 0xFFFF : 0xFF;
+    // The low bytes come first on every platform of this project.
+    const std::uint64_t number = node.number(maximum);
+    std::memcpy(static_cast<std::uint8_t*>(record) + field.offset + index * field.width, &number,
+                field.width);
+}
+
+void read_fields(const Node& values, std::span<const Field> fields, void* record) {
+    std::vector<std::string_view> known;
+    for (const Field& field : fields)
+        known.push_back(field.name);
+    values.expect_object(known);
+    for (const Field& field : fields) {
+        const auto node = values.member(field.name);
+        if (!node)
+            continue;
+        if (field.count == 1) {
+            store(*node, field, 0, record);
+            continue;
+        }
+        const std::vector<Node> items = node->items();
+        if (items.size() > field.count)
+            node->fail("more than " + std::to_string(field.count) + " entries");
+        for (std::size_t i = 0; i < items.size(); ++i)
+            store(items[i], field, i, record);
+    }
+}
+
+template <std::size_t size>
+void read_text(const Node& values, std::string_view key, char (&field)[size]) {
+    const auto node = values.member(key);
+    if (!node)
+        return;
+    if (node->text().size() >= size)
+        node->fail("longer than " + std::to_string(size - 1) + " bytes");
+    copy_text(node->text(), field, size);
+}
+
+void read_address(const Node& values, std::string_view key, AX_IPAddress& address) {
+    const auto node = values.member(key);
+    if (!node)
+        return;
+    const std::string text = node->text();
+    if (inet_pton(AF_INET6, text.c_str(), address.address) == 1)
+        address.flags = AX_IP_FLAG_V6;
+    else if (inet_pton(AF_INET, text.c_str(), address.address) != 1)
+        node->fail("\"" + text + "\" is not an IPv4 or IPv6 address");
+}
+
+std::uint32_t read_authentication(const Node& values) {
+    constexpr std::string_view names[] = {"none", "oneWayCHAP", "mutualCHAP"};
+    const auto node = values.member("authentication");
+    if (!node)
+        return AX_ISCSI_AUTH_NONE;
+    const std::string name = node->text();
+    const auto it = std::find(std::begin(names), std::end(names), name);
+    if (it == std::end(names))
+        node->fail("unknown method \"" + name + "\"; " + known_list(names));
+    return static_cast<std::uint32_t>(it - std::begin(names));
+}
+
+} // namespace
+
+std::vector<std::pair<std::string, Bytes>> read_vpd(const Node& values) {
+    values.expect_any_object();
+    std::vector<std::pair<std::string, Bytes>> entries;
+    for (const auto& [tag, source] : values.value().members) {
+        const Node value(source, values.scope());
+        if (value.is(Value::Kind::null))
+            continue;
+        if (tag.size() != 2)
+            value.fail("a tag of two characters is wanted");
+        Bytes bytes;
+        if (value.is(Value::Kind::object)) {
+            bytes = read_attribute(value, nullptr).bytes;
+        } else if (value.is(Value::Kind::number)) {
+            bytes.push_back(static_cast<std::uint8_t>(value.number(0xFF)));
+        } else {
+            const std::string text = value.text();
+            bytes.assign(text.begin(), text.end());
+        }
+        if (bytes.size() > 255)
+            value.fail("longer than 255 bytes");
+        entries.emplace_back(tag, std::move(bytes));
+    }
+    return entries;
+}
+
+AX_PCIRegisters read_pci(const Node& values) {
+    AX_PCIRegisters registers{};
+    read_fields(values, pci_fields, &registers);
+    return registers;
+}
+
+AX_iSCSI_InitiatorProperties read_initiator(const Node& values) {
+    values.expect_object({"name", "alias", "authentication", "targetCHAPName", "targetSecret",
+                          "initiatorCHAPName", "initiatorSecret", "loginOptions"});
+    AX_iSCSI_InitiatorProperties initiator{};
+    read_text(values, "name", initiator.name);
+    read_text(values, "alias", initiator.alias);
+    auto& authentication = initiator.authentication;
+    authentication.method = read_authentication(values);
+    read_text(values, "targetCHAPName", authentication.targetCHAPName);
+    read_text(values, "targetSecret", authentication.targetSecret);
+    read_text(values, "initiatorCHAPName", authentication.initiatorCHAPName);
+    read_text(values, "initiatorSecret", authentication.initiatorSecret);
+    if (const auto options = values.member("loginOptions"))
+        read_fields(*options, login_fields, &initiator.loginOptions);
+    return initiator;
+}
+
+AX_Ini_NetworkProperties read_network(const Node& values) {
+    values.expect_object({"address", "subnetMask", "gateway", "dhcp", "linkUp", "vlanEnabled",
+                          "vlanID", "priority"});
+    AX_Ini_NetworkProperties network{};
+    read_address(values, "address", network.address);
+    read_address(values, "subnetMask", network.subnetMask);
+    read_address(values, "gateway", network.gateway);
+    network.addressOrigin =
+        values.boolean("dhcp", false) ? AX_ADDRESS_ORIGIN_DHCP : AX_ADDRESS_ORIGIN_STATIC;
+    network.linkUp = values.boolean("linkUp", true);
+    network.vlanEnabled = values.boolean("vlanEnabled", false);
+    network.vlanID = static_cast<std::uint16_t>(values.number("vlanID", 0, 4095));
+    network.priority = static_cast<std::uint8_t>(values.number("priority", 0, 7));
+    return network;
+}
+
+AX_SffData read_sff(const Node& values) {
+    values.expect_object({"a0", "a2"});
+    AX_SffData data{};
+    const auto page = [&](std::string_view key, std::uint8_t(&bytes)[256]) {
+        const auto node = values.member(key);
+        if (!node)
+            return;
+        const Bytes read = node->bytes();
+        if (read.size() > sizeof bytes)
+            node->fail("longer than 256 bytes");
+        std::copy(read.begin(), read.end(), bytes);
+    };
+    page("a0", data.pageA0);
+    page("a2", data.pageA2);
+    return data;
+}
+
+} // namespace vlnsim

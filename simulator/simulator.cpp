@@ -1,0 +1,91 @@
+#include "simulator/simulator.h"
+
+#include "simulator/scenario.h"
+
+#include <algorithm>
+#include <cstdlib>
+
+namespace vlnsim {
+namespace {
+
+constexpr const char* scenario_variable = "VLNSIM_SCENARIO";
+constexpr std::size_t max_violations = 10000;
+
+} // namespace
+
+Simulator& Simulator::instance() {
+    static Simulator* const simulator = new Simulator;
+    return *simulator;
+}
+
+void Simulator::choose_scenario() {
+    if (scenario_chosen)
+        return;
+    scenario_chosen = true;
+    const char* path = std::getenv(scenario_variable);
+    if (!path || !*path)
+        return;
+    try {
+        std::string text = read_file(path);
+        Host fresh = read_scenario(text, path);
+        replace_host(std::move(fresh), std::move(text), path);
+    } catch (const std::exception& e) {
+        std::fprintf(stderr, "%s\n", e.what());
+        host.initialisation = AX_STATUS_ERROR;
+    }
+}
+
+void Simulator::replace_host(Host fresh, std::string text, std::string name) {
+    host = std::move(fresh);
+    source = std::move(text);
+    source_name = std::move(name);
+    scenario_chosen = true;
+    initialised = false;
+    hba_loaded = false;
+    handles.clear();
+    faults = host.faults;
+    violations.clear();
+    forget_calls();
+}
+
+void Simulator::forget_calls() {
+    calls.fill(0);
+    lookups.clear();
+    recorded.clear();
+}
+
+void Simulator::add_violation(Entry entry, const std::string& what) {
+    if (violations.size() < max_violations)
+        violations.push_back(std::string(entry_name(entry)) + ": " + what);
+}
+
+Function* Simulator::find_function(std::uint64_t wwpn) {
+    for (Function& function : host.functions)
+        if (function.wwpn == wwpn)
+            return &function;
+    return nullptr;
+}
+
+Function* Simulator::find_instance(std::uint32_t instance) {
+    for (Function& function : host.functions)
+        if (function.instance == instance)
+            return &function;
+    return nullptr;
+}
+
+Function* Simulator::find_hba_adapter(std::string_view name) {
+    for (Function& function : host.functions)
+        if (function.hba_name && *function.hba_name == name)
+            return &function;
+    return nullptr;
+}
+
+std::vector<Function*> Simulator::hba_adapters() {
+    std::vector<Function*> adapters;
+    for (Function& function : host.functions)
+        if (function.hba_name)
+            adapters.push_back(&function);
+    return adapters;
+}
+
+} // namespace vlnsim

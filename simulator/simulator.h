@@ -1,0 +1,61 @@
+// The one simulated host of the process, with everything that is remembered about its callers.
+#ifndef VLNSIM_SIMULATOR_H
+#define VLNSIM_SIMULATOR_H
+
+#include "simulator/entry_points.h"
+#include "simulator/host_model.h"
+#include "simulator/vlnsim.h"
+
+#include <array>
+#include <cstdio>
+#include <map>
+#include <mutex>
+#include <string>
+#include <string_view>
+#include <vector>
+
+namespace vlnsim {
+
+// A struct with a mutex: whoever touches the rest holds it. It lives from the first use to the end
+// of the process, since threads may call the libraries for as long.
+struct Simulator {
+    static Simulator& instance();
+
+    std::mutex mutex;
+
+    Host host;
+    std::string source; // the scenario's text and name, for a restart
+    std::string source_name;
+    bool scenario_chosen = false; // loaded, or looked for in the environment
+
+    bool initialised = false;                     // AX_InitLib
+    bool hba_loaded = false;                      // HBA_LoadLibrary
+    std::map<std::uint32_t, std::string> handles; // open HBA API handles: the adapter's name
+    std::uint32_t next_handle = 1;
+
+    std::array<unsigned long, entry_count> calls{};
+    std::map<std::string, unsigned long> lookups;
+    std::vector<Fault> faults;
+    std::FILE* trace = nullptr;
+    bool recording = false;
+    std::vector<std::string> recorded;
+    std::vector<std::string> violations;
+
+    // All of these are called with the mutex held.
+
+    // Loads the scenario that the environment names, unless one was chosen before. A bad one is
+    // told on standard error, and AX_InitLib fails from then on.
+    void choose_scenario();
+    void replace_host(Host fresh, std::string text, std::string name);
+    void forget_calls();
+    void add_violation(Entry entry, const std::string& what);
+
+    Function* find_function(std::uint64_t wwpn);
+    Function* find_instance(std::uint32_t instance);
+    Function* find_hba_adapter(std::string_view name);
+    std::vector<Function*> hba_adapters();
+};
+
+} // namespace vlnsim
+
+#endif // VLNSIM_SIMULATOR_H

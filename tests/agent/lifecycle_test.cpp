@@ -1,0 +1,137 @@
+#include "agent/gates.h"
+#include "classes/VLNMPCA_Card.h"
+#include "classes/VLNMPCA_Product.h"
+#include "classes/VLNMPCA_StorageVolume.h"
+#include "derivedObjects/pattern.h"
+#include "foundation/host_paths.h"
+#include "tests/agent/agent_fixture.h"
+
+#include <filesystem>
+#include <fstream>
+#include <thread>
+
+namespace cimple {
+
+namespace {
+
+using Lifecycle_Test = Agent_Test;
+
+std::string contents(Host_File file) {
+    std::ifstream stream(host_path(file));
+    return {std::istreambuf_iterator<char>(stream), {}};
+}
+
+} // namespace
+
+TEST_F(Lifecycle_Test, LoadFailsWithoutLibrariesAndNobodyHangs) {
+    Fake_Library::present = false;
+    {
+        Log_Capture log;
+        EXPECT_EQ(pattern_load(), 30);
+        EXPECT_EQ(log.count(VLN_ERR, "Vorlan CIM Provider load failure"), 1);
+    }
+    EXPECT_EQ(pattern_load(), 30);
+    ProviderAgent* agent = ProviderAgent::current();
+    ASSERT_NE(agent, nullptr);
+    EXPECT_EQ(ProviderAgent::instance(), agent);
+    EXPECT_FALSE(agent->m_bLibraryLoaded);
+
+    Log_Capture log;
+    EXPECT_EQ(count_instances(VLNMPCA_Card::static_meta_class), 0);
+    EXPECT_EQ(log.count(VLN_DBG, "AX Init failed for VLNMPCA_Card_Provider.cpp"), 1);
+    EXPECT_EQ(log.count(VLN_INFO, " Entering BuildCimpleInfo()"), 0);
+    EXPECT_EQ(count_instances(VLNMPCA_Product::static_meta_class), 0);
+    EXPECT_EQ(count_instances(VLNMPCA_StorageVolume::static_meta_class), 0);
+    settle(*agent);
+    EXPECT_TRUE(agent->m_bIsAdapterMapsReady && agent->m_bIsSANMapsReady);
+    EXPECT_EQ(Fake_Library::scans, 0);
+
+    // No load took a reference, so this one is the first and the last.
+    agent->addRef();
+    agent->releaseRef();
+}
+
+TEST_F(Lifecycle_Test, LastReleaseDestroysAndTheNextLoadStartsAfresh) {
+    ASSERT_EQ(pattern_load(), 0);
+    ASSERT_EQ(pattern_load(), 0);
+    EXPECT_EQ(pattern_unload(pattern_table[0]), 0);
+    ProviderAgent* agent = ProviderAgent::current();
+    ASSERT_NE(agent, nullptr);
+    EXPECT_EQ(refreshes_started(*agent), 1);
+    EXPECT_EQ(pattern_unload(pattern_table[0]), 0);
+    EXPECT_EQ(ProviderAgent::current(), nullptr);
+    EXPECT_EQ(pattern_unload(pattern_table[0]), 0) << "one unload too many is harmless";
+
+    Loaded_Agent next;
+    EXPECT_TRUE(next->m_bAdapterRefreshRequested);
+    EXPECT_FALSE(next->m_bIsAdapterMapsReady);
+    EXPECT_EQ(next->m_CIM_ComputerSystem_map.size(), 0u);
+}
+
+TEST_F(Lifecycle_Test, ConfigurationIsReadAndWrittenBack) {
+    std::ofstream(host_path(Host_File::TUNING)) << "VLN_PROVIDER_CACHE_TIMEOUT = 7\n"
+                                                   "VLN_PROVIDER_REFRESH_ADAPTERDATA = TRUE\n"
+                                                   "VLN_PROVIDER_REFRESH_SANDATA = FALSE\n";
+    {
+        Loaded_Agent agent;
+        EXPECT_EQ(agent->m_CacheTimeout, 7u);
+        EXPECT_TRUE(agent->m_bRefreshAdapterData);
+        EXPECT_FALSE(agent->m_bRefreshSANData);
+        EXPECT_EQ(agent->m_OSName.rfind("Linux version 6.1.0", 0), 0u);
+        agent->m_ConfigFile.set_cache_timeout(9);
+    }
+    EXPECT_NE(contents(Host_File::TUNING).find("VLN_PROVIDER_CACHE_TIMEOUT = 9\n"),
+              std::string::npos);
+}
+
+// The small default log is nobody's setting; settings of an earlier run are kept.
+TEST_F(Lifecycle_Test, LogSettingsAreSavedOnlyIfThereWereSome) {
+    { Loaded_Agent agent; }
+    EXPECT_FALSE(std::filesystem::exists(host_path(Host_File::LOG_SETTINGS)));
+    EXPECT_TRUE(std::filesystem::exists(host_path(Host_File::FFDC_LOG)));
+
+    std::ofstream(host_path(Host_File::LOG_SETTINGS)) << "1,3,1\n";
+    {
+        Loaded_Agent agent;
+        EXPECT_EQ(CLogger::instance().get_mode(), LOG_MODE_RING);
+        CLogger::instance().set_level(5);
+    }
+    EXPECT_EQ(contents(Host_File::LOG_SETTINGS).rfind("1,5,1\n", 0), 0u);
+}
+
+TEST_F(Lifecycle_Test, DestructionWaitsForARefreshAndStopsItsBuilding) {
+    ASSERT_EQ(pattern_load(), 0);
+    ProviderAgent* agent = ProviderAgent::current();
+    Log_Capture log;
+    agent->m_DataMutex.lock(); // the refresh comes as far as this
+    agent->BuildCimpleInfo();
+    std::thread releaser([agent] { agent->releaseRef(); });
+    for (bool loaded = true; loaded; std::this_thread::yield()) {
+        Auto_Mutex lock(agent->m_DataFetchMutex);
+        loaded = agent->m_bLibraryLoaded;
+    }
+    agent->m_DataMutex.unlock();
+    releaser.join();
+    EXPECT_EQ(ProviderAgent::current(), nullptr);
+    EXPECT_EQ(log.count(VLN_DBG, "PERF: Clearing the previous thread...with join"), 1);
+    EXPECT_EQ(log.count(VLN_DBG, "PERF: Updating Adapter Maps..."), 0);
+    EXPECT_EQ(log.count(VLN_DBG, "PERF: DataFetch_Handler Thread END"), 1);
+}
+
+// Loads and unloads of many classes at once, each with a client call in between.
+TEST_F(Lifecycle_Test, ManyThreadsLoadAndUnload) {
+    std::vector<std::thread> classes;
+    for (int i = 0; i < 8; ++i)
+        classes.emplace_back([] {
+            for (int round = 0; round < 20; ++round) {
+                ASSERT_EQ(pattern_load(), 0);
+                EXPECT_EQ(count_instances(VLNMPCA_Product::static_meta_class), 0);
+                EXPECT_EQ(pattern_unload(pattern_table[0]), 0);
+            }
+        });
+    for (std::thread& each : classes)
+        each.join();
+    EXPECT_EQ(ProviderAgent::current(), nullptr);
+}
+
+} // namespace cimple

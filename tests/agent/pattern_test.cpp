@@ -1,0 +1,120 @@
+#include "classes/VLNMPCA_Card.h"
+#include "classes/VLNMPCA_Product.h"
+#include "classes/VLNMPCA_RecordLog.h"
+#include "classes/VLNMPCA_StorageVolume.h"
+#include "derivedObjects/pattern.h"
+#include "tests/agent/agent_fixture.h"
+
+#include <stdexcept>
+
+namespace cimple {
+
+namespace {
+
+class Pattern_Test : public Agent_Test {
+protected:
+    // A settled agent: what a test puts into a store is not cleared by a refresh.
+    void SetUp() override {
+        Agent_Test::SetUp();
+        ASSERT_EQ(pattern_load(), 0);
+        agent = ProviderAgent::current();
+        ASSERT_EQ(refreshes_started(*agent), 1);
+    }
+    void TearDown() override {
+        agent->releaseRef();
+        Agent_Test::TearDown();
+    }
+    VLNMPCA_Product* put_product(const char* name) {
+        auto* product = create<VLNMPCA_Product>();
+        product->Name.set(name);
+        EXPECT_GE(agent->m_VLNMPCA_Product_map.insert(product), 0);
+        return product;
+    }
+
+    ProviderAgent* agent = nullptr;
+};
+
+struct Taken {
+    std::vector<std::string> names;
+    bool more = true;
+
+    static bool take(Instance* instance, sint32, void* self) {
+        auto& taken = *static_cast<Taken*>(self);
+        taken.names.push_back(static_cast<VLNMPCA_Product*>(instance)->Name.value.c_str());
+        static_cast<VLNMPCA_Product*>(instance)->Name.set("the handler's own");
+        unref(instance);
+        return taken.more;
+    }
+};
+
+const Pattern_Row& product_row() {
+    return pattern_table[pattern_id<VLNMPCA_Product>];
+}
+
+bool refuse(Instance* instance, sint32, void*) {
+    unref(instance);
+    throw std::runtime_error("client gone");
+}
+
+} // namespace
+
+TEST_F(Pattern_Test, DeliversClonesInOrder) {
+    VLNMPCA_Product* first = put_product("a");
+    put_product("b");
+    Taken taken;
+    EXPECT_EQ(pattern_enum_instances(product_row(), {&Taken::take, &taken}), 0);
+    EXPECT_EQ(taken.names, (std::vector<std::string>{"a", "b"}));
+    EXPECT_STREQ(first->Name.value.c_str(), "a");
+
+    taken = {};
+    taken.more = false;
+    EXPECT_EQ(pattern_enum_instances(product_row(), {&Taken::take, &taken}), 0);
+    EXPECT_EQ(taken.names.size(), 1u) << "the handler has asked to stop";
+}
+
+// Can only come of a fault: a member's key that was changed after its insertion.
+TEST_F(Pattern_Test, EqualKeysMakeTheResultEmpty) {
+    put_product("a");
+    put_product("b")->Name.set("a");
+    put_product("c");
+    Log_Capture log;
+    EXPECT_EQ(count_instances(VLNMPCA_Product::static_meta_class), 0);
+    EXPECT_EQ(log.count(VLN_CRIT, "Insert failed for 1"), 1);
+    EXPECT_EQ(log.count(VLN_DBG, "VLNMPCA_Product_Provider::enum_instances()"), 1);
+}
+
+TEST_F(Pattern_Test, ExceptionsEndInTheGuardOfTheShape) {
+    put_product("a");
+    agent->m_VLNMPCA_StorageVolume_map.insert(create<VLNMPCA_StorageVolume>());
+    agent->m_VLNMPCA_Card_map.insert(create<VLNMPCA_Card>());
+    const struct {
+        Pattern_Id id;
+        const char* line;
+    } rows[] = {
+        {pattern_id<VLNMPCA_Product>, "Exception in CIM Provider Enumeration - do nothing"},
+        {pattern_id<VLNMPCA_StorageVolume>,
+         "Exception in SAN CIM Provider Enumeration - do nothing"},
+        {pattern_id<VLNMPCA_Card>, "Exception in Active CIM Provider Enumeration - do nothing"},
+    };
+    for (const auto& row : rows) {
+        Log_Capture log;
+        EXPECT_EQ(pattern_enum_instances(pattern_table[row.id], {&refuse, nullptr}), 0);
+        EXPECT_EQ(log.count(VLN_CRIT, row.line), 1);
+        EXPECT_EQ(count_instances(*pattern_table[row.id].meta_class), 1) << "a lock is still held";
+    }
+}
+
+TEST_F(Pattern_Test, RecordLogsComeFromThreeStores) {
+    const char* const ids[] = {"provider", "driver", "iscsi"};
+    Instance_Map<VLNMPCA_RecordLog>* const stores[] = {&agent->m_VLNMPCA_RecordLog_map,
+                                                       &agent->m_VLNMPCA_DriverRecordLog_map,
+                                                       &agent->m_VLNMPCA_ISCSIRecordLog_map};
+    for (int i = 0; i < 3; ++i) {
+        auto* log = create<VLNMPCA_RecordLog>();
+        log->InstanceID.set(ids[i]);
+        stores[i]->insert(log);
+    }
+    EXPECT_EQ(count_instances(VLNMPCA_RecordLog::static_meta_class), 3);
+}
+
+} // namespace cimple

@@ -73,9 +73,11 @@ String print_timestamp(const Datetime& value, bool readable) {
     const auto total = static_cast<sint64>(value.usec());
     const auto second = static_cast<sint64>(Datetime::SECOND);
     sint64 fraction = total % second;
-    if (fraction < 0)
+    auto time = static_cast<std::time_t>(total / second);
+    if (fraction < 0) {
         fraction += second;
-    const auto time = static_cast<std::time_t>((total - fraction) / second);
+        --time;
+    }
     std::tm tm{};
     if (!localtime_r(&time, &tm))
         tm = std::tm{};

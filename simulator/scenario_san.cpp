@@ -83,6 +83,12 @@ void put_big_endian(std::uint32_t number, Bytes& bytes) {
         bytes.push_back(static_cast<std::uint8_t>(number >> shift));
 }
 
+template <class Range>
+void append(const Range& range, Bytes& bytes) {
+    for (const auto element : range)
+        bytes.push_back(static_cast<std::uint8_t>(element));
+}
+
 Bytes inquiry_data(const Node& values, std::uint8_t type) {
     constexpr std::uint8_t version_spc3 = 5;
     constexpr std::uint8_t response_format = 2;
@@ -100,14 +106,14 @@ Bytes serial_data(const Node& values, std::uint8_t type, std::uint64_t target, s
     if (serial.size() > 251)
         values.member("serial")->fail("longer than 251 bytes");
     Bytes bytes{type, page_serial, 0, static_cast<std::uint8_t>(serial.size())};
-    bytes.insert(bytes.end(), serial.begin(), serial.end());
+    append(serial, bytes);
     return bytes;
 }
 
 Bytes identity_data(const Node& values, std::uint8_t type, std::uint64_t target,
                     std::uint64_t lun) {
     std::uint8_t identifier_type = 3; // NAA, here of the form "IEEE registered extended"
-    Bytes identifier{0x60, 0x0A, 0x0B, 0x80, 0, 0, 0, 0};
+    Bytes identifier{0x60, 0x25, 0x64, 0xC0, 0, 0, 0, 0};
     put_big_endian(static_cast<std::uint32_t>(target), identifier);
     put_big_endian(static_cast<std::uint32_t>(lun), identifier);
     if (const auto node = values.member("identifier")) {
@@ -128,7 +134,7 @@ Bytes identity_data(const Node& values, std::uint8_t type, std::uint64_t target,
                 identifier_type,
                 0,
                 length};
-    bytes.insert(bytes.end(), identifier.begin(), identifier.end());
+    append(identifier, bytes);
     return bytes;
 }
 
@@ -230,7 +236,7 @@ void read_units(const Node& target_values, std::uint64_t number, Target& target)
 }
 
 Target read_target(const Node& values, std::uint64_t number) {
-    constexpr std::uint64_t first_wwn = 0x5006016000000000;
+    constexpr std::uint64_t first_wwn = 0x502564C000000000;
     Target target;
     const auto wwpn = values.member("wwpn");
     target.port_wwn = wwpn ? wwpn->wwn() : first_wwn + number;

@@ -8,7 +8,6 @@
 #include <cstring>
 #include <filesystem>
 #include <fstream>
-#include <thread>
 
 namespace cimple {
 
@@ -147,6 +146,23 @@ int Agent_Test::refreshes_started(ProviderAgent& agent) {
 
 Loaded_Agent::Loaded_Agent() {
     EXPECT_EQ(pattern_load(), PROVIDER_OK);
+}
+
+Long_Operation::Long_Operation(ProviderAgent& agent) {
+    std::promise<void> begun;
+    _thread = std::thread([this, &agent, &begun] {
+        Auto_Mutex data(agent.m_DataMutex);
+        begun.set_value();
+        _end.get_future().wait();
+    });
+    begun.get_future().wait();
+}
+
+void Long_Operation::end() {
+    if (!_thread.joinable())
+        return;
+    _end.set_value();
+    _thread.join();
 }
 
 int count_instances(const Meta_Class& meta_class) {

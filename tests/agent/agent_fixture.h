@@ -10,8 +10,10 @@
 #include <gtest/gtest.h>
 
 #include <atomic>
+#include <future>
 #include <mutex>
 #include <string>
+#include <thread>
 #include <utility>
 #include <vector>
 
@@ -64,6 +66,18 @@ public:
     ~Loaded_Agent() { ProviderAgent::current()->releaseRef(); }
     ProviderAgent* operator->() const { return ProviderAgent::current(); }
     ProviderAgent& operator*() const { return *ProviderAgent::current(); }
+};
+
+// Keeps m_DataMutex locked, on a thread of its own as a long operation does, until it is let go.
+class Long_Operation {
+public:
+    explicit Long_Operation(ProviderAgent& agent);
+    ~Long_Operation() { end(); }
+    void end();
+
+private:
+    std::promise<void> _end;
+    std::thread _thread;
 };
 
 // Enumerates a class of the pattern; -1 if the status was not 0.

@@ -88,9 +88,11 @@ TEST_F(Clearing_Test, EveryProviderClassHasItsRow) {
         ++shapes[row.shape];
         without_store += row.stores[0] == NO_STORE;
         with_three += row.stores[2] != NO_STORE;
-        for (Store_Id id : row.stores)
-            if (id != NO_STORE)
+        for (Store_Id id : row.stores) {
+            if (id != NO_STORE) {
                 EXPECT_EQ(agent->store(id).meta_class(), meta_class) << store_table[id].name;
+            }
+        }
         EXPECT_EQ(row.shape == Pattern_Shape::ACTIVE, row.update_mutex != nullptr);
     }
     EXPECT_EQ(without_store, 7);

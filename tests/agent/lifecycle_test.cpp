@@ -103,14 +103,14 @@ TEST_F(Lifecycle_Test, DestructionWaitsForARefreshAndStopsItsBuilding) {
     ASSERT_EQ(pattern_load(), 0);
     ProviderAgent* agent = ProviderAgent::current();
     Log_Capture log;
-    agent->m_DataMutex.lock(); // the refresh comes as far as this
+    Long_Operation operation(*agent); // the refresh comes as far as this
     agent->BuildCimpleInfo();
     std::thread releaser([agent] { agent->releaseRef(); });
     for (bool loaded = true; loaded; std::this_thread::yield()) {
         Auto_Mutex lock(agent->m_DataFetchMutex);
         loaded = agent->m_bLibraryLoaded;
     }
-    agent->m_DataMutex.unlock();
+    operation.end();
     releaser.join();
     EXPECT_EQ(ProviderAgent::current(), nullptr);
     EXPECT_EQ(log.count(VLN_DBG, "PERF: Clearing the previous thread...with join"), 1);

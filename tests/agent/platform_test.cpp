@@ -11,12 +11,16 @@
 
 namespace cimple {
 
-// What an object manager's enumeration stands on here: the instances still to come.
-struct Instance_Enumerator_Rep {
+namespace {
+
+// An enumeration: the instances still to come.
+struct Platform_Enumeration : Instance_Enumerator_Rep {
     std::vector<Ref<Instance>> left;
 };
 
-namespace {
+std::vector<Ref<Instance>>& left_of(Instance_Enumerator_Rep* rep) {
+    return static_cast<Platform_Enumeration*>(rep)->left;
+}
 
 // An object manager that serves the platform's two classes, each with an instance of another class
 // in front and one too many behind.
@@ -29,7 +33,7 @@ public:
     Instance_Enumerator_Rep* start_enum(const char* name_space, const Instance* model) override {
         if (std::strcmp(name_space, "root/ibmse") != 0)
             return nullptr;
-        auto* rep = new Instance_Enumerator_Rep;
+        auto* rep = new Platform_Enumeration;
         if (model->__meta_class == &IBMSD_ComputerSystem::static_meta_class)
             rep->left = {Ref<Instance>(create<IBMSD_Chassis>()), computer_system("platform-1"),
                          computer_system("platform-2")};
@@ -37,10 +41,12 @@ public:
             rep->left = {computer_system("platform-1"), Ref<Instance>(create<IBMSD_Chassis>())};
         return rep;
     }
-    void destroy_enum(Instance_Enumerator_Rep* rep) override { delete rep; }
-    bool more(Instance_Enumerator_Rep* rep) override { return !rep->left.empty(); }
-    void next(Instance_Enumerator_Rep* rep) override { rep->left.erase(rep->left.begin()); }
-    Ref<Instance> get(Instance_Enumerator_Rep* rep) override { return rep->left.front(); }
+    void destroy_enum(Instance_Enumerator_Rep* rep) override {
+        delete static_cast<Platform_Enumeration*>(rep);
+    }
+    bool more(Instance_Enumerator_Rep* rep) override { return !left_of(rep).empty(); }
+    void next(Instance_Enumerator_Rep* rep) override { left_of(rep).erase(left_of(rep).begin()); }
+    Ref<Instance> get(Instance_Enumerator_Rep* rep) override { return left_of(rep).front(); }
 
     Ref<Instance> get_instance(const char*, const Instance*) override { return {}; }
     int create_instance(const char*, const Instance*) override { return -1; }
@@ -131,7 +137,7 @@ TEST_F(Platform_Test, OwnComputerSystemIsNamedAfterTheHost) {
         const CIM_ComputerSystem* system = agent->m_CIM_ComputerSystem_map[0];
         EXPECT_STREQ(system->Name.value.c_str(), row.name);
         EXPECT_EQ(joined(system->OtherIdentifyingInfo),
-                  std::string(row.address) + ";Linux version 6.1.0\n;");
+                  std::string(row.address) + ";Linux version 6.1.0;");
         EXPECT_EQ(joined(system->IdentifyingDescriptions), "VORLAN:IP_ADDRESS;VORLAN:OS_NAME;");
         EXPECT_TRUE(system->EnabledState.is_null());
     }

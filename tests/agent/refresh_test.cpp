@@ -74,10 +74,10 @@ TEST_F(Refresh_Test, DiagnosticsHoldTheRefreshBack) {
 TEST_F(Refresh_Test, OneThreadAtATime) {
     Loaded_Agent agent;
     Log_Capture log;
-    agent->m_DataMutex.lock();
+    Long_Operation operation(*agent);
     for (int call = 0; call < 3; ++call)
         agent->BuildCimpleInfo();
-    agent->m_DataMutex.unlock();
+    operation.end();
     settle(*agent);
     EXPECT_EQ(log.count(VLN_DBG, "PERF: DataFetch_Handler Thread BEGIN"), 1);
     EXPECT_EQ(log.count(VLN_DBG, "DataFetch_Handler thread already running-BuildCimpleInfo"), 2);
@@ -99,7 +99,7 @@ TEST_F(Refresh_Test, StaleSanClassAsksForItsPass) {
 // Clients of every kind arrive while the first refresh can't go on; all of them see whole stores.
 TEST_F(Refresh_Test, ClientsWaitAtTheGates) {
     Loaded_Agent agent;
-    agent->m_DataMutex.lock();
+    Long_Operation operation(*agent);
     agent->BuildCimpleInfo();
     std::vector<std::thread> clients;
     std::atomic<int> seen{0};
@@ -115,7 +115,7 @@ TEST_F(Refresh_Test, ClientsWaitAtTheGates) {
         clients.emplace_back(
             [] { EXPECT_EQ(count_instances(VLNMPCA_Card::static_meta_class), 0); });
     }
-    agent->m_DataMutex.unlock();
+    operation.end();
     for (std::thread& client : clients)
         client.join();
     EXPECT_EQ(seen, 8 * 3);

@@ -577,6 +577,13 @@ void Broker::free(Handle* handle) {
     _live--;
 }
 
+int Broker::live_paths_and_instances() const {
+    return static_cast<int>(
+        std::count_if(_handles.begin(), _handles.end(), [](const std::unique_ptr<Handle>& h) {
+            return !h->parameter && (h->table == &path_table || h->table == &instance_table);
+        }));
+}
+
 void Broker::end_call() {
     const std::lock_guard guard(the_mutex);
     std::erase_if(_handles, [](const std::unique_ptr<Handle>& h) { return !h->parameter; });

@@ -70,6 +70,7 @@ public:
 
     // Objects that the engine caused and has not released, and the end of a call, which frees them.
     int live() const { return _live; }
+    int live_paths_and_instances() const;
     int released_parameters = 0; // faults of the engine
     void end_call();
 

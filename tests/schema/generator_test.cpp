@@ -150,6 +150,8 @@ TEST(Generator, EndsWithThePlaceOfTheFault) {
               (std::pair<std::string, int>(
                   "mof/part.mof:4:1: expected ';' after the feature, found '}'\n", 1)));
     EXPECT_FALSE(fs::exists("bad_out"));
+    EXPECT_EQ(run("--check mof/main.mof").second, 1);
+    EXPECT_EQ(run("--check " MOF_FOLDER "/catalogue.mof").second, 0);
     EXPECT_EQ(run("none.mof bad_out bad_share 1 1 1"),
               (std::pair<std::string, int>("none.mof:1:1: cannot read the file\n", 1)));
     here.write("mof/part.mof", "class CIM_A { };\n");

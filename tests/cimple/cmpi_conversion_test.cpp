@@ -1,0 +1,390 @@
+// Values between CMPI objects and instances, both ways.
+#include "cimple/conversion.h"
+#include "tests/cimple/fake_broker.h"
+#include "tests/cimple/test_schema.h"
+
+#include <gtest/gtest.h>
+#include <limits>
+
+#pragma GCC diagnostic ignored "-Winvalid-offsetof"
+
+namespace cimple {
+
+namespace {
+
+class Conversion_Test : public testing::Test {
+protected:
+    ~Conversion_Test() override { EXPECT_EQ(broker.released_parameters, 0); }
+
+    template <class C>
+    Ref<C> from_path(fake::Members keys, const char* name_space = "root/test") {
+        Instance* out = nullptr;
+        EXPECT_EQ(make_cimple_reference({&broker.broker, &test_repository, name_space},
+                                        &C::static_meta_class,
+                                        broker.path(name_space, C::static_meta_class.name, keys),
+                                        out),
+                  0);
+        return out;
+    }
+    template <class C>
+    Ref<C> from_instance(fake::Members properties) {
+        Instance* out = nullptr;
+        const auto path = fake::path_data("root/test", C::static_meta_class.name);
+        EXPECT_EQ(make_cimple_instance(converter, &C::static_meta_class,
+                                       broker.instance(fake::instance_data(path, properties)), out),
+                  0);
+        return out;
+    }
+    fake::Data_Ref to_instance(const Instance* instance, const char** properties = nullptr) {
+        CMPIInstance* out = nullptr;
+        const int rc = make_CMPI_instance(&broker.broker, instance, "root/test", nullptr,
+                                          properties, out);
+        return rc == 0 ? std::make_shared<fake::Data>(fake::Broker::data(out)) : nullptr;
+    }
+
+    fake::Broker broker;
+    const Converter converter = {&broker.broker, &test_repository, "root/test"};
+};
+
+// ---- Every type, alone and as an array, there and back ----
+
+template <class T>
+struct One : Instance {
+    Property<T> Value;
+    Property<Array<T>> Values;
+};
+
+template <class T>
+struct One_Class {
+    const Meta_Property value{{{0}, FLAG_PROPERTY, "Value", nullptr, 0},
+                              Type_Of<T>::code, 0, offsetof(One<T>, Value), nullptr};
+    const Meta_Property values{{{0}, FLAG_PROPERTY, "Values", nullptr, 0},
+                               Type_Of<T>::code, -1, offsetof(One<T>, Values), nullptr};
+    const Meta_Feature* const features[2] = {&value, &values};
+    const uint8 locals[2] = {1, 1};
+    const Meta_Class meta_class{{{{0}, FLAG_CLASS, "One", nullptr, 0}, features, 2, sizeof(One<T>)},
+                                locals, nullptr, 0, &test_repository};
+};
+
+template <class T>
+std::vector<T> samples() {
+    return {std::numeric_limits<T>::lowest(), T(), std::numeric_limits<T>::max()};
+}
+template <>
+std::vector<String> samples() {
+    return {"", "grün", "a longer text than fits the smallest block"};
+}
+template <>
+std::vector<Datetime> samples() {
+    Datetime interval, timestamp;
+    interval.set("00000001020304.000005:000");
+    timestamp.set("20261121042952.000007+060");
+    return {Datetime(), interval, timestamp};
+}
+
+template <class T>
+class Every_Type : public Conversion_Test {};
+
+using All_Types = testing::Types<boolean, uint8, sint8, uint16, sint16, uint32, sint32, uint64,
+                                 sint64, real32, real64, char16, String, Datetime>;
+TYPED_TEST_SUITE(Every_Type, All_Types);
+
+constexpr CMPIType CMPI_TYPES[] = {CMPI_boolean, CMPI_uint8,  CMPI_sint8,  CMPI_uint16,
+                                   CMPI_sint16,  CMPI_uint32, CMPI_sint32, CMPI_uint64,
+                                   CMPI_sint64,  CMPI_real32, CMPI_real64, CMPI_char16,
+                                   CMPI_string,  CMPI_dateTime};
+
+TYPED_TEST(Every_Type, GoesThereAndBack) {
+    const One_Class<TypeParam> meta;
+    const CMPIType expected = CMPI_TYPES[Type_Of<TypeParam>::code];
+    for (const TypeParam& sample : samples<TypeParam>()) {
+        const Ref<Instance> first(create(&meta.meta_class));
+        auto* one = static_cast<One<TypeParam>*>(first.get());
+        one->Value.set(sample);
+        for (const TypeParam& item : samples<TypeParam>())
+            one->Values.append(item);
+
+        const fake::Data_Ref sent = this->to_instance(one);
+        EXPECT_EQ(sent->find("Value")->type, expected);
+        EXPECT_EQ(sent->find("Values")->type, expected | CMPI_ARRAY);
+
+        Instance* out = nullptr;
+        ASSERT_EQ(make_cimple_instance(this->converter, &meta.meta_class,
+                                       this->broker.instance(sent), out),
+                  0);
+        const Ref<Instance> second(out);
+        first->__name_space = "root/test";
+        EXPECT_TRUE(identical(first.get(), second.get()));
+    }
+}
+
+TYPED_TEST(Every_Type, NullStaysNull) {
+    const One_Class<TypeParam> meta;
+    const Ref<Instance> one(create(&meta.meta_class));
+    nullify(one.get(), true, true);
+    EXPECT_TRUE(this->to_instance(one.get())->members.empty());
+
+    const CMPIType type = CMPI_TYPES[Type_Of<TypeParam>::code];
+    const auto path = fake::path_data("", "One");
+    Instance* out = nullptr;
+    make_cimple_instance(
+        this->converter, &meta.meta_class,
+        this->broker.instance(fake::instance_data(
+            path, {{"Value", fake::null(type)},
+                   {"Values", fake::null(static_cast<CMPIType>(type | CMPI_ARRAY))}})),
+        out);
+    const Ref<Instance> back(out);
+    EXPECT_TRUE(is_null(out, &meta.value));
+    EXPECT_TRUE(is_null(out, &meta.values));
+}
+
+// ---- References and embedded objects ----
+
+TEST_F(Conversion_Test, ReferencesGoAsPathsInTheirOwnNamespace) {
+    const Ref<Test_Link> link(create_null<Test_Link>());
+    auto* leaf = create_null<Test_Leaf>();
+    leaf->Name.set("l");
+    leaf->__name_space = "root/other";
+    link->Left = leaf;
+    link->Right = make_base("r", 7);
+
+    const fake::Data_Ref sent = to_instance(link.get());
+    ASSERT_EQ(sent->find("Left")->type, CMPI_ref);
+    EXPECT_EQ(sent->find("Left")->object->name_space, "root/other");
+    EXPECT_EQ(sent->find("Left")->object->text, "Test_Leaf");
+    EXPECT_EQ(sent->find("Right")->object->name_space, "root/test");
+    EXPECT_EQ(sent->find("Right")->object->find("Slot")->scalar.uint32, 7u);
+    EXPECT_EQ(sent->path->find("Left")->type, CMPI_ref) << "key references are keys of the path";
+
+    const auto back = from_instance<Test_Link>(sent->members);
+    EXPECT_TRUE(key_eq(back.get(), link.get()));
+    EXPECT_EQ(back->Left->__name_space, "root/other");
+    EXPECT_EQ(back->Right->__name_space, "root/test");
+}
+
+TEST_F(Conversion_Test, EmbeddedObjectsGoWhole) {
+    const Ref<Test_Holder> holder(create_null<Test_Holder>());
+    holder->Object = make_base("o", 1);
+    holder->Object->Caption.set("not a key");
+    holder->Objects.append(make_base("a", 2));
+    holder->Objects.append(make_base("b", 3));
+
+    const fake::Data_Ref sent = to_instance(holder.get());
+    EXPECT_EQ(sent->find("Object")->type, CMPI_instance);
+    EXPECT_EQ(sent->find("Object")->object->string("Caption"), "not a key");
+    EXPECT_EQ(sent->find("Objects")->type, CMPI_instanceA);
+
+    fake::Members members = sent->members;
+    for (auto& [name, value] : members)
+        if (name == "Objects")
+            value.object->elements.push_back(fake::null(CMPI_instance));
+    const auto back = from_instance<Test_Holder>(members);
+    EXPECT_STREQ(back->Object->Caption.value.c_str(), "not a key");
+    ASSERT_EQ(back->Objects.value.size(), 3u);
+    EXPECT_EQ(back->Objects.value[1]->Slot.value, 3u);
+    EXPECT_EQ(back->Objects.value[2], nullptr) << "a null element is kept as a null pointer";
+}
+
+TEST_F(Conversion_Test, ReferenceToAnotherClassIsRefused) {
+    const auto link = from_instance<Test_Link>(
+        {{"Left", fake::object(CMPI_ref, fake::path_data("", "Test_Base"))},
+         {"Right", fake::object(CMPI_ref, fake::path_data("", "Unknown_Class"))},
+         {"Weight", fake::number(CMPI_uint32, 3)}});
+    EXPECT_EQ(link->Left, nullptr);
+    EXPECT_EQ(link->Right, nullptr);
+    EXPECT_EQ(link->Weight.value, 3u);
+}
+
+// ---- From CMPI ----
+
+TEST_F(Conversion_Test, KeysAreNarrowedByTruncation) {
+    const auto types = from_path<Test_Types>({
+        {"U8", fake::number(CMPI_uint64, 5)},
+        {"S8", fake::number(CMPI_uint64, 300)},
+        {"U16", fake::number(CMPI_uint64, 0x12345)},
+        {"S32", fake::number(CMPI_uint64, 0xFFFFFFFF)},
+        {"S64", fake::number(CMPI_uint64, ~0ull)},
+        {"U32", fake::number(CMPI_sint64, 0x100000002)},
+        {"S16", fake::number(CMPI_sint64, 4)},
+    });
+    EXPECT_EQ(types->U8.value, 5);
+    EXPECT_EQ(types->S8.value, 44);
+    EXPECT_EQ(types->U16.value, 0x2345);
+    EXPECT_EQ(types->S32.value, -1);
+    EXPECT_EQ(types->S64.value, -1);
+    EXPECT_EQ(types->U32.value, 2u);
+    EXPECT_TRUE(types->S16.is_null()) << "signed keys are narrowed to uint32 only";
+
+    const auto base = from_instance<Test_Base>({{"Slot", fake::number(CMPI_uint64, 5)}});
+    EXPECT_TRUE(base->Slot.is_null()) << "properties are not narrowed";
+}
+
+TEST_F(Conversion_Test, PathGivesKeysOnly) {
+    const auto sub = from_path<Test_Sub>({{"id", fake::text("x")},
+                                          {"Caption", fake::text("no key")},
+                                          {"Nonsense", fake::text("")}});
+    EXPECT_STREQ(sub->Id.value.c_str(), "x") << "names compare without regard to case";
+    EXPECT_TRUE(sub->Slot.is_null());
+    EXPECT_TRUE(sub->Caption.is_null());
+    EXPECT_STREQ(sub->__name_space.c_str(), "root/test");
+}
+
+TEST_F(Conversion_Test, ABadMemberFailsAlone) {
+    const auto null_string = fake::object(CMPI_string, nullptr);
+    const auto types = from_instance<Test_Types>({
+        {"Unknown", fake::number(CMPI_uint8, 1)},
+        {"U8", fake::text("not a number")},
+        {"U16", fake::number(CMPI_uint32, 1)},
+        {"B", fake::number(CMPI_boolean, 2)},
+        {"Str", null_string},
+        {"Date", fake::object(CMPI_dateTime, fake::path_data("", "20261121"))},
+        {"Installed", fake::object(CMPI_dateTime, nullptr)},
+        {"Numbers", fake::array(CMPI_uint32, {fake::number(CMPI_uint32, 1),
+                                              fake::null(CMPI_uint32)})},
+        {"Names", fake::array(CMPI_string, {fake::number(CMPI_uint32, 1)})},
+        {"Dates", fake::object(CMPI_dateTimeA, nullptr)},
+        {"S8", {CMPI_sint8, CMPI_badValue, {}, nullptr}},
+        {"U64", fake::number(CMPI_uint64, 9)},
+    });
+    EXPECT_EQ(types->U64.value, 9u) << "the last one, behind all the bad ones";
+    EXPECT_FALSE(types->Str.is_null()) << "a null string handle is an empty text";
+    EXPECT_TRUE(types->Str.value.empty());
+    EXPECT_TRUE(types->B.value) << "any non-zero byte is true";
+    EXPECT_TRUE(types->U8.is_null() && types->U16.is_null() && types->S8.is_null());
+    EXPECT_TRUE(types->Date.is_null() && types->Installed.is_null());
+    EXPECT_TRUE(types->Numbers.is_null() && types->Names.is_null() && types->Dates.is_null());
+}
+
+// ---- Arguments ----
+
+// The In parameter of type T that a text argument arrives as.
+template <class T>
+Property<T> parse_argument(fake::Broker& broker, const char* text) {
+    const Meta_Property value{{{0}, FLAG_PROPERTY | FLAG_IN, "Value", nullptr, 0},
+                              Type_Of<T>::code, 0, offsetof(One<T>, Value), nullptr};
+    const Meta_Feature* const features[] = {&value};
+    const Meta_Method method{{{{0}, FLAG_METHOD, "Do", nullptr, 0}, features, 1, sizeof(One<T>)},
+                             TYPE_UINT32};
+    Instance* out = nullptr;
+    make_method_instance({&broker.broker, &test_repository, ""}, &method,
+                         broker.args({{"Value", fake::text(text)}}), out);
+    const Property<T> parsed = static_cast<One<T>*>(out)->Value;
+    destroy(out);
+    return parsed;
+}
+
+template <class T>
+void expect_cast(fake::Broker& broker, const char* text, T expected) {
+    const Property<T> parsed = parse_argument<T>(broker, text);
+    EXPECT_FALSE(parsed.is_null()) << text;
+    EXPECT_EQ(parsed.value, expected) << text;
+}
+
+template <class T>
+void expect_refused(fake::Broker& broker, const char* text) {
+    EXPECT_TRUE(parse_argument<T>(broker, text).is_null()) << text;
+}
+
+TEST_F(Conversion_Test, StringArgumentsAreCastToSmallScalars) {
+    expect_cast<uint16>(broker, "12", 12);
+    expect_cast<uint16>(broker, "abc", 0);
+    expect_cast<uint8>(broker, "300", 44);
+    expect_cast<sint8>(broker, "-1", -1);
+    expect_cast<uint32>(broker, "4294967295", 4294967295u);
+    expect_cast<sint32>(broker, "-5x", -5);
+    expect_cast<boolean>(broker, "TRUE", true);
+    expect_cast<boolean>(broker, "falsehood", false);
+    expect_refused<boolean>(broker, "yes");
+    expect_refused<uint64>(broker, "12");
+    expect_refused<real64>(broker, "1.5");
+    expect_refused<char16>(broker, "c");
+    expect_refused<Datetime>(broker, "00000001020304.000005:000");
+    EXPECT_STREQ(parse_argument<String>(broker, "12").value.c_str(), "12");
+}
+
+TEST_F(Conversion_Test, MethodParametersByDirection) {
+    Instance* out = nullptr;
+    make_method_instance(converter, &Test_Service_Run_method::static_meta_class,
+                         broker.args({{"Level", fake::number(CMPI_uint32, 4)},
+                                      {"Answer", fake::text("an output is not read")}}),
+                         out);
+    const Ref<Instance> owner(out);
+    auto* method = static_cast<Test_Service_Run_method*>(out);
+    EXPECT_EQ(method->Level.value, 4u);
+    EXPECT_TRUE(method->Answer.is_null());
+
+    method->Answer.set("done");
+    method->return_value.set(9);
+    CMPIArgs* args = broker.args();
+    CMPIValue value;
+    CMPIType type;
+    EXPECT_EQ(make_method_out(&broker.broker, "", method, args, value, type), 0);
+    EXPECT_EQ(type, CMPI_uint32);
+    EXPECT_EQ(value.uint32, 9u);
+    ASSERT_EQ(fake::Broker::data(args).members.size(), 1u) << "neither inputs nor the return value";
+    EXPECT_EQ(fake::Broker::data(args).string("Answer"), "done");
+}
+
+// ---- To CMPI ----
+
+TEST_F(Conversion_Test, PropertyListComesWithTheKeys) {
+    const Ref<Test_Sub> sub(create_null<Test_Sub>());
+    sub->Id.set("i");
+    sub->Caption.set("c");
+    sub->State.set(2);
+    const char* properties[] = {"State", nullptr};
+    const fake::Data_Ref sent = to_instance(sub.get(), properties);
+    EXPECT_TRUE(sent->find("State"));
+    EXPECT_TRUE(sent->find("Id"));
+    EXPECT_FALSE(sent->find("Caption"));
+}
+
+// Each function of the broker fails, always and at each of its calls: nothing is lost but what could
+// not be converted, and nothing crashes.
+TEST_F(Conversion_Test, FailuresOfTheBroker) {
+    const Ref<Test_Holder> holder(create_null<Test_Holder>());
+    holder->Id.set("h");
+    holder->Object = make_base("o", 1);
+    holder->Objects.append(make_base("a", 2));
+    holder->Count.set(3);
+    const fake::Data_Ref good = to_instance(holder.get());
+    ASSERT_EQ(good->members.size(), 4u);
+
+    for (const char* function : {"newInstance", "newObjectPath", "newString", "newArray",
+                                 "setElementAt", "setProperty", "addKey"}) {
+        for (int n = 0; n < 6; n++) {
+            broker.failures = {{function, n}};
+            const fake::Data_Ref sent = to_instance(holder.get());
+            if (sent && std::string(function) != "setProperty") {
+                EXPECT_EQ(sent->find("Count")->scalar.uint32, 3u) << function << n;
+            }
+        }
+    }
+    broker.failures.clear();
+    const auto path = fake::path_data("", "Test_Holder");
+    for (const char* function : {"getPropertyAt", "getPropertyCount", "getKeyAt", "getKeyCount",
+                                 "getCharPtr", "getClassName", "getNameSpace", "getObjectPath",
+                                 "getSize", "getElementAt"}) {
+        for (int n = 0; n < 12; n++) {
+            broker.failures = {{function, n}};
+            Instance* out = nullptr;
+            const int rc = make_cimple_instance(
+                converter, &Test_Holder::static_meta_class,
+                broker.instance(fake::instance_data(path, good->members)), out);
+            EXPECT_EQ(rc == 0, out != nullptr) << function << n;
+            unref(out);
+        }
+    }
+}
+
+TEST(Type_Words, NameEveryCode) {
+    EXPECT_STREQ(type_word(TYPE_NONE), "NONE");
+    EXPECT_STREQ(type_word(TYPE_UINT8), "UINT8");
+    EXPECT_STREQ(type_word(0x8E), "INSTANCE_ARRAY");
+    EXPECT_EQ(from_cmpi_type(CMPI_refA), 0x8E);
+    EXPECT_EQ(from_cmpi_type(CMPI_chars), TYPE_NONE);
+}
+
+} // namespace
+
+} // namespace cimple

@@ -35,6 +35,9 @@ public:
     uint32 run();
 
 private:
+    // adapter_maps.cpp
+    void updateSoftwareIdentities();
+
     // A NIC function on its way through the card loop, with what its card shares with others.
     struct NIC_Function {
         NICAdapter* adapter;
@@ -70,6 +73,7 @@ private:
     void createNICCard(NICAdapter& adapter);
     VLNMPCA_Product* findOrMakeProduct(const NICAdapterAttributes& attributes);
     VLNMPCA_Card* CreateMPCACardInstance(const NICAdapterAttributes& attributes);
+    void updateFRUData(const NIC_Function& function);
     void tieNewCard(NIC_Function& function);
     void findOrMakeConnector(NIC_Port& port);
     void joinConnector(const NIC_Port& port);

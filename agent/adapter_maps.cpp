@@ -1,6 +1,7 @@
 // The order of the adapter pass.
 
 #include "agent/adapter_map_builder.h"
+#include "agent/vpd_maps.h"
 
 namespace cimple {
 
@@ -24,8 +25,20 @@ uint32 Adapter_Map_Builder::run() {
         createNICCards();
     else
         VLN_LOG(VLN_DBG, "No NIC card found");
+    updateSoftwareIdentities();
     VLN_LOG(VLN_DBG, "PERF: updateAdapterMaps: cleanExit");
     return MAP_OK;
+}
+
+// A closing step: what fails here leaves the identities as they are.
+void Adapter_Map_Builder::updateSoftwareIdentities() {
+    try {
+        VLN_LOG(VLN_DBG, "Updating FRU information to Softwareidentity Class");
+        if (VPD_Maps(_agent).UpdateFRUToSoftwareInstance() != 0)
+            VLN_LOG(VLN_DBG, "Failed to update FRU VPD data to cim_softwareidentity instances");
+    } catch (...) {
+        VLN_LOG(VLN_DBG, "UpdateFRUToSoftwareInstance failed");
+    }
 }
 
 } // namespace cimple

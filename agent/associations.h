@@ -4,14 +4,11 @@
 #ifndef VLN_AGENT_ASSOCIATIONS_H
 #define VLN_AGENT_ASSOCIATIONS_H
 
+#include "agent/name_spaces.h"
 #include "cimple/instance_map.h"
 #include "foundation/logger.h"
 
 namespace cimple {
-
-inline constexpr char VORLAN_NAME_SPACE[] = "root/vorlan";
-inline constexpr char INTEROP_NAME_SPACE[] = "root/pg_interop";
-inline constexpr char PLATFORM_NAME_SPACE[] = "root/ibmse";
 
 // A new instance in "root/vorlan" with every property null, as each map builder starts from.
 Instance* make_instance(const Meta_Class* meta_class);

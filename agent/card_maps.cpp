@@ -5,8 +5,10 @@
 
 #include "agent/adapter_map_builder.h"
 #include "agent/associations.h"
+#include "agent/port_name.h"
 #include "agent/store_search.h"
 #include "agent/text.h"
+#include "agent/vpd_maps.h"
 
 namespace cimple {
 
@@ -116,6 +118,7 @@ void Adapter_Map_Builder::createNICCard(NICAdapter& adapter) {
         function.new_card = function.card != nullptr;
         if (!function.card)
             VLN_LOG(VLN_CRIT, "CreateMPCACardInstance failed");
+        updateFRUData(function);
         associate(_agent.m_VLNMPCA_ProductPhysicalComponent_map, function.product, function.card,
                   "Insert Failed (CNA): VLNMPCA_ProductPhysicalComponent");
     }
@@ -133,6 +136,16 @@ VLNMPCA_Product* Adapter_Map_Builder::findOrMakeProduct(const NICAdapterAttribut
 
 VLNMPCA_Card* Adapter_Map_Builder::CreateMPCACardInstance(const NICAdapterAttributes& attributes) {
     return insert_instance(_agent.m_VLNMPCA_Card_map, card_instance(attributes));
+}
+
+// Comes before anything refers to the card, since it may give the card another key.
+void Adapter_Map_Builder::updateFRUData(const NIC_Function& function) {
+    const Port_List& ports = function.adapter->getPorts();
+    if (!function.card || ports.empty())
+        return;
+    VPD_Maps(_agent).UpdateFRUToCard(*function.card, asic_name(*function.attributes),
+                                     text(ports.front()->getPortName()),
+                                     _agent.m_VLNMPCA_Card_map.size() - 1);
 }
 
 // What hangs on the card itself is made once, with the card's first port.

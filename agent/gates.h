@@ -18,7 +18,6 @@ public:
         if (!ready)
             cond.wait(mutex);
     }
-    void unlock() { _lock.unlock(); }
 
 private:
     Auto_Mutex _lock;

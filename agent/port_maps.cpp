@@ -4,6 +4,7 @@
 #include "agent/associations.h"
 #include "agent/beacon.h"
 #include "agent/mac_text.h"
+#include "agent/port_name.h"
 #include "agent/state_tables.h"
 #include "agent/text.h"
 #include "classes/VLNMPCA_EnabledLogicalElementCapabilities.h"
@@ -39,10 +40,7 @@ void append_capabilities(Property<Array<uint16>>& capabilities, const std::strin
 // Who the port is besides its key. Later look-ups match the texts by their position.
 void append_identities(VLNMPCA_EthernetPort& port, const NICAdapterAttributes& adapter,
                        const String& serial_and_number) {
-    std::string serial_and_sub_adapter = adapter.SerialNumber;
-    if (!adapter.Subadapter_number.empty())
-        serial_and_sub_adapter += ":" + adapter.Subadapter_number;
-    port.OtherIdentifyingInfo.append(text(serial_and_sub_adapter));
+    port.OtherIdentifyingInfo.append(asic_name(adapter));
     port.IdentifyingDescriptions.append(String("SerialNumber + Sub-AdapterID"));
     port.OtherIdentifyingInfo.append(serial_and_number);
     port.IdentifyingDescriptions.append(String("SerialNumber:PhysicalPortNumber"));

@@ -1,5 +1,6 @@
 #include "agent/port_name.h"
 
+#include "agent/text.h"
 #include "foundation/log.h"
 
 namespace cimple {
@@ -17,6 +18,13 @@ bool port_name_to_wwn(const String& port_name, HBA_WWN& wwn) {
         return false;
     }
     return true;
+}
+
+String asic_name(const NICAdapterAttributes& adapter) {
+    String name = text(adapter.SerialNumber);
+    if (!adapter.Subadapter_number.empty())
+        name.append((":" + adapter.Subadapter_number).c_str());
+    return name;
 }
 
 } // namespace cimple

@@ -1,14 +1,19 @@
-// A port's identifier as the library takes it.
+// Names by which ports and ASICs are known.
 #ifndef VLN_AGENT_PORT_NAME_H
 #define VLN_AGENT_PORT_NAME_H
 
 #include "cimple/string.h"
+#include "device/adapter_attributes.h"
 #include "operations/method_wrapper.h"
 
 namespace cimple {
 
 // The port's name in binary. False, with the line of the step that failed, when it is no name.
 bool port_name_to_wwn(const String& port_name, HBA_WWN& wwn);
+
+// The ASIC of a function: the card's serial number, and the number of the sub-adapter behind a
+// colon if it has one.
+String asic_name(const NICAdapterAttributes& adapter);
 
 } // namespace cimple
 

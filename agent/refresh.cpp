@@ -157,6 +157,11 @@ void ProviderAgent::runSANPass() {
     m_bIsSANMapsReady = false; // without its own mutex, as above
     if (!m_bIsAdapterDataReady)
         m_AdapterDataReadyCond.wait(m_AdapterDataReadyMutex);
+    if (m_bLibraryLoaded) {
+        Auto_Mutex data(m_DataMutex);
+        VLN_LOG(VLN_DBG, "PERF: Building SAN Data...");
+        guarded("buildSANData", [this] { m_pData->buildSANData(); });
+    }
     Auto_Mutex maps_gate(m_AdapterMapsReadyMutex);
     if (!m_bIsAdapterMapsReady)
         m_AdapterMapsReadyCond.wait(m_AdapterMapsReadyMutex);

@@ -1,9 +1,10 @@
-// The floor that the library's enumeration is measured against: a provider written straight to CMPI.
+// The floor that the library's enumeration is measured against: a provider written straight to
+// CMPI.
 //
-// It answers VLNMPCA_EthernetPort from constant data, as a careful programmer would by hand: one object
-// path and one instance per port, a broker call per property, nothing else. It has the shape of the
-// instances that the library makes of the simulated two-port card; only DeviceID differs from one
-// instance to the next. VLN_FLOOR_INSTANCES says how many there are.
+// It answers VLNMPCA_EthernetPort from constant data, as a careful programmer would by hand: one
+// object path and one instance per port, a broker call per property, nothing else. It has the shape
+// of the instances that the library makes of the simulated two-port card; only DeviceID differs
+// from one instance to the next. VLN_FLOOR_INSTANCES says how many there are.
 #include "cmpi/cmpi.h"
 
 #include <cstdio>
@@ -15,8 +16,8 @@ constexpr const char* CLASS_NAME = "VLNMPCA_EthernetPort";
 
 struct Property_Row {
     const char* name;
-    CMPIType type;       // CMPI_uint64 stands for all unsigned numbers of `number`
-    const char* text;    // strings: the value; arrays of strings: up to three, separated by '|'
+    CMPIType type;    // CMPI_uint64 stands for all unsigned numbers of `number`
+    const char* text; // strings: the value; arrays of strings: up to three, separated by '|'
     CMPIUint64 number;
 };
 
@@ -124,9 +125,8 @@ CMPIStatus cleanup(CMPIInstanceMI*, const CMPIContext*, CMPIBoolean) {
 
 CMPIStatus enumerate(CMPIInstanceMI*, const CMPIContext*, const CMPIResult* result,
                      const CMPIObjectPath* model, const char** properties) {
-    const char* name_space =
-        model->ft->getNameSpace(model, nullptr)->ft->getCharPtr(
-            model->ft->getNameSpace(model, nullptr), nullptr);
+    const char* name_space = model->ft->getNameSpace(model, nullptr)
+                                 ->ft->getCharPtr(model->ft->getNameSpace(model, nullptr), nullptr);
     const unsigned count = instance_count();
     for (unsigned i = 0; i < count; ++i) {
         char device_id[32];
@@ -180,8 +180,8 @@ CMPIStatus query(CMPIInstanceMI*, const CMPIContext*, const CMPIResult*, const C
 extern "C" __attribute__((visibility("default"))) CMPIInstanceMI*
 VLNMPCA_EthernetPort_Provider_Create_InstanceMI(const CMPIBroker* b, const CMPIContext*,
                                                 CMPIStatus*) {
-    static CMPIInstanceMIFT table = {100, 100, "floor", cleanup, names, enumerate,
-                                     get, create, modify, remove, query};
+    static CMPIInstanceMIFT table = {100, 100,    "floor", cleanup, names, enumerate,
+                                     get, create, modify,  remove,  query};
     static CMPIInstanceMI mi = {nullptr, &table};
     broker = b;
     return &mi;

@@ -3,10 +3,10 @@
 
 #include "cimple/cmpi_frame.h"
 #include "cimple/cmpi_thread_context.h"
+#include "cimple/guard.h"
 #include "cimple/log.h"
 
 #include <cstdio>
-#include <cxxabi.h>
 #include <memory>
 
 namespace cimple {
@@ -76,12 +76,12 @@ private:
 void destroy_adapter(CMPI_Adapter* adapter) {
     CIMPLE_DBG("enter: %s()", "~CMPI_Adapter");
     const std::unique_ptr<CMPI_Adapter> owner(adapter);
-    try {
+    const bool complete = run_guarded([adapter] {
         adapter->proc(adapter->registration, OP_DESTROY_PROVIDER,
                       reinterpret_cast<Provider_Word>(adapter->provider), 0, 0, 0, 0, 0, 0, 0);
-    } catch (...) {
+    });
+    if (!complete)
         CIMPLE_ERR("exception in %s()", "~CMPI_Adapter");
-    }
 }
 
 void drop_user(CMPI_Adapter* adapter) {
@@ -299,18 +299,17 @@ Answer run_body(CMPI_Adapter& adapter, const CMPIContext* context, const char* f
 
 CMPIStatus run_call(void* handle, const CMPIContext* context, const char* function, Locking locking,
                     Answer (*body)(const Call& call, void* closure), void* closure) {
-    try {
+    Answer answer = CMPI_RC_ERR_INVALID_HANDLE;
+    const bool complete = run_guarded([&] {
         const Adapter_Use use(static_cast<Provider_Static_Data*>(handle));
-        if (!use.get())
-            return {CMPI_RC_ERR_INVALID_HANDLE, nullptr};
-        const Answer answer = run_body(*use.get(), context, function, locking, body, closure);
-        return {static_cast<CMPIrc>(answer.rc), nullptr};
-    } catch (abi::__forced_unwind&) {
-        throw; // the thread is being ended, not the call
-    } catch (...) {
+        if (use.get())
+            answer = run_body(*use.get(), context, function, locking, body, closure);
+    });
+    if (!complete) {
         CIMPLE_ERR("exception in %s()", function);
         return cmpi::FAILED_STATUS;
     }
+    return {static_cast<CMPIrc>(answer.rc), nullptr};
 }
 
 // ---- Delivery ----
@@ -349,15 +348,13 @@ extern "C" int cimple_cmpi_adapter(cimple::Provider_Static_Data* static_data,
                                    const char* provider_name, char letter, void** out) {
     using namespace cimple;
     *out = nullptr;
-    try {
+    const bool complete = run_guarded([&] {
         CIMPLE_DBG("enter: %s()", "cimple_cmpi_adapter");
         count_or_load(static_data, registration, broker, context, provider_name);
         *out = fill_interface(static_data, letter);
         CIMPLE_DBG("return: %s()", "cimple_cmpi_adapter");
-    } catch (abi::__forced_unwind&) {
-        throw;
-    } catch (...) {
+    });
+    if (!complete)
         CIMPLE_ERR("exception in %s()", "cimple_cmpi_adapter");
-    }
     return 0;
 }

@@ -14,20 +14,28 @@ namespace {
 
 struct Type_Row {
     CMPIType cmpi_type;
+    uint8 size; // of a value in an instance
     const char* word;
     const char* array_word;
 };
 
 // By type code.
 constexpr Type_Row TYPES[] = {
-    {CMPI_boolean, "BOOLEAN", "BOOLEAN_ARRAY"},    {CMPI_uint8, "UINT8", "UINT8_ARRAY"},
-    {CMPI_sint8, "SINT8", "SINT8_ARRAY"},          {CMPI_uint16, "UINT16", "UINT16_ARRAY"},
-    {CMPI_sint16, "SINT16", "SINT16_ARRAY"},       {CMPI_uint32, "UINT32", "UINT32_ARRAY"},
-    {CMPI_sint32, "SINT32", "SINT32_ARRAY"},       {CMPI_uint64, "UINT64", "UINT64_ARRAY"},
-    {CMPI_sint64, "SINT64", "SINT64_ARRAY"},       {CMPI_real32, "REAL32", "REAL32_ARRAY"},
-    {CMPI_real64, "REAL64", "REAL64_ARRAY"},       {CMPI_char16, "CHAR16", "CHAR16_ARRAY"},
-    {CMPI_string, "STRING", "STRING_ARRAY"},       {CMPI_dateTime, "DATETIME", "DATETIME_ARRAY"},
-    {CMPI_instance, "INSTANCE", "INSTANCE_ARRAY"},
+    {CMPI_boolean, sizeof(boolean), "BOOLEAN", "BOOLEAN_ARRAY"},
+    {CMPI_uint8, sizeof(uint8), "UINT8", "UINT8_ARRAY"},
+    {CMPI_sint8, sizeof(sint8), "SINT8", "SINT8_ARRAY"},
+    {CMPI_uint16, sizeof(uint16), "UINT16", "UINT16_ARRAY"},
+    {CMPI_sint16, sizeof(sint16), "SINT16", "SINT16_ARRAY"},
+    {CMPI_uint32, sizeof(uint32), "UINT32", "UINT32_ARRAY"},
+    {CMPI_sint32, sizeof(sint32), "SINT32", "SINT32_ARRAY"},
+    {CMPI_uint64, sizeof(uint64), "UINT64", "UINT64_ARRAY"},
+    {CMPI_sint64, sizeof(sint64), "SINT64", "SINT64_ARRAY"},
+    {CMPI_real32, sizeof(real32), "REAL32", "REAL32_ARRAY"},
+    {CMPI_real64, sizeof(real64), "REAL64", "REAL64_ARRAY"},
+    {CMPI_char16, sizeof(char16), "CHAR16", "CHAR16_ARRAY"},
+    {CMPI_string, sizeof(String), "STRING", "STRING_ARRAY"},
+    {CMPI_dateTime, sizeof(Datetime), "DATETIME", "DATETIME_ARRAY"},
+    {CMPI_instance, sizeof(Instance*), "INSTANCE", "INSTANCE_ARRAY"},
 };
 static_assert(sizeof(TYPES) / sizeof(TYPES[0]) == TYPE_INSTANCE + 1);
 
@@ -106,46 +114,36 @@ struct Source {
 
 template <class Carrier>
 bool fill(const Source& source, const Instance* instance, uint32 flags, Carrier carrier);
-
-// A scalar in its natural width. Every member of the union starts at its first byte.
-inline void copy_scalar(CMPIValue& to, const void* from, uint32 type) {
-    switch (type) {
-    case TYPE_BOOLEAN:
-    case TYPE_UINT8:
-    case TYPE_SINT8:
-        std::memcpy(&to, from, 1);
-        break;
-    case TYPE_UINT16:
-    case TYPE_SINT16:
-    case TYPE_CHAR16:
-        std::memcpy(&to, from, 2);
-        break;
-    case TYPE_UINT32:
-    case TYPE_SINT32:
-    case TYPE_REAL32:
-        std::memcpy(&to, from, 4);
-        break;
-    default:
-        std::memcpy(&to, from, 8);
-        break;
-    }
-}
+void fill_keys(const Source& source, const Instance* instance, CMPIObjectPath* path);
 
 // One value of a property's type, or one element of an array of them.
-bool scalar_value(const Source& source, const void* from, uint32 type, CMPIValue& value) {
-    switch (type) {
-    case TYPE_STRING:
+inline bool scalar_value(const Source& source, const void* from, uint32 type, CMPIValue& value) {
+    if (type == TYPE_STRING) {
         value.string = cmpi::new_string(source.broker, static_cast<const String*>(from)->c_str());
         return value.string != nullptr;
-    case TYPE_DATETIME:
+    }
+    if (type == TYPE_DATETIME) {
         value.dateTime =
             cmpi::new_datetime(source.broker, static_cast<const Datetime*>(from)->ascii().c_str());
         return value.dateTime != nullptr;
-    default:
-        value.uint64 = 0;
-        copy_scalar(value, from, type);
-        return true;
     }
+    // Every member of the union starts at its first byte. The rest is zero: some brokers read it.
+    value.uint64 = 0;
+    switch (TYPES[type].size) {
+    case 1:
+        std::memcpy(&value, from, 1);
+        break;
+    case 2:
+        std::memcpy(&value, from, 2);
+        break;
+    case 4:
+        std::memcpy(&value, from, 4);
+        break;
+    default:
+        std::memcpy(&value, from, 8);
+        break;
+    }
+    return true;
 }
 
 bool array_value(const Source& source, const Array_Base& items, uint32 type, CMPIValue& value) {
@@ -154,7 +152,7 @@ bool array_value(const Source& source, const Array_Base& items, uint32 type, CMP
     if (!value.array)
         return false;
     const char* item = static_cast<const char*>(items.data());
-    const uint32 step = type_size(type);
+    const uint32 step = TYPES[type].size;
     for (uint32 i = 0; i < items.size(); i++, item += step) {
         CMPIValue element;
         if (!scalar_value(source, item, type, element))
@@ -187,10 +185,7 @@ bool instance_value(const Source& source, const Instance* instance, bool embedde
         CIMPLE_WARN("CMNewObjectPath() failed");
         return false;
     }
-    if (!fill(own, instance, FLAG_KEY, To_Path{path})) {
-        CIMPLE_WARN("Container::convert() failed");
-        return false;
-    }
+    fill_keys(own, instance, path);
     if (!embedded) {
         value.ref = path;
         return true;
@@ -223,27 +218,54 @@ bool instance_array_value(const Source& source, const Array_Base& items, bool em
     return true;
 }
 
-// The value of a member that is not null, with its CMPI type.
-bool to_cmpi_data(const Source& source, const Instance* instance, const Meta_Feature* feature,
-                  CMPIValue& value, CMPIType& type) {
-    if (feature->flags & FLAG_PROPERTY) {
-        const auto* property = static_cast<const Meta_Property*>(feature);
-        const void* from = member(instance, property->offset);
-        type = to_cmpi_type(property->type);
-        if (property->subscript == 0)
-            return scalar_value(source, from, property->type, value);
-        type |= CMPI_ARRAY;
-        return array_value(source, *static_cast<const Array_Base*>(from), property->type, value);
-    }
-    const auto* target = static_cast<const Meta_Reference*>(feature);
+// The value of a property that is not null, with its CMPI type.
+inline bool property_value(const Source& source, const void* from, const Meta_Property* property,
+                           CMPIValue& value, CMPIType& type) {
+    type = TYPES[property->type].cmpi_type;
+    if (property->subscript == 0)
+        return scalar_value(source, from, property->type, value);
+    type |= CMPI_ARRAY;
+    return array_value(source, *static_cast<const Array_Base*>(from), property->type, value);
+}
+
+bool reference_value(const Source& source, const Instance* instance, const Meta_Reference* feature,
+                     CMPIValue& value, CMPIType& type) {
     const bool embedded = (feature->flags & FLAG_EMBEDDED) != 0;
     type = embedded ? CMPI_instance : CMPI_ref;
-    if (target->subscript == 0)
-        return instance_value(source, reference(instance, target), embedded, value);
-    const auto* items = static_cast<const Array_Base*>(member(instance, target->offset));
+    if (feature->subscript == 0)
+        return instance_value(source, reference(instance, feature), embedded, value);
+    const auto* items = static_cast<const Array_Base*>(member(instance, feature->offset));
     const CMPIType element_type = type;
     type |= CMPI_ARRAY;
     return instance_array_value(source, *items, embedded, element_type, value);
+}
+
+// Hands one member to the carrier unless it is null.
+template <class Carrier>
+inline void pass_member(const Source& source, const Instance* instance, const Meta_Feature* feature,
+                        Carrier& carrier) {
+    CMPIValue value;
+    CMPIType type;
+    bool converted;
+    if (feature->flags & FLAG_PROPERTY) {
+        const auto* property = static_cast<const Meta_Property*>(feature);
+        const auto* from = static_cast<const uint8*>(member(instance, property->offset));
+        // Most members of most instances are null: their flags are read here, without a call.
+        if (from[property->subscript ? sizeof(Array_Base) : TYPES[property->type].size])
+            return;
+        converted = property_value(source, from, property, value, type);
+    } else if ((feature->flags & FLAG_REFERENCE) && !is_null(instance, feature)) {
+        converted = reference_value(source, instance, static_cast<const Meta_Reference*>(feature),
+                                    value, type);
+    } else {
+        return;
+    }
+    if (!converted)
+        CIMPLE_WARN("_to_cmpi_data() failed: feature=%s", feature->name);
+    else
+        converted = carrier.set(feature->name, value, type);
+    if (!converted)
+        CIMPLE_WARN("conversion error: %s.%s", instance->__meta_class->name, feature->name);
 }
 
 // Hands the members that share a bit with flags (0: all) and are not null to the carrier. Fails for
@@ -257,21 +279,24 @@ bool fill(const Source& source, const Instance* instance, uint32 flags, Carrier 
     const Meta_Features* meta = instance->__meta_class;
     for (uint32 i = 0; i < meta->num_meta_features; i++) {
         const Meta_Feature* feature = meta->meta_features[i];
-        if (flags && !(feature->flags & flags))
-            continue;
-        if ((feature->flags & FLAG_METHOD) || is_null(instance, feature))
-            continue;
-        CMPIValue value;
-        CMPIType type;
-        bool converted = to_cmpi_data(source, instance, feature, value, type);
-        if (!converted)
-            CIMPLE_WARN("_to_cmpi_data() failed: feature=%s", feature->name);
-        else
-            converted = carrier.set(feature->name, value, type);
-        if (!converted)
-            CIMPLE_WARN("conversion error: %s.%s", meta->name, feature->name);
+        if (flags == 0 || (feature->flags & flags))
+            pass_member(source, instance, feature, carrier);
     }
     return true;
+}
+
+// The keys only. They are few and mostly first, so the walk ends with the last of them.
+void fill_keys(const Source& source, const Instance* instance, CMPIObjectPath* path) {
+    const Meta_Class* meta = instance->__meta_class;
+    To_Path carrier{path};
+    uint32 left = meta->num_keys;
+    for (uint32 i = 0; i < meta->num_meta_features && left > 0; i++) {
+        const Meta_Feature* feature = meta->meta_features[i];
+        if (!(feature->flags & FLAG_KEY))
+            continue;
+        left--;
+        pass_member(source, instance, feature, carrier);
+    }
 }
 
 // One broker needs the key names beside the list, or it would filter the keys out.
@@ -302,7 +327,7 @@ int make_cmpi_object_path(const CMPIBroker* broker, const Instance* instance,
         CIMPLE_WARN("CMNewObjectPath() failed");
         return CMPI_RC_ERR_FAILED;
     }
-    fill({broker, name_space}, instance, FLAG_KEY, To_Path{path});
+    fill_keys({broker, name_space}, instance, path);
     out = path;
     return CMPI_RC_OK;
 }

@@ -44,7 +44,8 @@ public:
     sint32 insert(Instance* instance);
     // Takes the slot out without destroying its instance; a bad index is ignored.
     void remove(uint32 index);
-    void clear() noexcept; // destroys all members, in order
+    void
+    clear() noexcept; // drops all members, in order; those that nobody else counts are destroyed
 
 private:
     struct Key_Index; // hash of the key values to positions

@@ -1,6 +1,7 @@
 #include "cimple/thread.h"
 
 #include "cimple/assert.h"
+#include "cimple/guard.h"
 #include "cimple/log.h"
 #include "cimple/thread_context.h"
 
@@ -8,7 +9,6 @@
 #include <cerrno>
 #include <cstdio>
 #include <cstring>
-#include <cxxabi.h>
 #include <memory>
 #include <new>
 
@@ -148,15 +148,11 @@ private:
     Thread_Context* _context;
 };
 
-void* run_guarded(Thread_Proc proc, void* argument) {
-    try {
-        return proc(argument);
-    } catch (abi::__forced_unwind&) {
-        throw; // Thread::exit and cancellation unwind the stack this way
-    } catch (...) {
+void* call_guarded(Thread_Proc proc, void* argument) {
+    void* value = nullptr;
+    if (!run_guarded([&] { value = proc(argument); }))
         CIMPLE_ERR("exception in a thread");
-        return nullptr;
-    }
+    return value;
 }
 
 void* _thread_proc(void* start_record) {
@@ -168,10 +164,10 @@ void* _thread_proc(void* start_record) {
     void* value;
     if (context) {
         context->thread_start_hook();
-        value = run_guarded(start.proc, start.argument);
+        value = call_guarded(start.proc, start.argument);
         context->thread_exit_hook();
     } else {
-        value = run_guarded(start.proc, start.argument);
+        value = call_guarded(start.proc, start.argument);
     }
     CIMPLE_ASSERT(context == Thread_Context::top());
     return value;

@@ -2,16 +2,11 @@
 #ifndef VLN_DERIVED_OBJECTS_PATTERN_PROVIDER_H
 #define VLN_DERIVED_OBJECTS_PATTERN_PROVIDER_H
 
+#include "agent/name_spaces.h"
 #include "derivedObjects/pattern.h"
 #include "method_stubs.h"
 
 namespace cimple {
-
-// Where the instances live, and the platform's classes that they link to.
-inline constexpr char PATTERN_NAME_SPACE[] = "root/vorlan";
-inline constexpr char PATTERN_INTEROP_NAME_SPACE[] = "root/pg_interop";
-inline constexpr char PATTERN_PLATFORM_CLASSES[] =
-    "IBMSD_ComputerSystem IBMSD_Chassis PG_RegisteredProfile";
 
 // Everything but loading and enumerating is unsupported: the engine serves a get, and all
 // association queries, from the enumeration. A hand-written provider derives from this and hides

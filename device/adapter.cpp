@@ -20,6 +20,16 @@ Port* Adapter::getPort(uint32 index) {
     return ports[index].get();
 }
 
+void Adapter::rescanPorts() {
+    for (const std::unique_ptr<Port>& port : ports) {
+        try {
+            port->rescanTargets(*this);
+        } catch (...) {
+            VLN_LOG(VLN_ERR, "Issue with Target Rescan - moving to the next Port");
+        }
+    }
+}
+
 void Adapter::portFailed(uint32 index) noexcept {
     VLN_LOG(VLN_ERR, "Failed to fetch information for port: [%d] on adapter: [%s]", index,
             adapterName.c_str());

@@ -40,6 +40,8 @@ public:
     virtual uint32 getPortCount() { return static_cast<uint32>(ports.size()); }
     virtual Port_List& getPorts() { return ports; }
     virtual Port* getPort(uint32 index); // throws std::out_of_range beyond the end
+    // Finds anew what the ports see in the SAN. A port that fails is logged and passed over.
+    virtual void rescanTargets() = 0;
 
     uint32 getAdapterType() const { return adapterType; }
 
@@ -51,6 +53,9 @@ protected:
     // Makes the ports 0 to count - 1. One that cannot be made is logged and left out.
     template <class Port_Class, class... Arguments>
     void makePorts(uint32 count, const Arguments&... arguments);
+
+    // The rescan of a kind of adapter whose ports may see targets.
+    void rescanPorts();
 
     // Deletes what the adapter owns, each piece under a guard of its own.
     void releaseOwned(const Cleanup_Texts& texts) noexcept;

@@ -114,6 +114,18 @@ void VLN_Data::buildAdapterData() {
     }
 }
 
+void VLN_Data::buildSANData() {
+    VLN_LOG(VLN_DBG, "buildSANData");
+    for (const std::unique_ptr<Adapter>& adapter : adapters) {
+        try {
+            VLN_LOG(VLN_DBG, "Target Scan from adapter: %s", adapter->getAdapterName().c_str());
+            adapter->rescanTargets();
+        } catch (...) {
+            VLN_LOG(VLN_ERR, "Issue with Target Rescan with Adapter- moving to the next adapter");
+        }
+    }
+}
+
 // False if there is no memory for the table. A failing call leaves the number of instances as the
 // pass before found it.
 bool VLN_Data::listInstances(Scan& scan) {

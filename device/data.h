@@ -22,6 +22,9 @@ public:
     // Scans the host. No adapters at all is no error, but takes two seconds: a driver that is still
     // starting gets the time to show its first NIC function.
     void buildAdapterData();
+    // Finds anew what the adapters see in the SAN: SCSI traffic, which may take long. An adapter
+    // that fails is logged and passed over.
+    void buildSANData();
     // Leaves the object empty and reusable.
     void freeAllData();
 

@@ -1,6 +1,7 @@
 #include "device/fc_adapter.h"
 
 #include "device/hba_api.h"
+#include "device/target_mapping.h"
 
 namespace cimple {
 
@@ -27,6 +28,11 @@ FCAdapter::~FCAdapter() noexcept(false) {
     releaseOwned(ADAPTER_TEXTS);
 }
 
+void FCAdapter::rescanTargets() {
+    VLN_LOG(VLN_DBG, "FCAdapter::rescanTargets");
+    rescanPorts();
+}
+
 FCPort::FCPort(Adapter& owner, uint32 index) : Port(owner, index) {
     auto read = std::make_unique<FCPortAttributes>(owner, index);
     portName = read->PortWWN;
@@ -36,6 +42,14 @@ FCPort::FCPort(Adapter& owner, uint32 index) : Port(owner, index) {
 
 FCPort::~FCPort() noexcept(false) {
     releaseOwned(PORT_TEXTS);
+}
+
+// Comes to no target, whatever the API lists: a Target reads its unit through an FCoE adapter only.
+void FCPort::rescanTargets(Adapter& owner) {
+    VLN_LOG(VLN_DBG, "FCPort::rescanTargets");
+    dropTargets();
+    HBA_Adapter hba(owner.getAdapterName());
+    makeTargets(owner, Target_Mapping(hba.handle()));
 }
 
 PortStatistics* FCPort::getPortStatistics() {

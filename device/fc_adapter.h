@@ -14,6 +14,8 @@ public:
     // `name` is the adapter's name in the HBA API.
     FCAdapter(const std::string& name, uint32 number);
     ~FCAdapter() noexcept(false) override;
+
+    void rescanTargets() override;
 };
 
 class FCPort : public Port {
@@ -21,6 +23,7 @@ public:
     FCPort(Adapter& owner, uint32 index);
     ~FCPort() noexcept(false) override;
 
+    void rescanTargets(Adapter& owner) override;
     PortStatistics* getPortStatistics() override;
     const std::string& getNodeName() const { return nodeName; }
 

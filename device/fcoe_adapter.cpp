@@ -1,6 +1,7 @@
 #include "device/fcoe_adapter.h"
 
 #include "device/hba_api.h"
+#include "device/target_mapping.h"
 #include "foundation/common.h"
 
 #include <algorithm>
@@ -84,6 +85,11 @@ FCoEAdapter::~FCoEAdapter() noexcept(false) {
     releaseOwned(ADAPTER_TEXTS);
 }
 
+void FCoEAdapter::rescanTargets() {
+    VLN_LOG(VLN_DBG, "FCoEAdapter::rescanTargets");
+    rescanPorts();
+}
+
 FCoEPort::FCoEPort(Adapter& owner, uint32 index, const HBAIdentifier& hbaIdentifier,
                    const LocalHBAInfoV4& localHBAInfo)
     : Port(owner, index) {
@@ -95,6 +101,18 @@ FCoEPort::FCoEPort(Adapter& owner, uint32 index, const HBAIdentifier& hbaIdentif
 
 FCoEPort::~FCoEPort() noexcept(false) {
     releaseOwned(PORT_TEXTS);
+}
+
+void FCoEPort::rescanTargets(Adapter& owner) {
+    VLN_LOG(VLN_DBG, "FCoEPort::rescanTargets");
+    dropTargets();
+    const std::string& hbaName = dynamic_cast<FCoEAdapter&>(owner).getHbaAdapterName();
+    VLN_LOG(VLN_DBG, "MPCAadaptername:%s", hbaName.c_str());
+    HBA_Adapter hba(hbaName);
+    const Target_Mapping mapping(hba.handle());
+    VLN_LOG(VLN_DBG, "found target mappings:%zu", mapping.size());
+    makeTargets(owner, mapping);
+    VLN_LOG(VLN_DBG, "Number of targets:%zu", targets.size());
 }
 
 PortStatistics* FCoEPort::getPortStatistics() {

@@ -17,6 +17,8 @@ public:
     HBA_Adapter(const HBA_Adapter&) = delete;
     HBA_Adapter& operator=(const HBA_Adapter&) = delete;
 
+    HBA_HANDLE handle() const { return m_handle; }
+
     // The record is zeroed before each attempt. The status is that of the last one.
     HBA_STATUS getAttributes(HBA_ADAPTERATTRIBUTES& attributes);
     HBA_STATUS getPortAttributes(uint32 portIndex, HBA_PORTATTRIBUTES& attributes);

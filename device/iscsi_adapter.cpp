@@ -33,6 +33,11 @@ iSCSIAdapter::~iSCSIAdapter() noexcept(false) {
     releaseOwned(ADAPTER_TEXTS);
 }
 
+void iSCSIAdapter::rescanTargets() {
+    VLN_LOG(VLN_DBG, "iSCSIAdapter::rescanTargets");
+    rescanPorts();
+}
+
 iSCSIPort::iSCSIPort(Adapter& owner, uint32 index, const HBAIdentifier& hbaIdentifier,
                      const LocalHBAInfoV4& localHBAInfo)
     : Port(owner, index) {
@@ -44,6 +49,12 @@ iSCSIPort::iSCSIPort(Adapter& owner, uint32 index, const HBAIdentifier& hbaIdent
 
 iSCSIPort::~iSCSIPort() noexcept(false) {
     releaseOwned(PORT_TEXTS);
+}
+
+// The targets of an iSCSI port are no part of the model: the iSCSI operations ask for them.
+void iSCSIPort::rescanTargets(Adapter&) {
+    VLN_LOG(VLN_DBG, "iSCSI::rescanTargets");
+    VLN_LOG(VLN_DBG, "Nothing to do...");
 }
 
 PortStatistics* iSCSIPort::getPortStatistics() {

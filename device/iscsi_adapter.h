@@ -12,6 +12,7 @@ public:
                  const LocalHBAInfoV4& localHBAInfo);
     ~iSCSIAdapter() noexcept(false) override;
 
+    void rescanTargets() override;
     // The adapter's name in the HBA API, by which it is opened there.
     const std::string& getHbaAdapterName() const { return hbaAdapterName; }
 
@@ -25,6 +26,7 @@ public:
               const LocalHBAInfoV4& localHBAInfo);
     ~iSCSIPort() noexcept(false) override;
 
+    void rescanTargets(Adapter& owner) override;
     PortStatistics* getPortStatistics() override;
     const std::string& getNodeName() const { return nodeName; }
 

@@ -26,6 +26,11 @@ NICAdapter::~NICAdapter() noexcept(false) {
     releaseOwned(ADAPTER_TEXTS);
 }
 
+void NICAdapter::rescanTargets() {
+    VLN_LOG(VLN_DBG, "NICAdapter::rescanTargets");
+    VLN_LOG(VLN_DBG, "Target Scanning for NICAdapter not supported");
+}
+
 NICPort::NICPort(Adapter& owner, uint32 index, const HBAIdentifier& hbaIdentifier,
                  const LocalHBAInfoV4& localHBAInfo)
     : Port(owner, index) {
@@ -36,6 +41,11 @@ NICPort::NICPort(Adapter& owner, uint32 index, const HBAIdentifier& hbaIdentifie
 
 NICPort::~NICPort() noexcept(false) {
     releaseOwned(PORT_TEXTS);
+}
+
+void NICPort::rescanTargets(Adapter&) {
+    VLN_LOG(VLN_DBG, "NICPort::rescanTargets");
+    VLN_LOG(VLN_DBG, "Nothing to do...");
 }
 
 } // namespace cimple

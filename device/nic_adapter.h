@@ -11,6 +11,8 @@ public:
     NICAdapter(const std::string& name, uint32 number, const HBAIdentifier& hbaIdentifier,
                const LocalHBAInfoV4& localHBAInfo);
     ~NICAdapter() noexcept(false) override;
+
+    void rescanTargets() override;
 };
 
 class NICPort : public Port {
@@ -19,6 +21,7 @@ public:
             const LocalHBAInfoV4& localHBAInfo);
     ~NICPort() noexcept(false) override;
 
+    void rescanTargets(Adapter& owner) override;
     // Always null: Ethernet counters come from the Ethernet statistics.
     PortStatistics* getPortStatistics() override { return statistics.get(); }
 };

@@ -18,6 +18,7 @@
 namespace cimple {
 
 class Adapter;
+class Target_Mapping;
 
 using Target_List = std::vector<std::unique_ptr<Target>>;
 
@@ -33,6 +34,9 @@ public:
     virtual Target_List& getTargets() { return targets; }
     virtual Target* getTarget(uint32 index); // throws std::exception beyond the end
     virtual uint32 getTargetCount() { return static_cast<uint32>(targets.size()); }
+    // Finds anew what the port sees in the SAN; `owner` is its adapter. Throws std::exception if
+    // the adapter cannot be opened: then the port has no targets.
+    virtual void rescanTargets(Adapter& owner) = 0;
 
     const std::string& getPortName() const { return portName; } // 16 upper-case digits
     uint32 getPortIndex() const { return portIndex; }
@@ -41,6 +45,12 @@ protected:
     Port(Adapter& owner, uint32 index) : portIndex(index), adapter(&owner) {}
     Port(const Port&) = delete;
     Port& operator=(const Port&) = delete;
+
+    // Deletes the targets; a failure is logged and passed over.
+    void dropTargets() noexcept;
+
+    // Makes a target of each unit of the mapping. A unit that fails is logged and left out.
+    void makeTargets(Adapter& owner, const Target_Mapping& mapping);
 
     // Deletes the attributes and the statistics; a failure is logged and passed over.
     void releaseOwned(const Cleanup_Texts& texts) noexcept;

@@ -82,9 +82,11 @@ void ClassRepository::fill(Class& target, const mof::Schema_Class& source) {
                          find(declaration.target)};
     };
     target.is_association = source.is_association;
+    target.text = source.declaration->text;
     for (const mof::Schema_Feature& feature : source.features) {
         if (feature.kind() == mof::Feature_Kind::method) {
-            Method method{feature.name(), slot(*feature.feature), {}};
+            Method method{feature.name(), slot(*feature.feature),
+                          mof::is_true(feature.feature->qualifiers, "Static"), {}};
             for (const mof::Parameter& parameter : feature.feature->parameters)
                 method.parameters.push_back(
                     {slot(parameter), parameter.name, parameter.is_in(), parameter.is_out()});

@@ -40,6 +40,7 @@ struct Parameter : Slot_Type {
 struct Method {
     std::string name;
     Slot_Type result;
+    bool is_static = false;
     std::vector<Parameter> parameters;
     const Parameter* find(std::string_view name) const;
 };
@@ -50,6 +51,7 @@ struct Class {
     std::vector<Property> properties; // inherited ones first; references are among them
     std::vector<Method> methods;
     std::vector<std::size_t> keys; // indices of properties
+    std::string text;              // the declaration in MOF; empty for a class of the platform file
     bool is_association = false;
 
     static constexpr std::size_t npos = static_cast<std::size_t>(-1);

@@ -23,7 +23,7 @@ public:
     Counting_Iterator(const char* at, int* line) : _at(at), _line(line) {}
     reference operator*() const { return *_at; }
     Counting_Iterator& operator++() {
-        if (*_line > 0 && _after_break)
+        if (_after_break)
             ++*_line;
         _after_break = *_at == '\n';
         ++_at;

@@ -84,7 +84,7 @@ struct Statistics {
     std::size_t calls = 0;           // into the module
     std::size_t up_calls = 0;        // from it
     std::size_t objects_created = 0; // CMPI objects
-    std::size_t objects_left = 0;    // of these, freed by the end of their call
+    std::size_t objects_left = 0;    // of these, freed by the end of their call, parameters included
 };
 
 class Manager {

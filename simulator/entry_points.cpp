@@ -23,11 +23,10 @@ Any_Function erased(Function* function) {
 struct Row {
     const char* name;
     Any_Function function;
-    bool stub;
 };
 
-#define VLNSIM_ROW_MODEL(function) {#function, erased(&library::function), false},
-#define VLNSIM_ROW_STUB(function) {#function, erased(&not_supported<Entry::function>), true},
+#define VLNSIM_ROW_MODEL(function) {#function, erased(&library::function)},
+#define VLNSIM_ROW_STUB(function) {#function, erased(&not_supported<Entry::function>)},
 #define VLNSIM_A(name, model) VLNSIM_ROW_##model(AX_##name)
 #define VLNSIM_B(name, model) VLNSIM_ROW_##model(LAX_##name)
 #define VLNSIM_C(name, model) VLNSIM_ROW_##model(AX_##name)
@@ -49,9 +48,6 @@ const char* entry_name(Entry entry) {
 }
 Any_Function entry_function(Entry entry) {
     return row(entry).function;
-}
-bool is_stub(Entry entry) {
-    return row(entry).stub;
 }
 
 bool is_entry_name(std::string_view function) {

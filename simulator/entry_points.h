@@ -39,8 +39,6 @@ Any_Function entry_function(Entry entry);
 bool is_entry_name(std::string_view function);
 // As above, or the name of a symbol that one of the libraries exports.
 bool is_symbol_name(std::string_view symbol);
-// The functions that only answer "not supported", for the documentation's test.
-bool is_stub(Entry entry);
 
 } // namespace vlnsim
 

@@ -18,13 +18,14 @@ constexpr std::array<const char*, 3> file_names{"liblaxapi.so", "libaxapi.so", "
 std::mutex opened_mutex;
 std::array<void*, 3> opened{};
 
-std::string own_folder() {
+// Below the folder of this library; with a slash.
+std::string faces_folder() {
     Dl_info info{};
     if (!dladdr(reinterpret_cast<void*>(&vlnsim_open_libraries), &info) || !info.dli_fname)
         return "";
     const std::string path = info.dli_fname;
     const auto slash = path.rfind('/');
-    return slash == std::string::npos ? "" : path.substr(0, slash + 1);
+    return (slash == std::string::npos ? "" : path.substr(0, slash + 1)) + "libraries/";
 }
 
 bool contains(const std::vector<std::string>& list, std::string_view name) {
@@ -48,7 +49,7 @@ int vlnsim_library_present(enum vlnsim_library library) {
 }
 
 int vlnsim_open_libraries(char* error, size_t size) {
-    const std::string folder = own_folder();
+    const std::string folder = faces_folder();
     std::lock_guard lock(opened_mutex);
     for (std::size_t i = 0; i < file_names.size(); ++i) {
         if (opened[i] || !vlnsim_library_present(static_cast<vlnsim_library>(i)))

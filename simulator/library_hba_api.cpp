@@ -31,6 +31,19 @@ Function* function_of(Call& call, HBA_HANDLE handle) {
     return function;
 }
 
+// A handle that was not in use for long, so that a stale one is found out. Handles of a vendor
+// library have 16 bits: the common library keeps its own number in the others.
+HBA_HANDLE free_handle(Simulator& simulator) {
+    constexpr HBA_HANDLE last = 0xFFFF;
+    for (HBA_HANDLE tries = 0; tries < last; ++tries) {
+        const HBA_HANDLE handle = simulator.next_handle;
+        simulator.next_handle = handle == last ? 1 : handle + 1;
+        if (!simulator.handles.count(handle))
+            return handle;
+    }
+    return HBA_HANDLE_INVALID;
+}
+
 std::string text_of(const Attribute_Map& map, std::uint16_t identifier) {
     const auto it = map.find(identifier);
     return it == map.end() ? "" : it->second.text();
@@ -235,8 +248,9 @@ HBA_HANDLE HBA_OpenAdapter(char* adaptername) {
         [&](Call& call) -> HBA_HANDLE {
             if (call.null(adaptername, "adaptername") || !call.sim.find_hba_adapter(adaptername))
                 return HBA_HANDLE_INVALID;
-            const HBA_HANDLE handle = call.sim.next_handle++;
-            call.sim.handles[handle] = adaptername;
+            const HBA_HANDLE handle = free_handle(call.sim);
+            if (handle != HBA_HANDLE_INVALID)
+                call.sim.handles[handle] = adaptername;
             return handle;
         },
         static_cast<const char*>(adaptername));

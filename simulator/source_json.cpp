@@ -39,9 +39,6 @@ public:
     friend bool operator==(const Counting_Iterator& a, const Counting_Iterator& b) {
         return a._at == b._at;
     }
-    friend bool operator!=(const Counting_Iterator& a, const Counting_Iterator& b) {
-        return a._at != b._at;
-    }
 
 private:
     const char* _at;
@@ -119,7 +116,7 @@ private:
             Value& parent = *_open.back();
             if (parent.kind == Value::Kind::object) {
                 path = parent.path.empty() ? _key : parent.path + "." + _key;
-                value = &parent.members.emplace_back(_key, Value{}).second;
+                value = &parent.members.emplace_back(Member{_key, {}}).second;
             } else {
                 path = parent.path + "[" + std::to_string(parent.items.size()) + "]";
                 value = &parent.items.emplace_back();
@@ -189,11 +186,11 @@ Value merged(const Value& base, const Value& over) {
     result.members.clear();
     for (const auto& [name, value] : base.members) {
         const Value* above = over.find(name);
-        result.members.emplace_back(name, above ? merged(value, *above) : value);
+        result.members.push_back({name, above ? merged(value, *above) : value});
     }
     for (const auto& [name, value] : over.members)
         if (!base.find(name))
-            result.members.emplace_back(name, value);
+            result.members.push_back({name, value});
     return result;
 }
 

@@ -15,8 +15,7 @@
 
 namespace vlnsim {
 
-struct Value;
-using Member = std::pair<std::string, Value>;
+struct Member;
 
 struct Value {
     enum class Kind { null, boolean, number, real, text, list, object };
@@ -35,6 +34,11 @@ struct Value {
     const Value* find(std::string_view name) const;
     [[noreturn]] void
     fail(const std::string& what) const; // throws a Scenario_Error about this place
+};
+
+struct Member {
+    std::string first; // the name
+    Value second;
 };
 
 // "file:line: path: what is wrong"; the path is left out for the top of the file.

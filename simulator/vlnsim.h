@@ -2,12 +2,12 @@
  *
  * libvlnsim.so holds one simulated host per process: its adapters, the state that the libraries
  * change, a script of faults, the counts and records of calls, and a clock. liblaxapi.so,
- * libaxapi.so and libHBAAPI.so.2 beside it are the faces that the provider sees; they contain
- * nothing of their own.
+ * libaxapi.so and libHBAAPI.so.2, in the folder "libraries" beside it, are the faces that the
+ * provider sees; they contain nothing of their own.
  *
  * In process: load a scenario, call vlnsim_open_libraries(), then load the provider: its dlopen()
  * of a bare file name is satisfied by a library of that SONAME which is loaded already. In a child
- * process: put the folder on the library path and name a scenario in the environment variable
+ * process: put that folder on the library path and name a scenario in the environment variable
  * VLNSIM_SCENARIO; it is read at the first use of a library, unless a scenario was loaded before.
  *
  * Every function may be called by any thread at any time. Texts are UTF-8 and NUL-terminated.
@@ -62,8 +62,8 @@ enum vlnsim_library { VLNSIM_LOCAL = 0, VLNSIM_FALLBACK = 1, VLNSIM_HBA = 2 };
 /* Whether the scenario says that the host has the library. */
 VLNSIM_API int vlnsim_library_present(enum vlnsim_library library);
 
-/* Opens those libraries that the scenario says the host has, from the folder of libvlnsim.so, and
- * keeps them open. Returns 0, or 1 with dlopen()'s text in error. */
+/* Opens those libraries that the scenario says the host has, from the folder "libraries" beside
+ * libvlnsim.so, and keeps them open. Returns 0, or 1 with dlopen()'s text in error. */
 VLNSIM_API int vlnsim_open_libraries(char* error, size_t size);
 
 /* Closes what vlnsim_open_libraries opened. */

@@ -1,4 +1,5 @@
-// The module for simulation takes the simulator's clock, so that a test moves time instead of waiting.
+// The module for simulation takes the simulator's clock, so that a test moves time instead of
+// waiting.
 #include "cimple/thread.h"
 #include "simulator/vlnsim.h"
 

@@ -63,8 +63,9 @@ TEST_F(Association_Test, RolesAndClassesNarrowTheMatch) {
         const char* result_role;
         std::size_t expected;
     } cases[] = {
-        {"", "", "", 2},          {"test_base", "left", "RIGHT", 2}, {"Test_Leaf", "", "", 0},
-        {"", "Right", "", 0},     {"", "", "Left", 0},               {"", "NoSuch", "", 0},
+        {"", "", "", 2},          {"test_base", "left", "RIGHT", 2},
+        {"Test_Leaf", "", "", 0}, {"", "Right", "", 0},
+        {"", "", "Left", 0},      {"", "NoSuch", "", 0},
         {"No_Class", "", "", 0},  {nullptr, nullptr, "Right", 2},
     };
     for (const auto& row : cases) {
@@ -140,11 +141,11 @@ TEST_F(Association_Test, EveryStatusHasItsCode) {
         sint32 enumerate; // what the enumeration of the fallback answers
         int rc;
     } cases[] = {
-        {"names", 0, 0, 0},         {"names", 110, 0, 1},       {"names", 112, 0, 1},
-        {"names", 111, 0, 0},       {"names", 111, 70, 1},      {"names", 111, 71, 2},
-        {"names", 99, 70, 1},       {"references", 120, 0, 1},  {"references", 122, 0, 2},
-        {"references", 121, 0, 0},  {"references", 121, 70, 1}, {"references", 121, 71, 2},
-        {"associators", 170, 0, 1}, {"associators", 172, 0, 2}, {"associators", 171, 70, 1},
+        {"names", 0, 0, 0},          {"names", 110, 0, 1},       {"names", 112, 0, 1},
+        {"names", 111, 0, 0},        {"names", 111, 70, 1},      {"names", 111, 71, 2},
+        {"names", 99, 70, 1},        {"references", 120, 0, 1},  {"references", 122, 0, 2},
+        {"references", 121, 0, 0},   {"references", 121, 70, 1}, {"references", 121, 71, 2},
+        {"associators", 170, 0, 1},  {"associators", 172, 0, 2}, {"associators", 171, 70, 1},
         {"associators", 171, 71, 2}, {"associators", 99, 0, 0},
     };
     for (const auto& row : cases) {
@@ -192,9 +193,8 @@ TEST_F(Association_Test, TheProcedureClosesTheStreamOfRealAnswers) {
         args[1] = reinterpret_cast<Provider_Word>(source.get());
         args[at] = reinterpret_cast<Provider_Word>(handler);
         closings = 0;
-        const sint32 status =
-            link_registration.proc(nullptr, operation, args[0], args[1], args[2], args[3], args[4],
-                                   args[5], args[6], args[7]);
+        const sint32 status = link_registration.proc(nullptr, operation, args[0], args[1], args[2],
+                                                     args[3], args[4], args[5], args[6], args[7]);
         link_registration.proc(nullptr, OP_DESTROY_PROVIDER, args[0], 0, 0, 0, 0, 0, 0, 0);
         return status;
     };
@@ -269,16 +269,16 @@ TEST_F(Method_Test, Refusals) {
 TEST_F(Method_Test, AMethodInstanceOfAnotherNameIsNotDispatched) {
     const Ref<Instance> self(create(&Test_Service::static_meta_class));
     const Ref<Instance> other(create(&Test_Base::static_meta_class));
-    EXPECT_EQ(service_registration.proc(nullptr, OP_INVOKE_METHOD, 0,
-                                        reinterpret_cast<Provider_Word>(self.get()),
-                                        reinterpret_cast<Provider_Word>(other.get()), 0, 0, 0, 0, 0),
+    EXPECT_EQ(service_registration.proc(
+                  nullptr, OP_INVOKE_METHOD, 0, reinterpret_cast<Provider_Word>(self.get()),
+                  reinterpret_cast<Provider_Word>(other.get()), 0, 0, 0, 0, 0),
               -1);
 }
 
 // ---- Indications ----
 
 TEST_F(Cmpi_Test, IndicationsGoToEveryWatchedNamespace) {
-    auto* mi = create<CMPIIndicationMI>(indication_registration, 'N');
+    auto* mi = interface<CMPIIndicationMI>(indication_registration, 'N');
     const auto activate = [&](const char* name_space) {
         mi->ft->activateFilter(mi, context, nullptr, "", broker.path(name_space, "X"), true);
     };

@@ -19,10 +19,9 @@ protected:
     template <class C>
     Ref<C> from_path(fake::Members keys, const char* name_space = "root/test") {
         Instance* out = nullptr;
-        EXPECT_EQ(make_cimple_reference({&broker.broker, &test_repository, name_space},
-                                        &C::static_meta_class,
-                                        broker.path(name_space, C::static_meta_class.name, keys),
-                                        out),
+        EXPECT_EQ(make_cimple_reference(
+                      {&broker.broker, &test_repository, name_space}, &C::static_meta_class,
+                      broker.path(name_space, C::static_meta_class.name, keys), out),
                   0);
         return out;
     }
@@ -37,8 +36,8 @@ protected:
     }
     fake::Data_Ref to_instance(const Instance* instance, const char** properties = nullptr) {
         CMPIInstance* out = nullptr;
-        const int rc = make_CMPI_instance(&broker.broker, instance, "root/test", nullptr,
-                                          properties, out);
+        const int rc =
+            make_CMPI_instance(&broker.broker, instance, "root/test", nullptr, properties, out);
         return rc == 0 ? std::make_shared<fake::Data>(fake::Broker::data(out)) : nullptr;
     }
 
@@ -57,13 +56,22 @@ struct One : Instance {
 template <class T>
 struct One_Class {
     const Meta_Property value{{{0}, FLAG_PROPERTY, "Value", nullptr, 0},
-                              Type_Of<T>::code, 0, offsetof(One<T>, Value), nullptr};
+                              Type_Of<T>::code,
+                              0,
+                              offsetof(One<T>, Value),
+                              nullptr};
     const Meta_Property values{{{0}, FLAG_PROPERTY, "Values", nullptr, 0},
-                               Type_Of<T>::code, -1, offsetof(One<T>, Values), nullptr};
+                               Type_Of<T>::code,
+                               -1,
+                               offsetof(One<T>, Values),
+                               nullptr};
     const Meta_Feature* const features[2] = {&value, &values};
     const uint8 locals[2] = {1, 1};
     const Meta_Class meta_class{{{{0}, FLAG_CLASS, "One", nullptr, 0}, features, 2, sizeof(One<T>)},
-                                locals, nullptr, 0, &test_repository};
+                                locals,
+                                nullptr,
+                                0,
+                                &test_repository};
 };
 
 template <class T>
@@ -89,10 +97,9 @@ using All_Types = testing::Types<boolean, uint8, sint8, uint16, sint16, uint32, 
                                  sint64, real32, real64, char16, String, Datetime>;
 TYPED_TEST_SUITE(Every_Type, All_Types);
 
-constexpr CMPIType CMPI_TYPES[] = {CMPI_boolean, CMPI_uint8,  CMPI_sint8,  CMPI_uint16,
-                                   CMPI_sint16,  CMPI_uint32, CMPI_sint32, CMPI_uint64,
-                                   CMPI_sint64,  CMPI_real32, CMPI_real64, CMPI_char16,
-                                   CMPI_string,  CMPI_dateTime};
+constexpr CMPIType CMPI_TYPES[] = {
+    CMPI_boolean, CMPI_uint8,  CMPI_sint8,  CMPI_uint16, CMPI_sint16, CMPI_uint32, CMPI_sint32,
+    CMPI_uint64,  CMPI_sint64, CMPI_real32, CMPI_real64, CMPI_char16, CMPI_string, CMPI_dateTime};
 
 TYPED_TEST(Every_Type, GoesThereAndBack) {
     const One_Class<TypeParam> meta;
@@ -220,9 +227,8 @@ TEST_F(Conversion_Test, KeysAreNarrowedByTruncation) {
 }
 
 TEST_F(Conversion_Test, PathGivesKeysOnly) {
-    const auto sub = from_path<Test_Sub>({{"id", fake::text("x")},
-                                          {"Caption", fake::text("no key")},
-                                          {"Nonsense", fake::text("")}});
+    const auto sub = from_path<Test_Sub>(
+        {{"id", fake::text("x")}, {"Caption", fake::text("no key")}, {"Nonsense", fake::text("")}});
     EXPECT_STREQ(sub->Id.value.c_str(), "x") << "names compare without regard to case";
     EXPECT_TRUE(sub->Slot.is_null());
     EXPECT_TRUE(sub->Caption.is_null());
@@ -239,8 +245,8 @@ TEST_F(Conversion_Test, ABadMemberFailsAlone) {
         {"Str", null_string},
         {"Date", fake::object(CMPI_dateTime, fake::path_data("", "20261121"))},
         {"Installed", fake::object(CMPI_dateTime, nullptr)},
-        {"Numbers", fake::array(CMPI_uint32, {fake::number(CMPI_uint32, 1),
-                                              fake::null(CMPI_uint32)})},
+        {"Numbers",
+         fake::array(CMPI_uint32, {fake::number(CMPI_uint32, 1), fake::null(CMPI_uint32)})},
         {"Names", fake::array(CMPI_string, {fake::number(CMPI_uint32, 1)})},
         {"Dates", fake::object(CMPI_dateTimeA, nullptr)},
         {"S8", {CMPI_sint8, CMPI_badValue, {}, nullptr}},
@@ -261,7 +267,10 @@ TEST_F(Conversion_Test, ABadMemberFailsAlone) {
 template <class T>
 Property<T> parse_argument(fake::Broker& broker, const char* text) {
     const Meta_Property value{{{0}, FLAG_PROPERTY | FLAG_IN, "Value", nullptr, 0},
-                              Type_Of<T>::code, 0, offsetof(One<T>, Value), nullptr};
+                              Type_Of<T>::code,
+                              0,
+                              offsetof(One<T>, Value),
+                              nullptr};
     const Meta_Feature* const features[] = {&value};
     const Meta_Method method{{{{0}, FLAG_METHOD, "Do", nullptr, 0}, features, 1, sizeof(One<T>)},
                              TYPE_UINT32};
@@ -339,8 +348,8 @@ TEST_F(Conversion_Test, PropertyListComesWithTheKeys) {
     EXPECT_FALSE(sent->find("Caption"));
 }
 
-// Each function of the broker fails, always and at each of its calls: nothing is lost but what could
-// not be converted, and nothing crashes.
+// Each function of the broker fails, always and at each of its calls: nothing is lost but what
+// could not be converted, and nothing crashes.
 TEST_F(Conversion_Test, FailuresOfTheBroker) {
     const Ref<Test_Holder> holder(create_null<Test_Holder>());
     holder->Id.set("h");
@@ -362,9 +371,9 @@ TEST_F(Conversion_Test, FailuresOfTheBroker) {
     }
     broker.failures.clear();
     const auto path = fake::path_data("", "Test_Holder");
-    for (const char* function : {"getPropertyAt", "getPropertyCount", "getKeyAt", "getKeyCount",
-                                 "getCharPtr", "getClassName", "getNameSpace", "getObjectPath",
-                                 "getSize", "getElementAt"}) {
+    for (const char* function :
+         {"getPropertyAt", "getPropertyCount", "getKeyAt", "getKeyCount", "getCharPtr",
+          "getClassName", "getNameSpace", "getObjectPath", "getSize", "getElementAt"}) {
         for (int n = 0; n < 12; n++) {
             broker.failures = {{function, n}};
             Instance* out = nullptr;

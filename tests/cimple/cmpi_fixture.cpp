@@ -55,8 +55,8 @@ struct Scripted_Provider {
         script.instance.reset(clone(instance));
         return script.run(OP_MODIFY_INSTANCE);
     }
-    sint32 enum_associator_names(const Instance* source, const char* result_class,
-                                 const char* role, const char* result_role,
+    sint32 enum_associator_names(const Instance* source, const char* result_class, const char* role,
+                                 const char* result_role,
                                  const Enum_Associator_Names_Handler& handler) {
         script.instance.reset(clone(source));
         script.role = std::string(result_class) + "/" + role + "/" + result_role;
@@ -131,20 +131,21 @@ const Registration indication_registration = {"module", "Indication_Provider", i
 
 Cmpi_Test::~Cmpi_Test() {
     script = {};
-    for (auto& [registration, block] : blocks)
+    for (auto& [registration, block] : blocks) {
+        CMPIInstanceMI mi = {&block, &block.instance_ft};
         while (block.adapter)
-            block.instance_ft.cleanup(&block.instance_mi, context, true);
+            mi.ft->cleanup(&mi, context, true);
+    }
     broker.end_call();
     EXPECT_EQ(broker.released_parameters, 0);
 }
 
-void* Cmpi_Test::create_any(const Registration& registration, char letter, const char* name) {
+void* Cmpi_Test::interface_any(const Registration& registration, char letter, const char* name) {
     Provider_Static_Data& block = blocks[&registration];
     void* interface = nullptr;
     EXPECT_EQ(cimple_cmpi_adapter(&block, &registration, &broker.broker, context, name, letter,
                                   &interface),
               0);
-    block.instance_mi = {&block, &block.instance_ft}; // for the clean-up, whatever the letter
     return interface;
 }
 

@@ -24,9 +24,9 @@ struct Script {
     std::vector<int> operations;           // what was called
     Instance_Proc forward = nullptr;
 
-    Ref<Instance> model;    // clones of what an operation was given
+    Ref<Instance> model; // clones of what an operation was given
     Ref<Instance> instance;
-    std::string role;       // and the texts of an association operation
+    std::string role; // and the texts of an association operation
     Indication_Proc indication_proc = nullptr;
     void* indication_data = nullptr;
 
@@ -36,10 +36,10 @@ struct Script {
 };
 extern Script script;
 
-extern const Registration base_registration;        // Test_Base, instance_proc
-extern const Registration link_registration;        // Test_Link, association_proc
-extern const Registration service_registration;     // Test_Service, method_proc
-extern const Registration indication_registration;  // Test_Base with operations 11 and 12
+extern const Registration base_registration;       // Test_Base, instance_proc
+extern const Registration link_registration;       // Test_Link, association_proc
+extern const Registration service_registration;    // Test_Service, method_proc
+extern const Registration indication_registration; // Test_Base with operations 11 and 12
 
 class Cmpi_Test : public testing::Test {
 protected:
@@ -48,14 +48,14 @@ protected:
     ~Cmpi_Test() override;
 
     template <class Interface>
-    Interface* create(const Registration& registration, char letter, const char* name = "Test") {
-        return static_cast<Interface*>(create_any(registration, letter, name));
+    Interface* interface(const Registration& registration, char letter, const char* name = "Test") {
+        return static_cast<Interface*>(interface_any(registration, letter, name));
     }
-    CMPIInstanceMI* instance_mi() { return create<CMPIInstanceMI>(base_registration, 'I'); }
+    CMPIInstanceMI* instance_mi() { return interface<CMPIInstanceMI>(base_registration, 'I'); }
     CMPIAssociationMI* association_mi(const Registration& registration = link_registration) {
-        return create<CMPIAssociationMI>(registration, 'A');
+        return interface<CMPIAssociationMI>(registration, 'A');
     }
-    CMPIMethodMI* method_mi() { return create<CMPIMethodMI>(service_registration, 'M'); }
+    CMPIMethodMI* method_mi() { return interface<CMPIMethodMI>(service_registration, 'M'); }
 
     CMPIObjectPath* base_path(const char* id = nullptr, unsigned slot = 0);
     fake::Data_Ref base_data(const char* id, unsigned slot);
@@ -66,7 +66,7 @@ protected:
     std::map<const Registration*, Provider_Static_Data> blocks;
 
 private:
-    void* create_any(const Registration& registration, char letter, const char* name);
+    void* interface_any(const Registration& registration, char letter, const char* name);
 };
 
 } // namespace cimple

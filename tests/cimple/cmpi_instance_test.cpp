@@ -30,20 +30,20 @@ TEST_F(Cmpi_Test, FactoryFillsTheTables) {
     EXPECT_EQ(block.adapter->meta_class, &Test_Base::static_meta_class);
     EXPECT_EQ(Thread_Context::top(), nullptr);
 
-    EXPECT_EQ(create<void>(base_registration, 'X'), nullptr);
-    EXPECT_EQ(create<void>(base_registration, 'M'), &block.method_mi);
+    EXPECT_EQ(interface<void>(base_registration, 'X'), nullptr);
+    EXPECT_EQ(interface<void>(base_registration, 'M'), &block.method_mi);
     EXPECT_EQ(block.adapter->load_count, 3u);
     EXPECT_EQ(script.count(OP_LOAD), 1);
 }
 
 TEST_F(Cmpi_Test, LongNamesAreCut) {
-    create<void>(base_registration, 'I', std::string(300, 'n').c_str());
+    interface<void>(base_registration, 'I', std::string(300, 'n').c_str());
     EXPECT_EQ(std::strlen(blocks[&base_registration].association_name), 255u);
 }
 
 TEST_F(Cmpi_Test, CleanupCountsDownAndLoadsAnew) {
     auto* mi = instance_mi();
-    auto* method = create<CMPIMethodMI>(base_registration, 'M');
+    auto* method = interface<CMPIMethodMI>(base_registration, 'M');
     Provider_Static_Data& block = blocks[&base_registration];
     EXPECT_EQ(method->ft->cleanup(method, context, false).rc, CMPI_RC_OK);
     EXPECT_EQ(script.count(OP_UNLOAD), 0);
@@ -80,17 +80,17 @@ TEST_F(Cmpi_Test, AFailingLoadIsNotLookedAtButAnExceptionIs) {
         if (operation == OP_LOAD)
             throw std::bad_alloc();
     };
-    EXPECT_EQ(create<void>(link_registration, 'A'), nullptr);
+    EXPECT_EQ(interface<void>(link_registration, 'A'), nullptr);
     EXPECT_EQ(blocks[&link_registration].adapter, nullptr);
     script.on = nullptr;
-    EXPECT_NE(create<void>(link_registration, 'A'), nullptr);
+    EXPECT_NE(interface<void>(link_registration, 'A'), nullptr);
 }
 
 TEST_F(Cmpi_Test, FactoriesOnManyThreadsLoadOnce) {
     std::atomic<int> loading{0};
     script.on = [&](int) {
         loading++;
-        create<void>(base_registration, 'M'); // the loading thread itself does not wait
+        interface<void>(base_registration, 'M'); // the loading thread itself does not wait
         std::this_thread::yield();
         loading--;
     };
@@ -98,7 +98,7 @@ TEST_F(Cmpi_Test, FactoriesOnManyThreadsLoadOnce) {
     std::vector<std::thread> threads;
     for (char letter : {'I', 'M', 'A', 'N', 'I', 'M'})
         threads.emplace_back([&, letter] {
-            EXPECT_NE(create<void>(base_registration, letter), nullptr);
+            EXPECT_NE(interface<void>(base_registration, letter), nullptr);
             EXPECT_EQ(loading, 0) << "nobody gets an interface before the load has ended";
         });
     for (std::thread& thread : threads)
@@ -326,10 +326,10 @@ TEST_F(Cmpi_Test, GetInstanceFallsBackOnEnumeration) {
 
 TEST_F(Cmpi_Test, ModifyHandsOverAModelOfWhatIsToChange) {
     auto* mi = instance_mi();
-    CMPIInstance* source = broker.instance(fake::instance_data(
-        base_data("a", 1), {{"Id", fake::text("a")},
-                            {"Slot", fake::number(CMPI_uint32, 1)},
-                            {"Caption", fake::text("new")}}));
+    CMPIInstance* source = broker.instance(
+        fake::instance_data(base_data("a", 1), {{"Id", fake::text("a")},
+                                                {"Slot", fake::number(CMPI_uint32, 1)},
+                                                {"Caption", fake::text("new")}}));
     const char* properties[] = {"caption", nullptr};
     CMPIObjectPath* path = broker.path(
         "root/test", "Test_Sub", {{"Id", fake::text("a")}, {"Slot", fake::number(CMPI_uint64, 1)}});
@@ -342,18 +342,17 @@ TEST_F(Cmpi_Test, ModifyHandsOverAModelOfWhatIsToChange) {
 
 // The object manager may send the instances of a base class: the provider sees its own class.
 TEST_F(Cmpi_Test, ABaseClassReachesTheProviderAsItsOwn) {
-    using Sub_Link_Operations = Provider_Operations;
-    Sub_Link_Operations operations{};
+    Provider_Operations operations{};
     operations.meta_class = &Test_Sub::static_meta_class;
     operations.delete_instance = [](void*, const Instance* keys) -> sint32 {
         const auto* sub = cast<Test_Sub>(keys);
         return sub && sub->Slot.value == 7 && sub->State.is_null() ? 0 : -2;
     };
     const Ref<Instance> base(make_base("x", 7));
-    EXPECT_EQ(run_provider_operation(operations, OP_DELETE_INSTANCE,
-                                     {0, reinterpret_cast<Provider_Word>(base.get()), 0, 0, 0, 0, 0,
-                                      0}),
-              0);
+    EXPECT_EQ(
+        run_provider_operation(operations, OP_DELETE_INSTANCE,
+                               {0, reinterpret_cast<Provider_Word>(base.get()), 0, 0, 0, 0, 0, 0}),
+        0);
     for (int operation : {10, 11, 12, 14, 15, 16, 17, -5})
         EXPECT_EQ(run_provider_operation(operations, operation, {}), -1) << operation;
 }

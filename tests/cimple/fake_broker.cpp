@@ -103,8 +103,8 @@ CMPIData load(Broker& broker, const Value& value) {
     loaded.state = value.state;
     loaded.value = value.scalar;
     if (value.object)
-        loaded.value.inst = reinterpret_cast<CMPIInstance*>(
-            broker.make(table_for(value.type), value.object));
+        loaded.value.inst =
+            reinterpret_cast<CMPIInstance*>(broker.make(table_for(value.type), value.object));
     return loaded;
 }
 
@@ -378,7 +378,8 @@ Object* make_new(const CMPIBroker* broker, const char* function, const void* tab
 CMPIStatus upcall(const CMPIBroker* broker, const std::string& name, const CMPIObjectPath* path) {
     const std::lock_guard guard(the_mutex);
     Broker& fake = self(broker);
-    fake.upcalls.push_back(path ? name + " " + data(path).name_space + ":" + data(path).text : name);
+    fake.upcalls.push_back(path ? name + " " + data(path).name_space + ":" + data(path).text
+                                : name);
     return {fake.upcall_status, nullptr};
 }
 

@@ -1,5 +1,5 @@
-// A small object manager for the tests of the binding: objects in memory that are counted, calls that
-// are recorded, and functions that fail on demand. It checks nothing about classes.
+// A small object manager for the tests of the binding: objects in memory that are counted, calls
+// that are recorded, and functions that fail on demand. It checks nothing about classes.
 #ifndef TESTS_CIMPLE_FAKE_BROKER_H
 #define TESTS_CIMPLE_FAKE_BROKER_H
 

@@ -207,10 +207,10 @@ constinit const Meta_Method Test_Service_Run_method::static_meta_class{
     TYPE_UINT32};
 
 Test_Base* make_base(const char* id, uint32 slot) {
-    auto* base = create_null<Test_Base>();
+    Ref<Test_Base> base(create_null<Test_Base>());
     base->Id.set(id);
     base->Slot.set(slot);
-    return base;
+    return base.release();
 }
 
 } // namespace cimple

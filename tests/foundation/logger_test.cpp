@@ -14,7 +14,8 @@ std::vector<std::pair<int, std::string>> system_log;
 } // namespace
 
 // What reaches the system log of the host.
-extern "C" void syslog(int priority, const char* format, ...) {
+extern "C" __attribute__((format(printf, 2, 3))) void syslog(int priority, const char* format,
+                                                             ...) {
     char text[256];
     va_list arguments;
     va_start(arguments, format);

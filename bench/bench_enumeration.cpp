@@ -1,0 +1,108 @@
+// One enumeration of VLNMPCA_EthernetPort, in a function that callgrind can be told to count alone.
+//
+//   bench_enumeration floor|provider|clones|memory COUNT
+//
+// floor: the hand-written provider; provider: the library, its store filled up to COUNT; clones:
+// only the two copies of each instance that the library's locking demands; memory: resident
+// kilobytes after the first enumeration of a fresh process.
+#include "bench/bench_hooks.h"
+#include "host/manager.h"
+#include "simulator/vlnsim.h"
+
+#include <dlfcn.h>
+#include <unistd.h>
+
+#include <cstdio>
+#include <cstdlib>
+#include <cstring>
+#include <filesystem>
+
+namespace {
+
+constexpr const char* CLASS_NAME = "VLNMPCA_EthernetPort";
+
+[[noreturn]] void fail(const std::string& text) {
+    std::fprintf(stderr, "bench_enumeration: %s\n", text.c_str());
+    std::exit(2);
+}
+
+void simulate() {
+    char error[512] = "";
+    char folder[] = "/tmp/vorlan-bench-XXXXXX";
+    if (!mkdtemp(folder))
+        fail("no temporary folder");
+    std::filesystem::create_directories(std::string(folder) + "/etc");
+    vlnsim_use_virtual_clock(1400000000ull * 1000000);
+    vlnsim_set_host_root(folder);
+    if (vlnsim_load_scenario(VLN_SCENARIOS "/two-port-cna.json", error, sizeof error) ||
+        vlnsim_open_libraries(error, sizeof error))
+        fail(error);
+}
+
+template <class Function>
+Function hook(const char* name) {
+    void* module = dlopen(VLN_BENCH_MODULE, RTLD_NOW);
+    void* symbol = module ? dlsym(module, name) : nullptr;
+    if (!symbol)
+        fail(dlerror());
+    return reinterpret_cast<Function>(symbol);
+}
+
+unsigned long resident_kilobytes() {
+    unsigned long size = 0;
+    unsigned long resident = 0;
+    if (std::FILE* file = std::fopen("/proc/self/statm", "r")) {
+        if (std::fscanf(file, "%lu %lu", &size, &resident) != 2)
+            resident = 0;
+        std::fclose(file);
+    }
+    return resident * static_cast<unsigned long>(sysconf(_SC_PAGESIZE)) / 1024;
+}
+
+} // namespace
+
+// The one function whose instructions are counted.
+extern "C" __attribute__((noinline)) std::size_t vln_measured(host::Manager& manager,
+                                                              void (*clones)()) {
+    if (clones) {
+        clones();
+        return 0;
+    }
+    const auto reply = manager.enumerate(CLASS_NAME);
+    return reply.value.size();
+}
+
+int main(int argc, char** argv) {
+    if (argc != 3)
+        fail("usage: bench_enumeration floor|provider|clones|memory COUNT");
+    const std::string mode = argv[1];
+    const auto count = static_cast<unsigned>(std::strtoul(argv[2], nullptr, 10));
+    host::Options options;
+    options.strict = false;
+    host::Manager manager(options);
+    const bool floor = mode == "floor";
+    if (floor)
+        setenv("VLN_FLOOR_INSTANCES", argv[2], 1);
+    else
+        simulate();
+    const unsigned long before = resident_kilobytes();
+    const char* module = floor              ? VLN_FLOOR_MODULE
+                         : mode == "memory" ? VLN_SIMULATED_MODULE
+                                            : VLN_BENCH_MODULE;
+    const host::Status status = manager.load(module);
+    if (!status.ok())
+        fail(status.message);
+    const auto first = manager.enumerate(CLASS_NAME); // what happens once is not counted
+    if (mode == "memory") {
+        std::printf("%lu %lu\n", before, resident_kilobytes());
+        return 0;
+    }
+    if (!floor && hook<decltype(&vln_bench_fill)>("vln_bench_fill")(count) != count)
+        fail("the store could not be filled");
+    const std::size_t seen = vln_measured(
+        manager,
+        mode == "clones" ? hook<decltype(&vln_bench_clones)>("vln_bench_clones") : nullptr);
+    if (mode != "clones" && seen != count)
+        fail("saw " + std::to_string(seen) + " instances");
+    return 0;
+}

@@ -1,0 +1,197 @@
+#include "host/manager.h"
+
+#include "host/core.h"
+#include "host/operations.h"
+
+#include <numeric>
+
+namespace host {
+
+Manager::Manager(Options options) : _core(std::make_shared<Core>(std::move(options))) {}
+
+Manager::~Manager() {
+    close();
+}
+
+Status Manager::load(const std::string& module_path) {
+    const std::string wrong = _core->module.open(module_path, _core->classes);
+    return wrong.empty() ? Status{} : Status{CMPI_RC_ERR_FAILED, wrong};
+}
+
+Status Manager::cleanup(bool terminating) {
+    return _core->module.cleanup(*_core, terminating);
+}
+
+void Manager::close() {
+    if (_core->module.is_open()) {
+        cleanup(true);
+        _core->module.close();
+    }
+    _core->report_leaks();
+}
+
+const Options& Manager::options() const {
+    return _core->options;
+}
+
+const ClassRepository& Manager::classes() const {
+    return _core->classes;
+}
+
+std::vector<const Class*> Manager::provider_classes() const {
+    std::vector<const Class*> served;
+    for (const auto& known : _core->classes.classes())
+        if (_core->module.serves(*known))
+            served.push_back(known.get());
+    return served;
+}
+
+bool Manager::serves(const Class& known) const {
+    return _core->module.serves(known);
+}
+
+Parsed_Path Manager::parse_path(std::string_view text) const {
+    return host::parse_path(_core->classes, text, _core->options.name_space);
+}
+
+Reply<std::vector<Instance>> Manager::enumerate(const std::string& class_name,
+                                                const Property_List& properties,
+                                                const std::string& name_space) {
+    Target target;
+    if (Status status = find_target(*_core, class_name, name_space, target); !status.ok())
+        return {status, {}};
+    return host::enumerate(*_core, target, properties);
+}
+
+Reply<std::vector<ObjectPath>> Manager::enumerate_names(const std::string& class_name,
+                                                        const std::string& name_space) {
+    Target target;
+    if (Status status = find_target(*_core, class_name, name_space, target); !status.ok())
+        return {status, {}};
+    return host::enumerate_names(*_core, target);
+}
+
+namespace {
+
+// Completes the namespace, and finds who is asked.
+Status prepare(Core& core, ObjectPath& path, Target& target) {
+    Status status = find_target(core, path.class_name, path.name_space, target);
+    path.name_space = target.name_space;
+    return status;
+}
+
+} // namespace
+
+Reply<Instance> Manager::get(const ObjectPath& path, const Property_List& properties) {
+    ObjectPath complete = path;
+    Target target;
+    Status status = prepare(*_core, complete, target);
+    if (status.ok())
+        status = check_complete(*_core, complete);
+    if (!status.ok())
+        return {status, {}};
+    return host::get(*_core, target, complete, properties);
+}
+
+Reply<ObjectPath> Manager::create(const Instance& instance) {
+    Instance fitted = instance;
+    Target target;
+    Status status = prepare(*_core, fitted.path, target);
+    if (status.ok())
+        status = check_instance(*_core, fitted, false);
+    if (!status.ok())
+        return {status, {}};
+    return host::create(*_core, target, fitted);
+}
+
+Status Manager::modify(const Instance& instance, const Property_List& properties) {
+    Instance fitted = instance;
+    Target target;
+    Status status = prepare(*_core, fitted.path, target);
+    if (status.ok())
+        status = check_instance(*_core, fitted, true);
+    return status.ok() ? host::modify(*_core, target, fitted, properties) : status;
+}
+
+Status Manager::remove(const ObjectPath& path) {
+    ObjectPath complete = path;
+    Target target;
+    Status status = prepare(*_core, complete, target);
+    if (status.ok())
+        status = check_complete(*_core, complete);
+    return status.ok() ? host::remove(*_core, target, complete) : status;
+}
+
+Reply<std::vector<Instance>> Manager::associators(const ObjectPath& path,
+                                                  const Association_Filter& filter,
+                                                  const Property_List& properties) {
+    return walk(*_core, path, Walk::associators, filter, properties);
+}
+
+Reply<std::vector<ObjectPath>> Manager::associator_names(const ObjectPath& path,
+                                                         const Association_Filter& filter) {
+    return walk_names(*_core, path, Walk::associators, filter);
+}
+
+Reply<std::vector<Instance>> Manager::references(const ObjectPath& path,
+                                                 const Association_Filter& filter,
+                                                 const Property_List& properties) {
+    return walk(*_core, path, Walk::references, {filter.via, "", filter.role, ""}, properties);
+}
+
+Reply<std::vector<ObjectPath>> Manager::reference_names(const ObjectPath& path,
+                                                        const Association_Filter& filter) {
+    return walk_names(*_core, path, Walk::references, {filter.via, "", filter.role, ""});
+}
+
+Reply<Method_Result> Manager::invoke(const ObjectPath& path, const std::string& method,
+                                     const Named_Values& inputs) {
+    ObjectPath complete = path;
+    Named_Values fitted = inputs;
+    Target target;
+    Status status = prepare(*_core, complete, target);
+    if (status.ok())
+        status = check_inputs(*_core, *target.known, method, fitted);
+    if (status.ok() && !(complete.keys.empty() && target.known->find_method(method)->is_static))
+        status = check_complete(*_core, complete);
+    if (!status.ok())
+        return {status, {}};
+    return host::invoke(*_core, target, complete, method, fitted);
+}
+
+std::vector<Fault> Manager::faults() const {
+    return _core->faults.all();
+}
+
+std::size_t Manager::fault_count() const {
+    return _core->faults.count();
+}
+
+void Manager::clear_faults() {
+    _core->faults.clear();
+}
+
+Live_Counts Manager::live_objects() const {
+    return _core->counters.snapshot();
+}
+
+std::size_t Manager::live_object_count() const {
+    const Live_Counts counts = live_objects();
+    return std::accumulate(counts.begin(), counts.end(), std::size_t{0});
+}
+
+Statistics Manager::statistics() const {
+    return {_core->calls, _core->up_calls, _core->counters.created, _core->left};
+}
+
+std::vector<Indication> Manager::indications() const {
+    const std::lock_guard lock(_core->records_mutex);
+    return _core->indications;
+}
+
+std::vector<Log_Message> Manager::log_messages() const {
+    const std::lock_guard lock(_core->records_mutex);
+    return _core->messages;
+}
+
+} // namespace host

@@ -1,0 +1,365 @@
+// The adapter picture of simulated hosts.
+
+#include "agent/host_identity.h"
+#include "derivedObjects/pattern.h"
+#include "device/runtime_loader.h"
+#include "simulator/vlnsim.h"
+#include "tests/agent/agent_fixture.h"
+
+#include <cstdlib>
+
+namespace cimple {
+
+namespace {
+
+class Maps_Test : public Agent_Test {
+protected:
+    void SetUp() override {
+        Agent_Test::SetUp();
+        VLN_Runtime_Loader::setCalls(nullptr); // the simulator's libraries are loaded already
+    }
+    void TearDown() override {
+        Agent_Test::TearDown();
+        vlnsim_close_libraries();
+        EXPECT_EQ(vlnsim_violations(), 0u);
+    }
+    void load(const std::string& functions, const std::string& more = "") {
+        char error[256] = "";
+        const std::string text =
+            R"({"description": "A test", "include": "parts/cna.json", "cards": [
+            {"use": "cna", "ports": 2, )" +
+            more + R"("functions": [)" + functions + "]}]}";
+        const int status = vlnsim_load_scenario_text(text.c_str(), VLN_SCENARIOS "/test.json",
+                                                     error, sizeof error);
+        ASSERT_EQ(status, 0) << error;
+        ASSERT_EQ(vlnsim_open_libraries(error, sizeof error), 0) << error;
+    }
+};
+
+// "type name = value;" of every property that is not null, as the engine prints it.
+std::vector<std::string> lines_of(const Instance* instance) {
+    char* text = nullptr;
+    std::size_t size = 0;
+    std::FILE* stream = open_memstream(&text, &size);
+    print(instance, stream);
+    std::fclose(stream);
+    std::vector<std::string> lines;
+    const std::string all(text, size);
+    std::free(text);
+    for (std::size_t at = 0, end; (end = all.find('\n', at)) != std::string::npos; at = end + 1) {
+        std::string line = all.substr(at, end - at);
+        line.erase(0, line.find_first_not_of(' '));
+        if (line.find(" = ") != std::string::npos && line.find(" = NULL;") == std::string::npos)
+            lines.push_back(line);
+    }
+    return lines;
+}
+
+// The value of a property in that text, empty for null.
+std::string value_of(const Instance* instance, const std::string& property) {
+    for (const std::string& line : lines_of(instance)) {
+        const auto name = line.find(' ') + 1;
+        const auto equals = line.find(" = ");
+        if (line.substr(name, equals - name) == property)
+            return line.substr(equals + 3, line.size() - equals - 4);
+    }
+    return "";
+}
+
+struct Count {
+    Store_Id store;
+    uint32 count;
+};
+
+void expect_counts(ProviderAgent& agent, std::initializer_list<Count> counts) {
+    for (const Count& row : counts)
+        EXPECT_EQ(agent.store(row.store).size(), row.count) << store_table[row.store].name;
+}
+
+} // namespace
+
+TEST_F(Maps_Test, TwoPortsOfOneCard) {
+    load(R"({"use": "nic"}, {"use": "iscsi"}, {"use": "fcoe"})");
+    Loaded_Agent agent;
+    Log_Capture log;
+    EXPECT_EQ(refreshes_started(*agent), 1);
+    expect_counts(*agent, {{STORE_CIM_ComputerSystem, 1},
+                           {STORE_CIM_Chassis, 1},
+                           {STORE_VLNMPCA_ProviderConfigSetting, 3},
+                           {STORE_VLNMPCA_Product, 1},
+                           {STORE_VLNMPCA_Card, 1},
+                           {STORE_VLNMPCA_ProductPhysicalComponent, 1},
+                           {STORE_VLNMPCA_ChassisContainsCard, 1},
+                           {STORE_VLNMPCA_PhysicalConnector, 2},
+                           {STORE_VLNMPCA_ProductPhysicalConnector, 2},
+                           {STORE_VLNMPCA_Container, 2},
+                           {STORE_VLNMPCA_EthernetPort, 2},
+                           {STORE_VLNMPCA_EthernetPortSystemDevice, 2},
+                           {STORE_VLNMPCA_Realizes, 2},
+                           {STORE_VLNMPCA_LANEndpoint, 2},
+                           {STORE_VLNMPCA_EnabledLogicalElementCapabilities, 2},
+                           {STORE_VLNMPCA_NICCapabilities, 2},
+                           {STORE_VLNMPCA_EndpointCapabilities, 2},
+                           {STORE_VLNMPCA_NICSAPImplementation, 2},
+                           {STORE_VLNMPCA_HostedLANEndpoint, 2},
+                           {STORE_VLNMPCA_PortController, 2},
+                           {STORE_VLNMPCA_ProductPortControllerComponent, 2},
+                           {STORE_VLNMPCA_CardRealizesPortController, 2},
+                           {STORE_VLNMPCA_PortControllerSystemDevice, 2},
+                           {STORE_VLNMPCA_PortControllerRealizes, 2},
+                           {STORE_VLNMPCA_ControlledBy, 2}});
+    EXPECT_EQ(log.count(VLN_DBG, "PERF: updateAdapterMaps: cleanExit"), 1);
+}
+
+// Every property that the maps set, and no other.
+class Properties_Test : public Maps_Test {
+protected:
+    void SetUp() override {
+        Maps_Test::SetUp();
+        load(R"({"use": "nic"})", R"("subAdapter": 3, )");
+        // What a card tells of itself as a replaceable unit is another test's matter.
+        ASSERT_EQ(vlnsim_fault("AX_GetVPDV2", VLNSIM_EVERY, VLNSIM_STATUS, 1), 0);
+        replace_host_queries(&HOST);
+        ASSERT_EQ(pattern_load(), 0);
+        EXPECT_EQ(refreshes_started(*ProviderAgent::current()), 1);
+    }
+    void TearDown() override {
+        ProviderAgent::current()->releaseRef();
+        replace_host_queries(nullptr);
+        Maps_Test::TearDown();
+    }
+    // The first instance of the store as text, a line a property.
+    static std::string first(Store_Id store) {
+        std::string text = "\n";
+        for (const std::string& line : lines_of(ProviderAgent::current()->store(store).at(0)))
+            text += line + "\n";
+        return text;
+    }
+
+private:
+    static constexpr Host_Queries HOST = {
+        [](char* name, std::size_t size) {
+            std::snprintf(name, size, "box");
+            return 0;
+        },
+        [](const char*, std::string&, std::string&) { return false; },
+    };
+};
+
+TEST_F(Properties_Test, Card) {
+    EXPECT_EQ(first(STORE_VLNMPCA_Card), R"(
+string __name_space = "root/vorlan";
+string Description = "Vorlan VMC-2210 10Gb 2-port PCIe Converged Network Adapter";
+string ElementName = "VLN MPCA:VMC-2210:VR10420117";
+string Name = "VMC-2210";
+string Tag = "VR10420117";
+string CreationClassName = "VLNMPCA_Card";
+string Manufacturer = "Vorlan Corporation";
+string Model = "VMC-2210";
+string SerialNumber = "VR10420117";
+string Version = "7";
+string PartNumber = "VMC-2210";
+uint16 PackageType = 9;
+boolean HostingBoard = false;
+uint32 VendorSpecID = 1453984283;
+uint32 DeviceID = 8720;
+uint32 ModelID = 2587;
+string VLNSerialNumber = "VR10420117";
+)");
+    EXPECT_EQ(first(STORE_VLNMPCA_Product), R"(
+string __name_space = "root/vorlan";
+string Description = "Vorlan VMC-2210 10Gb 2-port PCIe Converged Network Adapter";
+string Name = "VMC-2210";
+string IdentifyingNumber = "VR10420117";
+string Vendor = "Vorlan Corporation";
+string Version = "7";
+)");
+    EXPECT_EQ(first(STORE_VLNMPCA_PhysicalConnector), R"(
+string __name_space = "root/vorlan";
+string InstanceID = "VR10420117:0";
+string Description = "Vorlan VMC-2210 10Gb 2-port PCIe Converged Network Adapter";
+string ElementName = "VLN MPCA Port:VR10420117:Network Connector:0";
+string Name = "100002564C000000";
+string Tag = "100002564C000000";
+string CreationClassName = "VLNMPCA_PhysicalConnector";
+string Manufacturer = "Vorlan Corporation";
+string Model = "VMC-2210";
+string SerialNumber = "VR10420117";
+string OtherIdentifyingInfo = "LocalPhysicalPort:0,Transceiver:SFP";
+uint16 ConnectorLayout = 12;
+)");
+}
+
+TEST_F(Properties_Test, EthernetPort) {
+    EXPECT_EQ(first(STORE_VLNMPCA_EthernetPort), R"(
+string __name_space = "root/vorlan";
+string InstanceID = "VMC-2210:100002564C000000";
+string Description = "Vorlan VMC-2210 10Gb 2-port PCIe Converged Network Adapter";
+string ElementName = "vln0p0";
+uint64 Generation = 0;
+string Name = "vln0p0";
+uint16 OperationalStatus = { 2 };
+string StatusDescriptions = { "OK" };
+uint16 EnabledState = 2;
+uint16 RequestedState = 12;
+string SystemCreationClassName = "CIM_ComputerSystem";
+string SystemName = "box";
+string CreationClassName = "VLNMPCA_EthernetPort";
+string DeviceID = "100002564C000000";
+string OtherIdentifyingInfo = { "VR10420117:03", "VR10420117:0", "VR10420117" };
+string IdentifyingDescriptions = { "SerialNumber + Sub-AdapterID", "SerialNumber:PhysicalPortNumber", "SerialNumber" };
+uint16 LocationIndicator = 3;
+uint64 Speed = 10000000000;
+uint64 MaxSpeed = 10000000000;
+uint16 PortType = 0;
+uint16 PortNumber = 0;
+uint16 LinkTechnology = 2;
+string PermanentAddress = "02564c000000";
+string NetworkAddresses = { "02564c000000" };
+uint64 SupportedMaximumTransmissionUnit = 9000;
+uint64 ActiveMaximumTransmissionUnit = 1500;
+uint16 Capabilities = { 2, 3, 4 };
+uint16 EnabledCapabilities = { 3, 4 };
+string FunctionalQosBandwidth = "10 Gbps";
+string FunctionalQosMinBandwidth = "1 Gbps";
+uint32 PCIBusNumber = 16;
+string FunctionalPortSpeed = "10 Gbps";
+)");
+}
+
+TEST_F(Properties_Test, LANEndpoint) {
+    EXPECT_EQ(first(STORE_VLNMPCA_LANEndpoint), R"(
+string __name_space = "root/vorlan";
+string Description = "Vorlan VMC-2210 10Gb 2-port PCIe Converged Network Adapter";
+string ElementName = "100002564C000000";
+string Name = "100002564C000000";
+uint16 EnabledState = 2;
+uint16 RequestedState = 12;
+string SystemCreationClassName = "CIM_ComputerSystem";
+string SystemName = "box";
+string CreationClassName = "VLNMPCA_LANEndpoint";
+string NameFormat = "Ethernet";
+uint16 ProtocolIFType = 6;
+string MACAddress = "02:56:4c:00:00:00";
+)");
+    EXPECT_EQ(first(STORE_VLNMPCA_EnabledLogicalElementCapabilities), R"(
+string __name_space = "root/vorlan";
+string InstanceID = "Capabilities:100002564C000000";
+boolean ElementNameEditSupported = false;
+uint16 RequestedStatesSupported = { 2 };
+)");
+}
+
+TEST_F(Properties_Test, PortController) {
+    EXPECT_EQ(first(STORE_VLNMPCA_PortController), R"(
+string __name_space = "root/vorlan";
+string Description = "Vorlan VMC-2210 10Gb 2-port PCIe Converged Network Adapter";
+string ElementName = "VMC-2210:VR10420117:0";
+string Name = "VMC-2210:VR10420117:0";
+uint16 OperationalStatus = { 2 };
+string StatusDescriptions = { "OK" };
+uint16 EnabledState = 5;
+uint16 RequestedState = 5;
+uint16 EnabledDefault = 2;
+string SystemCreationClassName = "CIM_ComputerSystem";
+string SystemName = "box";
+string CreationClassName = "VLNMPCA_PortController";
+string DeviceID = "VR10420117:0";
+uint16 Availability = 3;
+uint16 ProtocolSupported = 1;
+uint32 MaxNumberControlled = 1;
+string ProtocolDescription = "Multiple Protocols FCoE+NIC,iSCSI+NIC,NIC";
+uint16 ControllerType = 2;
+string SubAdapterId = "03";
+uint32 InterfaceType = 2;
+string AutoNegSupportedSpeeds = "";
+string ForceSupportedSpeeds = "1Gb,10Gb";
+uint16 PortSpeedMode = 2;
+string ConfiguredPortSpeed = "10Gb";
+uint32 DACCableLength = 3;
+uint32 PhyLinkDownReason = 0;
+)");
+}
+
+// Functions on one physical port share connector and controller; each has a port of its own.
+TEST_F(Maps_Test, FunctionsOfOnePort) {
+    load(R"({"use": "nic"}, {"use": "nic"})");
+    Loaded_Agent agent;
+    Log_Capture log;
+    EXPECT_EQ(refreshes_started(*agent), 1);
+    expect_counts(*agent, {{STORE_VLNMPCA_Product, 1},
+                           {STORE_VLNMPCA_Card, 1},
+                           {STORE_VLNMPCA_ChassisContainsCard, 1},
+                           {STORE_VLNMPCA_PhysicalConnector, 2},
+                           {STORE_VLNMPCA_ProductPhysicalConnector, 2},
+                           {STORE_VLNMPCA_EthernetPort, 4},
+                           {STORE_VLNMPCA_Realizes, 4},
+                           {STORE_VLNMPCA_PortController, 2},
+                           {STORE_VLNMPCA_PortControllerRealizes, 2},
+                           {STORE_VLNMPCA_ControlledBy, 4}});
+    EXPECT_EQ(log.count(VLN_CRIT, "Insert Failed (CNA): VLNMPCA_Container"), 2);
+}
+
+TEST_F(Maps_Test, StatesFollowTheLibrary) {
+    const struct {
+        int state;
+        const char* port_status;
+        const char* port_enabled;
+        const char* controller_status;
+        const char* access;
+    } rows[] = {
+        {6, "{ 3 }", "3", "{ 1 }", "2"},
+        {1, "{ 0 }", "0", "{ 0 }", "1"},
+        {21, "{ 32789 }", "3", "{ 0 }", "2"},
+    };
+    load(R"({"use": "nic"})");
+    Loaded_Agent agent;
+    for (const auto& row : rows) {
+        char error[128] = "";
+        ASSERT_EQ(vlnsim_set_value("100002564C000000", "portAttributes", "FunctionalPortState",
+                                   std::to_string(row.state).c_str(), error, sizeof error),
+                  0)
+            << error;
+        agent->m_bAdapterRefreshRequested = true;
+        EXPECT_EQ(refreshes_started(*agent), 1);
+        const Instance* port = agent->store(STORE_VLNMPCA_EthernetPort).at(0);
+        EXPECT_EQ(value_of(port, "OperationalStatus"), row.port_status);
+        EXPECT_EQ(value_of(port, "EnabledState"), row.port_enabled);
+        EXPECT_EQ(value_of(agent->store(STORE_VLNMPCA_LANEndpoint).at(0), "EnabledState"),
+                  row.port_enabled);
+        EXPECT_EQ(value_of(agent->store(STORE_VLNMPCA_PortController).at(0), "OperationalStatus"),
+                  row.controller_status);
+        EXPECT_EQ(value_of(agent->store(STORE_VLNMPCA_ControlledBy).at(0), "AccessState"),
+                  row.access);
+    }
+}
+
+// What fails costs what depends on it and nothing else.
+TEST_F(Maps_Test, FailuresStayWhereTheyAre) {
+    load(R"({"use": "nic"})");
+    Loaded_Agent agent;
+    Log_Capture log;
+    ASSERT_EQ(vlnsim_fault("AX_DiagBeaconState", 1, VLNSIM_STATUS, 63), 0);
+    ASSERT_EQ(vlnsim_fault("AX_DiagBeaconState", 2, VLNSIM_STATUS, 1), 0);
+    EXPECT_EQ(refreshes_started(*agent), 1);
+    const Instance_Map_Base& ports = agent->store(STORE_VLNMPCA_EthernetPort);
+    ASSERT_EQ(ports.size(), 2u);
+    EXPECT_EQ(value_of(ports.at(0), "LocationIndicator"), "4");
+    EXPECT_EQ(value_of(ports.at(1), "LocationIndicator"), "");
+    EXPECT_EQ(log.count(VLN_ERR, "VLNMPCA_DiagTestFunc::GetBeaconLEDState failed"), 1);
+#ifndef CIMPLE_CHECK_LOCKS // there the process ends, as it is meant to
+    char error[128] = "";
+    ASSERT_EQ(vlnsim_set_value("100002564C000000", "portAttributes", "PermanentMACAddress",
+                               R"("02-56")", error, sizeof error),
+              0)
+        << error;
+    agent->m_bAdapterRefreshRequested = true;
+    EXPECT_EQ(refreshes_started(*agent), 1);
+    expect_counts(*agent, {{STORE_VLNMPCA_PhysicalConnector, 2},
+                           {STORE_VLNMPCA_EthernetPort, 1},
+                           {STORE_VLNMPCA_LANEndpoint, 1},
+                           {STORE_VLNMPCA_PortController, 1}});
+#endif
+}
+
+} // namespace cimple

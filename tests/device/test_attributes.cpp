@@ -1,0 +1,275 @@
+#include "tests/device/model_fixture.h"
+
+#include "device/attribute_buffer.h"
+#include "device/fcoe_adapter.h"
+#include "device/iscsi_adapter.h"
+#include "device/nic_adapter.h"
+
+#include <cstring>
+
+namespace cimple {
+
+class Attributes_Test : public Model_Test {
+protected:
+    // A port needs an adapter to belong to; its attributes take no notice of it.
+    NICAdapter& owner() {
+        if (!m_owner)
+            m_owner = std::make_unique<NICAdapter>("Vorlan", 0, identifier, info());
+        return *m_owner;
+    }
+    NICPortAttributes nicPort() { return {owner(), 0, identifier, info()}; }
+    FCoEPortAttributes fcoePort() { return {owner(), 0, identifier, info()}; }
+    iSCSIPortAttributes iscsiPort() { return {owner(), 0, identifier, info()}; }
+
+private:
+    std::unique_ptr<NICAdapter> m_owner;
+};
+
+TEST_F(Attributes_Test, NicAdapter) {
+    Fake_Instance& instance = fake_library.add(1, NIC);
+    instance.adapterValues = {{514, "Vorlan"},           {515, "SN1"},     {532, number(7)},
+                              {551, number(0xAA554B32)}, {559, number(1)}, {586, "2"},
+                              {591, "10.2.261.13"}};
+    const NICAdapterAttributes a(identifier, info());
+    EXPECT_EQ(a.PortWWN, "10000090FA000001");
+    EXPECT_EQ(a.NodeWWN, "20000090FA000001");
+    EXPECT_EQ(a.numberOfPorts, 1U);
+    EXPECT_EQ(a.Manufacturer, "Vorlan");
+    EXPECT_EQ(a.SerialNumber, "SN1");
+    EXPECT_TRUE(a.BootCodeEnabled);
+    EXPECT_EQ(a.BoardTemperature, 0x32);
+    EXPECT_EQ(a.ThresholdCriticalTemp, 0x55);
+    EXPECT_EQ(a.ThresholdWarningTemp, 0x4B);
+    EXPECT_EQ(a.PortNumber, 1U);
+    EXPECT_EQ(a.Subadapter_number, "2");
+    EXPECT_EQ(a.FirmwareOnFlash, "10.2.261.13");
+    EXPECT_EQ(a.Model, "");
+    EXPECT_EQ(a.DeviceID, 0U);
+    const auto lines = log_capture::take();
+    EXPECT_EQ(log_capture::count(lines, "5:Port 0's WWPN: 10000090FA000001"), 1);
+    EXPECT_EQ(log_capture::count(lines, "5:_SerialNumber : [ SN1 ]"), 1);
+    EXPECT_EQ(log_capture::count(lines, "5:_PortNumber: [ 1 ]"), 1);
+    EXPECT_EQ(log_capture::count(lines,
+                                 "5:ERROR: AX_GetHBAAttributeValue HA__DeviceID call failed (251)"),
+              1);
+    EXPECT_EQ(log_capture::count(lines, "5:ERROR: _Model: AX_GetHBAAttributes call failed (251)"),
+              1);
+}
+
+TEST_F(Attributes_Test, ConvergedAdapters) {
+    Fake_Instance& instance = fake_library.add(1, FCOE);
+    instance.adapterValues = {{520, "A1"},
+                              {528, "4.6"},
+                              {531, std::string("\x00\x90\xFA\x01\x02\x03", 6)},
+                              {534, "boot"},
+                              {551, number(41)}};
+    const FCoEAdapterAttributes o(identifier, info());
+    EXPECT_EQ(o.HWVersion, "A1");
+    EXPECT_EQ(o.IEEEAddress, "00:90:fa:01:02:03");
+    EXPECT_EQ(o.BoardTemperature, 41U);
+    EXPECT_EQ(o.DriverType, 3U);
+    EXPECT_EQ(logged("5:_DriverType: [ 3 ]"), 1);
+    const iSCSIAdapterAttributes i(identifier, info());
+    EXPECT_EQ(i.OpertionalFirmwareVersion, "4.6");
+    EXPECT_EQ(i.OpertionalFirmwareVersion2, "4.6");
+    EXPECT_EQ(logged("5:_BootImageExpansionROMVersion : [ boot ]"), 1);
+
+    instance.adapterValues.clear();
+    instance.driverTypeStatus = 12;
+    const FCoEAdapterAttributes bare(identifier, info());
+    EXPECT_EQ(bare.IEEEAddress, "");
+    EXPECT_EQ(bare.DriverType, 0U);
+    EXPECT_EQ(logged("3:ERROR: AX_GetDriverType call failed (12)"), 1);
+}
+
+TEST_F(Attributes_Test, WholeBufferThatFailsFailsTheObject) {
+    Fake_Instance& instance = fake_library.add(1, NIC);
+    instance.adapterStatus = {2, 2, 2};
+    EXPECT_THROW(NICAdapterAttributes(identifier, info()), std::exception);
+    EXPECT_EQ(logged("3:ERROR: AX_GetHBAAttributes call failed (2)"), 1);
+    EXPECT_THROW(iSCSIAdapterAttributes(identifier, info()), std::exception);
+    EXPECT_THROW(FCoEAdapterAttributes(identifier, info()), std::exception);
+    instance.initiatorStatus = 1;
+    EXPECT_THROW(iscsiPort(), std::exception);
+    EXPECT_EQ(logged("3:ERROR: AX_iSCSI_GetInitiatorProperties() Failed."), 1);
+    instance.initiatorStatus = 0;
+    instance.networkStatus = 1;
+    EXPECT_THROW(iscsiPort(), std::exception);
+    EXPECT_EQ(logged("3:ERROR: ADPCMD_GetNetConfig: AX_iSCSI_GetNetConfig() Failed."), 1);
+}
+
+TEST_F(Attributes_Test, NicPort) {
+    Fake_Instance& instance = fake_library.add(1, NIC);
+    instance.portValues = {{774, number(2)},    {802, number(6)},           {803, "eth0"},
+                           {805, number(1500)}, {817, "00-90-fa-00-00-01"}, {853, number(2)}};
+    owner(); // has a port of its own
+    log_capture::take();
+    const NICPortAttributes a = nicPort();
+    EXPECT_EQ(a.PortName, "10000090FA000001");
+    EXPECT_EQ(a.SpecialFeature, NIC);
+    EXPECT_EQ(a.FunctionalPortState, 2U);
+    EXPECT_EQ(a.PhysicalPortState, 6U);
+    EXPECT_EQ(a.IfName, "eth0");
+    EXPECT_EQ(a.CurrentMTU, 1500U);
+    EXPECT_EQ(a.CurrentMACAddress, "00-90-fa-00-00-01");
+    EXPECT_EQ(a.SRIOVState, 2U);
+    EXPECT_EQ(a.VEPAState, 2U) << "not offered: the default";
+    EXPECT_EQ(logged("3: hbaInfo.SpecialFeatures : (8) _SpecialFeature : 8 \n"), 1);
+}
+
+TEST_F(Attributes_Test, DefaultsStandWhenNothingIsOffered) {
+    fake_library.add(1, NIC);
+    const NICPortAttributes n = nicPort();
+    EXPECT_EQ(n.FunctionalPortState, 1U);
+    EXPECT_EQ(n.PhysicalPortState, 1U);
+    EXPECT_EQ(n.PortType, 1U);
+    EXPECT_EQ(n.SRIOVState, 3U);
+    EXPECT_EQ(n.VEPAState, 2U);
+    EXPECT_EQ(n.PortSpeed, 0U);
+    const FCoEPortAttributes o = fcoePort();
+    EXPECT_EQ(o.PortType, 1U);
+    EXPECT_EQ(o.PhysicalPortState, 1U);
+    EXPECT_EQ(o.FunctionalPortState, 0U);
+    const iSCSIPortAttributes i = iscsiPort();
+    EXPECT_EQ(i.PhysicalPortState, 1U);
+    EXPECT_EQ(i.PortType, 1U);
+}
+
+TEST_F(Attributes_Test, FcoePort) {
+    Fake_Instance& instance = fake_library.add(1, FCOE);
+    const uint8 fabric[8] = {0x10, 0, 0, 5, 0x1E, 0xAA, 0xBB, 0x0C};
+    std::memcpy(instance.info.fabricName, fabric, sizeof fabric);
+    instance.info.nFlags = 0xBEEF;
+    std::string types(32, '\0');
+    types[2] = 1;
+    instance.portValues = {{775, number(8)}, {776, types}, {777, std::string(types, 0, 3)}};
+    FCoEPort port(owner(), 0, identifier, info());
+    const auto& a = static_cast<const FCoEPortAttributes&>(*port.getPortAttributes());
+    EXPECT_EQ(a.FabricName, "10:00:00:05:1e:aa:bb:0c");
+    EXPECT_EQ(a.nFlags, "0000beef");
+    EXPECT_EQ(a.PORT_SERVICE_TYPE, 8U);
+    EXPECT_EQ(a.PortSupportedClassofService, 8U);
+    EXPECT_EQ(a.PortSupportedFc4Types[2], 1);
+    EXPECT_EQ(a.PortActiveFc4Types, a.PortSupportedFc4Types) << "a short value is no overrun";
+    EXPECT_EQ(port.getPortName(), "10000090FA000001");
+    EXPECT_EQ(port.getNodeName(), "20000090FA000001");
+}
+
+TEST_F(Attributes_Test, IscsiPort) {
+    Fake_Instance& instance = fake_library.add(1, ISCSI);
+    std::memset(instance.initiator.name, 'n', sizeof instance.initiator.name); // no terminator
+    std::strcpy(instance.initiator.authentication.targetCHAPName, "target");
+    std::strcpy(instance.initiator.authentication.initiatorCHAPName, "initiator");
+    instance.initiator.loginOptions.maxBurstLength = 262144;
+    instance.network.address = {{10, 0, 0, 200}, 0, 0};
+    instance.network.addressOrigin = 4;
+    const struct {
+        uint32 method;
+        const char *text, *target, *initiator;
+    } cases[] = {{0, "None", "Not Available", "Not Available"},
+                 {1, "One-Way CHAP", "target", "Not Available"},
+                 {2, "Mutual CHAP", "target", "initiator"},
+                 {99, "Mutual CHAP", "target", "initiator"}};
+    for (const auto& c : cases) {
+        instance.initiator.authentication.method = c.method;
+        const iSCSIPortAttributes a = iscsiPort();
+        EXPECT_EQ(a.AuthenticationMethod, c.text);
+        EXPECT_EQ(a.TargetCHAPName, c.target);
+        EXPECT_EQ(a.InitiatorCHAPName, c.initiator);
+    }
+    const iSCSIPortAttributes a = iscsiPort();
+    EXPECT_EQ(a.InitiatorName, std::string(AX_ISCSI_NAME_SIZE, 'n'));
+    EXPECT_EQ(a.LoginOptions.maxBurstLength, 262144U);
+    EXPECT_EQ(a.IPAddress, "10.0.0.200");
+    EXPECT_EQ(a.SubnetMask, "0.0.0.0");
+    EXPECT_EQ(a.AddressOrigin, 4);
+}
+
+TEST_F(Attributes_Test, AddressTexts) {
+    const std::pair<AX_IPAddress, const char*> cases[] = {
+        {{{255, 255, 255, 0, 9, 9}, 0, 0xFFFE}, "255.255.255.0"},
+        {{{}, 0, 1}, ":::"},
+        {{{0xFE, 0x80, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 1}, 0, 1}, "fe80::1:"},
+        {{{0x20, 0x01, 0x0D, 0xB8, 0, 1, 0, 0, 0, 0, 0, 0, 0, 0, 0x10, 0}, 0, 1}, "201:db8:1::10:"},
+        {{{1, 2, 3, 4, 5, 6, 7, 8, 9, 10, 11, 12, 13, 14, 15, 16}, 0, 1},
+         "12:34:56:78:9a:bc:de:f10:"}};
+    for (const auto& [address, text] : cases)
+        EXPECT_EQ(addressText(address), text);
+}
+
+// ---- Values that lie ----
+
+TEST_F(Attributes_Test, TextsAreCutTo255Bytes) {
+    for (std::size_t length : {0U, 1U, 254U, 255U, 256U, 700U}) {
+        SetUp();
+        fake_library.add(1, NIC).adapterValues = {{516, std::string(length, 'x')},
+                                                  {517, std::string("ab\0cd", 5)}};
+        const NICAdapterAttributes a(identifier, info());
+        EXPECT_EQ(a.Model, std::string(std::min<std::size_t>(length, 255), 'x')) << length;
+        EXPECT_EQ(a.ModelDescription, "ab");
+    }
+}
+
+TEST_F(Attributes_Test, ValuesBesideTheBufferAreRefused) {
+    static char elsewhere[] = "secret of the process";
+    fake_library.add(1, NIC).adapterValues = {{516, "model"}, {526, number(7)}};
+    for (std::ptrdiff_t offset : {-1, int{AX_ADAPTER_ATTRIBUTES_SIZE}, 1 << 20}) {
+        fake_library.onValue = [offset](void* buffer, uint16_t, void*, uint16_t* length) -> void* {
+            *length = 0xFFFF;
+            return reinterpret_cast<void*>(reinterpret_cast<std::uintptr_t>(buffer) +
+                                           static_cast<std::uintptr_t>(offset));
+        };
+        const NICAdapterAttributes a(identifier, info());
+        EXPECT_EQ(a.Model, "");
+        EXPECT_EQ(a.DeviceID, 0U);
+        EXPECT_EQ(logged("3:ERROR: AX_GetAttributeValue points outside of its buffer (516)"), 1);
+    }
+    fake_library.onValue = [](void*, uint16_t, void*, uint16_t*) -> void* { return elsewhere; };
+    EXPECT_EQ(NICAdapterAttributes(identifier, info()).Model, "");
+}
+
+TEST_F(Attributes_Test, ValuesAtTheVeryEndAreCutThere) {
+    fake_library.add(1, NIC).adapterValues = {{516, "model"}, {526, number(7)}};
+    fake_library.onValue = [](void* buffer, uint16_t identifier, void*, uint16_t* length) -> void* {
+        *length = 0xFFFF;
+        char* end = static_cast<char*>(buffer) + AX_ADAPTER_ATTRIBUTES_SIZE;
+        std::memcpy(end - 3, "end", 3);
+        return identifier == 516 ? end - 3 : end - 2;
+    };
+    const NICAdapterAttributes a(identifier, info());
+    EXPECT_EQ(a.Model, "end");
+    EXPECT_EQ(a.DeviceID, 0U) << "a number that does not fit is none";
+}
+
+// ---- Statistics ----
+
+TEST_F(Attributes_Test, StatisticsAreFetchedAnewAndKeptOnFailure) {
+    Fake_Instance& instance = fake_library.add(1, FCOE);
+    instance.statistics = {{1025, counter(1ULL << 40)},
+                           {1030, counter(~0ULL)},
+                           {1059, counter(0)},
+                           {1034, counter(5)}};
+    FCoEPort port(owner(), 0, identifier, info());
+    PortStatistics* statistics = port.getPortStatistics();
+    ASSERT_NE(statistics, nullptr);
+    EXPECT_EQ(statistics->counter(1025), 1ULL << 40);
+    EXPECT_EQ(statistics->counter(1030), 0xFFFFFFFFULL) << "all ones is no value";
+    EXPECT_EQ(statistics->counter(1031), 0xFFFFFFFFULL) << "not reported";
+    EXPECT_EQ(statistics->counter(1034), 0xFFFFFFFFULL) << "no counter of ours";
+    EXPECT_EQ(statistics->counter(1059), 0U);
+
+    instance.statistics[1031] = counter(9);
+    instance.statisticsStatus = {0, 4};
+    statistics = port.getPortStatistics();
+    EXPECT_EQ(statistics->counter(1031), 9U);
+    EXPECT_THROW(port.getPortStatistics(), std::exception);
+    EXPECT_EQ(statistics->counter(1031), 9U) << "the former object stays";
+    const auto lines = log_capture::take();
+    EXPECT_EQ(log_capture::count(lines, "3:ERROR: AX_GetPortStatistics call failed (4)"), 1);
+    EXPECT_EQ(log_capture::count(
+                  lines, "3:FCoE Port statistics error occurred,retain the old statistics !!!"),
+              1);
+    EXPECT_EQ(NICPort(owner(), 0, identifier, info()).getPortStatistics(), nullptr);
+}
+
+} // namespace cimple

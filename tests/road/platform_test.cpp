@@ -1,0 +1,73 @@
+// The platform's own computer system and chassis, fetched by up-calls, and the provider's when
+// there are none.
+#include "tests/road/road.h"
+
+using road::Road;
+using road::text_of;
+
+namespace {
+
+constexpr const char* PLATFORM = R"([
+  {"namespace": "root/ibmse", "class": "IBMSD_ComputerSystem",
+   "properties": {"CreationClassName": "IBMSD_ComputerSystem", "Name": "rack7-node3"}},
+  {"namespace": "root/ibmse", "class": "IBMSD_Chassis",
+   "properties": {"CreationClassName": "IBMSD_Chassis", "Tag": "chassis 12"}}
+])";
+
+// Every SystemName of every instance, keys of references included.
+void collect(const host::ObjectPath& path, std::vector<std::string>& names) {
+    for (const host::Named_Value& key : path.keys) {
+        if (key.name == "SystemName")
+            names.push_back(key.value.as_text());
+        if (const host::ObjectPath* end = key.value.as_reference()) {
+            collect(*end, names);
+            if (end->class_name.ends_with("ComputerSystem"))
+                names.push_back(end->key("Name")->as_text());
+        }
+    }
+}
+
+std::vector<std::string> system_names(Road& road) {
+    std::vector<std::string> names;
+    for (const host::Class* known : road.manager().provider_classes())
+        for (const host::Instance& instance : road.enumerate(known->name))
+            collect(instance.path, names);
+    return names;
+}
+
+TEST(Platform, ItsComputerSystemIsTheOneEverythingHangsOn) {
+    Road road({.platform = PLATFORM});
+    const auto names = system_names(road);
+    EXPECT_GT(names.size(), 10u);
+    for (const std::string& name : names)
+        EXPECT_EQ(name, "rack7-node3");
+    for (const host::Instance& port : road.enumerate("VLNMPCA_EthernetPort"))
+        EXPECT_EQ(text_of(port, "SystemCreationClassName"), "IBMSD_ComputerSystem");
+}
+
+TEST(Platform, ItsChassisHoldsTheCard) {
+    Road road({.platform = PLATFORM});
+    const auto links = road.enumerate("VLNMPCA_ChassisContainsCard");
+    ASSERT_EQ(links.size(), 1u);
+    const host::ObjectPath* chassis = links[0].property("GroupComponent")->as_reference();
+    ASSERT_NE(chassis, nullptr);
+    EXPECT_EQ(chassis->class_name, "IBMSD_Chassis");
+    EXPECT_EQ(chassis->name_space, "root/ibmse");
+    EXPECT_EQ(chassis->key("Tag")->as_text(), "chassis 12");
+}
+
+TEST(Platform, WithoutOneTheProviderMakesItsOwn) {
+    Road road({.log = true});
+    const auto names = system_names(road);
+    EXPECT_GT(names.size(), 10u);
+    for (const std::string& name : names)
+        EXPECT_EQ(name, names.front());
+    const auto links = road.enumerate("VLNMPCA_ChassisContainsCard");
+    ASSERT_EQ(links.size(), 1u);
+    const host::ObjectPath* chassis = links[0].property("GroupComponent")->as_reference();
+    EXPECT_EQ(chassis->class_name, "CIM_Chassis");
+    EXPECT_EQ(chassis->key("Tag")->as_text(), "VLN MPCA:Chassis");
+    EXPECT_GE(road.count_in_log("up-call method failed"), 1u);
+}
+
+} // namespace

@@ -1,0 +1,140 @@
+#include "tests/road/road.h"
+
+#include "host/path_text.h"
+
+#include <fstream>
+#include <sstream>
+
+namespace road {
+
+namespace fs = std::filesystem;
+
+namespace {
+
+constexpr std::uint64_t START = 1400000000ull * 1000000; // 2014-05-13, in microseconds
+constexpr const char* LOG_FILE = "/opt/ibm/platform/log/vorlan_mpca_provider_ffdc.log";
+constexpr const char* TRACE_FILE = "/var/log/provider-trace.log";
+
+fs::path fresh_folder() {
+    static int number = 0;
+    const auto* test = testing::UnitTest::GetInstance()->current_test_info();
+    fs::path folder = fs::current_path() / "roots" /
+                      (std::string(test->test_suite_name()) + "." + test->name() + "." +
+                       std::to_string(number++));
+    for (char& c : const_cast<std::string&>(folder.native()))
+        if (c == ' ')
+            c = '_';
+    fs::remove_all(folder);
+    for (const char* sub : {"etc", "var/log", "tmp", "proc", "opt/ibm/platform/log"})
+        fs::create_directories(folder / sub);
+    std::ofstream(folder / "proc/version") << "Linux version 6.1.0 (simulated host)\n";
+    std::ofstream(folder / "etc/issue") << "Debian GNU/Linux 12\n";
+    return folder;
+}
+
+void load(const std::string& scenario) {
+    char error[512] = "";
+    const int status =
+        scenario.starts_with("{")
+            ? vlnsim_load_scenario_text(scenario.c_str(), "scenario", error, sizeof error)
+            : vlnsim_load_scenario((std::string(VLN_SCENARIOS "/") + scenario).c_str(), error,
+                                   sizeof error);
+    ASSERT_EQ(status, 0) << error;
+}
+
+} // namespace
+
+Road::Road(const Setup& setup) : _root(fresh_folder()) {
+    vlnsim_reset();
+    vlnsim_use_virtual_clock(START);
+    vlnsim_set_host_root(_root.c_str());
+    load(setup.scenario);
+    if (setup.libraries) {
+        char error[512] = "";
+        EXPECT_EQ(vlnsim_open_libraries(error, sizeof error), 0) << error;
+    }
+    if (setup.log)
+        std::ofstream(_root / "etc/vorlan_mpca_provider.dmp") << "2,5,1\n"
+                                                              << _root.native() << TRACE_FILE;
+    host::Options options;
+    if (!setup.platform.empty()) {
+        options.platform_path = _root / "platform.json";
+        std::ofstream(options.platform_path) << setup.platform;
+    }
+    _manager = std::make_unique<host::Manager>(std::move(options));
+    const host::Status status = _manager->load(VLN_MODULE);
+    EXPECT_TRUE(status.ok()) << status.message;
+}
+
+Road::~Road() {
+    close();
+}
+
+void Road::close() {
+    if (!_manager)
+        return;
+    _manager->close();
+    for (const host::Fault& fault : _manager->faults())
+        ADD_FAILURE() << "provider fault: " << host::to_string(fault);
+    EXPECT_EQ(_manager->live_object_count(), 0u);
+    for (std::size_t i = 0; i < vlnsim_violations(); ++i) {
+        char text[256];
+        vlnsim_violation(i, text, sizeof text);
+        ADD_FAILURE() << "breach of the library's contract: " << text;
+    }
+    _manager.reset();
+    vlnsim_close_libraries();
+    vlnsim_reset();
+}
+
+std::vector<host::Instance> Road::enumerate(const std::string& class_name) {
+    auto reply = _manager->enumerate(class_name);
+    EXPECT_TRUE(reply.ok()) << class_name << ": " << host::rc_name(reply.status.rc);
+    return std::move(reply.value);
+}
+
+std::map<std::string, std::size_t> Road::census() {
+    std::map<std::string, std::size_t> counts;
+    for (const host::Class* known : _manager->provider_classes())
+        if (const std::size_t count = enumerate(known->name).size())
+            counts[known->name] = count;
+    return counts;
+}
+
+std::string Road::log_text() const {
+    std::string text;
+    for (const char* file : {LOG_FILE, TRACE_FILE}) {
+        std::ifstream in(_root.native() + file);
+        std::stringstream content;
+        content << in.rdbuf();
+        text += content.str();
+    }
+    return text;
+}
+
+std::size_t Road::count_in_log(const std::string& text) const {
+    const std::string log = log_text();
+    std::size_t count = 0;
+    for (std::size_t at = log.find(text); at != std::string::npos; at = log.find(text, at + 1))
+        ++count;
+    return count;
+}
+
+std::string text_of(const host::Instance& instance, const std::string& property) {
+    const host::Value* value = instance.property(property);
+    if (!value || value->is_null())
+        return "-";
+    if (!value->is_array())
+        return value->type == CMPI_string ? value->as_text()
+                                          : host::scalar_to_text(*value, "root/vorlan");
+    std::string text = "{";
+    for (const host::Value& element : value->as_array()) {
+        if (text.size() > 1)
+            text += ", ";
+        text += element.type == CMPI_string ? element.as_text()
+                                            : host::scalar_to_text(element, "root/vorlan");
+    }
+    return text + "}";
+}
+
+} // namespace road

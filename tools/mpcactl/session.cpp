@@ -1,0 +1,125 @@
+#include "tools/mpcactl/session.h"
+
+#include "tools/mpcactl/failure.h"
+
+#include "host/installation.h"
+
+#include <cstdio>
+
+namespace mpcactl {
+
+namespace {
+
+std::string module_path(const Settings& settings) {
+    if (!settings.module.empty())
+        return settings.module.find('/') == std::string::npos ? "./" + settings.module
+                                                              : settings.module;
+    if (!settings.scenario.empty())
+        return Simulation::module_path();
+    return host::program_folder() + "/../lib/libvorlan_mpca_provider.so";
+}
+
+host::Options host_options(const Settings& settings) {
+    host::Options options;
+    options.mof_path = settings.mof;
+    options.platform_path = settings.platform;
+    options.name_space = settings.name_space;
+    options.more_name_spaces.push_back("root/vorlan");
+    if (settings.trace_calls)
+        options.trace = [](const std::string& line) {
+            std::fprintf(stderr, "%s\n", line.c_str());
+        };
+    return options;
+}
+
+} // namespace
+
+Session::Session(const Settings& given) : settings(given) {
+    if (!settings.host_root.empty() && settings.scenario.empty())
+        throw Usage_Error("--host-root goes with --simulate");
+    try {
+        _manager = std::make_unique<host::Manager>(host_options(settings));
+    } catch (const host::Setup_Error& error) {
+        throw Usage_Error(error.what());
+    }
+    if (!settings.scenario.empty())
+        _simulation = std::make_unique<Simulation>(settings.scenario, settings.host_root,
+                                                   settings.trace_calls);
+    if (const host::Status status = _manager->load(module_path(settings)); !status.ok())
+        throw Usage_Error("the module cannot be loaded: " + status.message);
+}
+
+const host::Class& Session::known_class(const std::string& name) const {
+    const host::Class* known = _manager->classes().find(name);
+    if (!known)
+        throw Usage_Error("unknown class " + name +
+                          host::did_you_mean(name, _manager->classes().names()) +
+                          "\nmpcactl classes lists those of the module");
+    return *known;
+}
+
+const host::Class& Session::known_association(const std::string& name) const {
+    const host::Class& known = known_class(name);
+    if (known.is_association)
+        return known;
+    std::vector<std::string> associations;
+    for (const auto& candidate : _manager->classes().classes())
+        if (candidate->is_association)
+            associations.push_back(candidate->name);
+    throw Usage_Error(known.name + " is no association" + host::did_you_mean(name, associations));
+}
+
+const host::Method& Session::known_method(const host::Class& known,
+                                          const std::string& name) const {
+    if (const host::Method* method = known.find_method(name))
+        return *method;
+    std::vector<std::string> names;
+    for (const host::Method& method : known.methods)
+        names.push_back(method.name);
+    throw Usage_Error(known.name + " has no method " + name + host::did_you_mean(name, names) +
+                      (names.empty() ? "\nIt has no methods."
+                                     : "\nIts methods: " + host::join_or(names)));
+}
+
+host::ObjectPath Session::path() const {
+    host::Parsed_Path parsed = _manager->parse_path(settings.path);
+    if (!parsed.error.empty())
+        throw Usage_Error("object path: " + parsed.error);
+    return std::move(parsed.path);
+}
+
+host::Property_List Session::properties(const host::Class* known) const {
+    if (settings.properties.empty())
+        return std::nullopt;
+    for (const std::string& name : settings.properties)
+        if (known && !known->find_property(name))
+            throw Usage_Error(known->name + " has no property " + name +
+                              host::did_you_mean(name, known->property_names()));
+    return settings.properties;
+}
+
+int Session::finish() {
+    _manager->close();
+    int status = EXIT_FINE;
+    if (const std::size_t count = _manager->fault_count(); count > 0) {
+        status = EXIT_CIM;
+        std::fprintf(stderr, "%zu provider fault%s:\n", count, count == 1 ? "" : "s");
+        const std::vector<host::Fault> faults = _manager->faults();
+        for (const host::Fault& fault : faults)
+            std::fprintf(stderr, "  %s\n", host::to_string(fault).c_str());
+        if (faults.size() < count)
+            std::fprintf(stderr, "  and %zu more\n", count - faults.size());
+    }
+    if (!_simulation)
+        return status;
+    if (const std::vector<std::string> breaches = _simulation->violations(); !breaches.empty()) {
+        status = EXIT_CIM;
+        std::fprintf(stderr, "%zu breach%s of the libraries' contract:\n", breaches.size(),
+                     breaches.size() == 1 ? "" : "es");
+        for (const std::string& breach : breaches)
+            std::fprintf(stderr, "  %s\n", breach.c_str());
+    }
+    return status;
+}
+
+} // namespace mpcactl

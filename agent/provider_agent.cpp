@@ -22,6 +22,8 @@ namespace {
 constinit std::atomic<ProviderAgent*> s_Agent{nullptr};
 // Loaded class providers. Written under s_AgentMutex; the log lines read it outside.
 constinit std::atomic<sint32> s_AgentRefCount{0};
+// Classes whose load failed and which have not been unloaded. Guarded by s_AgentMutex.
+constinit sint32 s_FailedLoads = 0;
 
 constinit Process_Wide<Mutex> s_AgentMutex(false, RANK_AGENT, "s_AgentMutex");
 
@@ -52,11 +54,33 @@ ProviderAgent* ProviderAgent::instance() {
 bool ProviderAgent::acquire() {
     Auto_Mutex lock(*s_AgentMutex);
     ProviderAgent* agent = instanceLocked();
-    if (!agent->m_bLibraryLoaded)
+    if (!agent->m_bLibraryLoaded) {
+        ++s_FailedLoads;
         return false;
+    }
     VLN_LOG(VLN_DBG, "ProviderAgent::addRef[%d]", s_AgentRefCount.load());
     ++s_AgentRefCount;
     return true;
+}
+
+void ProviderAgent::release() {
+    ProviderAgent* agent = current();
+    if (!agent)
+        return;
+    if (agent->m_bLibraryLoaded) {
+        agent->releaseRef();
+        return;
+    }
+    // The half-built agent has no references, but it may have a refresh thread, and the library may
+    // be unmapped once its last class is gone.
+    Auto_Mutex lock(*s_AgentMutex);
+    if (--s_FailedLoads == 0)
+        destroyLocked();
+}
+
+void ProviderAgent::destroyLocked() {
+    delete s_Agent.load(std::memory_order_relaxed);
+    s_Agent.store(nullptr, std::memory_order_release);
 }
 
 void ProviderAgent::addRef() {
@@ -68,10 +92,8 @@ void ProviderAgent::addRef() {
 void ProviderAgent::releaseRef() {
     VLN_LOG(VLN_DBG, "ProviderAgent::releaseRef[%d]", s_AgentRefCount.load());
     Auto_Mutex lock(*s_AgentMutex);
-    if (--s_AgentRefCount != 0)
-        return;
-    delete this;
-    s_Agent.store(nullptr, std::memory_order_release);
+    if (--s_AgentRefCount == 0)
+        destroyLocked();
 }
 
 // ---- Construction ----

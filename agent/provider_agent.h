@@ -34,6 +34,9 @@ public:
     // instance and addRef in one step, so that the last release on another thread can't come
     // between. False, and no reference, when the libraries are not usable.
     static bool acquire();
+    // Undoes one acquire, whatever it answered. The last one of an agent whose libraries are not
+    // usable destroys it, so that a later load tries again.
+    static void release();
 
     // One reference for each class provider that is loaded. The last release destroys the agent: it
     // joins a running refresh and waits at the gates, with s_AgentMutex held.
@@ -117,6 +120,7 @@ private:
     void destroyDeviceModel();
     void clearRecords();
     static ProviderAgent* instanceLocked();
+    static void destroyLocked();
 
     // refresh.cpp
     static void* DataFetch_Handler(void* agent);

@@ -50,3 +50,43 @@ function(vln_test name)
     endif()
     set_tests_properties(${name} PROPERTIES TIMEOUT ${ARG_TIMEOUT})
 endfunction()
+
+# The rooms that the shared library is made of.
+set(VLN_PRODUCT_ROOMS vln_cimple vln_schema_meta vln_schema vln_foundation vln_device
+    vln_operations vln_agent vln_services vln_derivedObjects)
+
+# A module of the product's objects. With REPLACE, the objects of the named sources are left out and
+# the given sources take their place: the simulation's module differs in the host's root folder and in
+# the clock, and in nothing else.
+#   vln_module(TARGET OUTPUT_DIRECTORY [REPLACE name...] [WITH source...] [LIBRARIES target...]
+#              [NO_EXPORT_MAP])
+function(vln_module target directory)
+    cmake_parse_arguments(ARG "NO_EXPORT_MAP" "" "REPLACE;WITH;LIBRARIES" ${ARGN})
+    set(objects "")
+    foreach(room IN LISTS VLN_PRODUCT_ROOMS)
+        if(TARGET ${room})
+            set(list "$<TARGET_OBJECTS:${room}>")
+            foreach(name IN LISTS ARG_REPLACE)
+                set(list "$<FILTER:${list},EXCLUDE,/${name}[.]o$>")
+            endforeach()
+            list(APPEND objects "${list}")
+        endif()
+    endforeach()
+    add_library(${target} MODULE ${objects} ${ARG_WITH})
+    target_link_libraries(${target} PRIVATE vln_warnings Threads::Threads ${CMAKE_DL_LIBS}
+                                            ${ARG_LIBRARIES})
+    set_target_properties(${target} PROPERTIES
+        LIBRARY_OUTPUT_DIRECTORY "${directory}"
+        LINKER_LANGUAGE CXX)
+    if(NOT ARG_NO_EXPORT_MAP)
+        set_target_properties(${target} PROPERTIES
+            OUTPUT_NAME vorlan_mpca_provider
+            LINK_DEPENDS "${VLN_GENERATED_DIR}/export.map")
+        target_link_options(${target} PRIVATE
+            "LINKER:--version-script=${VLN_GENERATED_DIR}/export.map")
+    endif()
+    target_link_options(${target} PRIVATE "LINKER:-z,relro"
+        $<$<NOT:$<BOOL:${VLN_SANITIZE}>>:LINKER:--no-undefined>)
+    target_include_directories(${target} PRIVATE "${VLN_GENERATED_DIR}")
+    add_dependencies(${target} vln_generate)
+endfunction()

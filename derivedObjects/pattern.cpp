@@ -99,8 +99,7 @@ sint32 pattern_load() noexcept {
 sint32 pattern_unload(const Pattern_Row& row) noexcept {
     VLN_LOG(VLN_DBG, "%s_Provider::unload()", row.meta_class->name);
     try {
-        if (ProviderAgent* agent = ProviderAgent::current())
-            agent->releaseRef();
+        ProviderAgent::release();
     } catch (...) {
         VLN_LOG(VLN_ERR, "Error in ProviderAgent unload. Just continue");
     }

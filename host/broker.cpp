@@ -5,7 +5,8 @@
 namespace host {
 
 CMPIBroker make_broker(Core& core) {
-    // The interface has the tables writable; a provider that writes to them ends with a fault there.
+    // The interface has the tables writable; a provider that writes to them ends with a fault
+    // there.
     return {&core, const_cast<CMPIBrokerFT*>(&broker_functions),
             const_cast<CMPIBrokerEncFT*>(&object_functions),
             const_cast<CMPIBrokerExtFT*>(&system_functions)};

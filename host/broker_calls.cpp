@@ -71,8 +71,8 @@ Status find_up_target(Core& core, const ObjectPath& path, Target& target) {
     return {};
 }
 
-// The class and its subclasses, as up-calls to enumerate have it: the platform's instances, then those
-// of the module's providers. What the visitor answers first that is not OK ends it.
+// The class and its subclasses, as up-calls to enumerate have it: the platform's instances, then
+// those of the module's providers. What the visitor answers first that is not OK ends it.
 template <class Visit>
 Status for_each_target(Core& core, const ObjectPath& path, Visit visit) {
     const Class* known = core.classes.find(path.class_name);
@@ -179,12 +179,12 @@ Status prepare(Up_Call& call, Target& target) {
 Reply<Instance> get_for(Up_Call& call, const Property_List& properties) {
     Target target;
     Status status = prepare(call, target);
-    return status.ok() ? get(*call.core, target, call.path, properties) : Reply<Instance>{status, {}};
+    return status.ok() ? get(*call.core, target, call.path, properties)
+                       : Reply<Instance>{status, {}};
 }
 
-CMPIInstance* get_up(const CMPIBroker* broker, const CMPIContext* context,
-                     const CMPIObjectPath* op, const char** properties,
-                     CMPIStatus* status) noexcept {
+CMPIInstance* get_up(const CMPIBroker* broker, const CMPIContext* context, const CMPIObjectPath* op,
+                     const char** properties, CMPIStatus* status) noexcept {
     Up_Call call(broker, context, op, "getInstance");
     const Reply<Instance> reply = get_for(call, to_list(properties));
     call.status = reply.status;
@@ -222,9 +222,8 @@ CMPIObjectPath* create_up(const CMPIBroker* broker, const CMPIContext* context,
     return reply.ok() ? make(*call.core, to_body(*call.core, std::move(reply.value))) : nullptr;
 }
 
-CMPIStatus modify_up(const CMPIBroker* broker, const CMPIContext* context,
-                     const CMPIObjectPath* op, const CMPIInstance* inst,
-                     const char** properties) noexcept {
+CMPIStatus modify_up(const CMPIBroker* broker, const CMPIContext* context, const CMPIObjectPath* op,
+                     const CMPIInstance* inst, const char** properties) noexcept {
     Up_Call call(broker, context, op, "modifyInstance");
     Target target;
     Instance instance;
@@ -273,9 +272,8 @@ CMPIEnumeration* walk_up(const CMPIBroker* broker, const CMPIContext* context,
 }
 
 CMPIEnumeration* associators_up(const CMPIBroker* broker, const CMPIContext* context,
-                                const CMPIObjectPath* op, const char* via,
-                                const char* result_class, const char* role,
-                                const char* result_role, const char** properties,
+                                const CMPIObjectPath* op, const char* via, const char* result_class,
+                                const char* role, const char* result_role, const char** properties,
                                 CMPIStatus* status) noexcept {
     return walk_up(broker, context, op, "associators", Walk::associators,
                    {or_empty(via), or_empty(result_class), or_empty(role), or_empty(result_role)},
@@ -378,8 +376,8 @@ CMPIContext* prepare_thread(const CMPIBroker* broker, const CMPIContext* context
     auto copy = std::make_unique<ContextBody>(*body);
     copy->for_thread = true;
     copy->attached = false;
-    Object* object = create_object(*core, Kind::context, &ContextBody::table, std::move(copy),
-                                   core->contexts);
+    Object* object =
+        create_object(*core, Kind::context, &ContextBody::table, std::move(copy), core->contexts);
     object->parameter = true; // goes with detachThread, not with release
     return reinterpret_cast<CMPIContext*>(object);
 }

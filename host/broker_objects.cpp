@@ -18,8 +18,7 @@ Core* use(const CMPIBroker* broker, const char* function, CMPIStatus* status) {
     return core;
 }
 
-std::nullptr_t refuse(Core* core, CMPIStatus* status, CMPIrc rc, FaultKind kind,
-                      std::string text) {
+std::nullptr_t refuse(Core* core, CMPIStatus* status, CMPIrc rc, FaultKind kind, std::string text) {
     report(core, kind, std::move(text));
     put(status, rc);
     return nullptr;
@@ -173,8 +172,8 @@ CMPIString* object_text(const CMPIBroker* broker, const void* pointer,
     case Kind::datetime:
         return new_string(*core, static_cast<const DateTimeBody*>(object->body)->text);
     case Kind::object_path:
-        return new_string(
-            *core, path_to_text(static_cast<const ObjectPathBody*>(object->body)->path, ""));
+        return new_string(*core,
+                          path_to_text(static_cast<const ObjectPathBody*>(object->body)->path, ""));
     case Kind::instance:
         return new_string(
             *core,
@@ -275,22 +274,11 @@ CMPIStatus trace_message(const CMPIBroker* broker, int, const char* component, c
 
 } // namespace
 
-const CMPIBrokerEncFT object_functions = {CMPIVersion100,
-                                          new_instance,
-                                          new_path,
-                                          new_args,
-                                          new_text,
-                                          new_array,
-                                          new_datetime,
-                                          new_datetime_binary,
-                                          new_datetime_chars,
-                                          new_select,
-                                          class_path_is_a,
-                                          object_text,
-                                          is_of_type,
-                                          object_type,
-                                          message,
-                                          log_message,
-                                          trace_message};
+const CMPIBrokerEncFT object_functions = {
+    CMPIVersion100,     new_instance, new_path,        new_args,
+    new_text,           new_array,    new_datetime,    new_datetime_binary,
+    new_datetime_chars, new_select,   class_path_is_a, object_text,
+    is_of_type,         object_type,  message,         log_message,
+    trace_message};
 
 } // namespace host

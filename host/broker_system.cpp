@@ -1,6 +1,7 @@
 // The table of operating system services: thin, over POSIX threads.
 //
-// Handles are heap objects of ours, or the thread's own identifier; a provider destroys what it makes.
+// Handles are heap objects of ours, or the thread's own identifier; a provider destroys what it
+// makes.
 
 #include "host/broker.h"
 
@@ -37,8 +38,7 @@ void* new_thread(void* (*start)(void*), void* argument, int detached) noexcept {
     pthread_t thread{};
     const int failed = pthread_create(&thread, &attributes, start, argument);
     pthread_attr_destroy(&attributes);
-    return failed ? nullptr
-                  : reinterpret_cast<void*>(static_cast<std::uintptr_t>(thread));
+    return failed ? nullptr : reinterpret_cast<void*>(static_cast<std::uintptr_t>(thread));
 }
 
 int join_thread(void* thread, void** value) noexcept {
@@ -133,11 +133,11 @@ int signal_condition(void* condition) noexcept {
 } // namespace
 
 const CMPIBrokerExtFT system_functions = {
-    CMPIVersion100,    resolve_file_name,    new_thread,          join_thread,
-    exit_thread,       cancel_thread,        thread_sleep,        thread_once,
-    create_thread_key, destroy_thread_key,   thread_specific,     set_thread_specific,
-    new_mutex,         destroy_mutex,        lock_mutex,          unlock_mutex,
-    new_condition,     destroy_condition,    wait_condition,      wait_condition_until,
+    CMPIVersion100,    resolve_file_name,  new_thread,      join_thread,
+    exit_thread,       cancel_thread,      thread_sleep,    thread_once,
+    create_thread_key, destroy_thread_key, thread_specific, set_thread_specific,
+    new_mutex,         destroy_mutex,      lock_mutex,      unlock_mutex,
+    new_condition,     destroy_condition,  wait_condition,  wait_condition_until,
     signal_condition};
 
 } // namespace host

@@ -5,8 +5,8 @@ namespace host {
 namespace {
 
 constexpr CMPIType CMPI_TYPES[] = {
-    CMPI_boolean, CMPI_uint8,  CMPI_sint8,  CMPI_uint16, CMPI_sint16,
-    CMPI_uint32,  CMPI_sint32, CMPI_uint64, CMPI_sint64, CMPI_real32,
+    CMPI_boolean, CMPI_uint8,  CMPI_sint8,  CMPI_uint16,   CMPI_sint16,
+    CMPI_uint32,  CMPI_sint32, CMPI_uint64, CMPI_sint64,   CMPI_real32,
     CMPI_real64,  CMPI_char16, CMPI_string, CMPI_dateTime, CMPI_ref,
 };
 static_assert(std::size(CMPI_TYPES) == static_cast<std::size_t>(mof::Type::reference) + 1);
@@ -85,8 +85,10 @@ void ClassRepository::fill(Class& target, const mof::Schema_Class& source) {
     target.text = source.declaration->text;
     for (const mof::Schema_Feature& feature : source.features) {
         if (feature.kind() == mof::Feature_Kind::method) {
-            Method method{feature.name(), slot(*feature.feature),
-                          mof::is_true(feature.feature->qualifiers, "Static"), {}};
+            Method method{feature.name(),
+                          slot(*feature.feature),
+                          mof::is_true(feature.feature->qualifiers, "Static"),
+                          {}};
             for (const mof::Parameter& parameter : feature.feature->parameters)
                 method.parameters.push_back(
                     {slot(parameter), parameter.name, parameter.is_in(), parameter.is_out()});

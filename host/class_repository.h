@@ -1,6 +1,7 @@
 // The classes that the object manager knows, read from MOF, in the form that its checks need.
 //
-// Built once, then read by any number of threads. Pointers to classes hold as long as the repository.
+// Built once, then read by any number of threads. Pointers to classes hold as long as the
+// repository.
 #ifndef HOST_CLASS_REPOSITORY_H
 #define HOST_CLASS_REPOSITORY_H
 

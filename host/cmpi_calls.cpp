@@ -1,4 +1,5 @@
-// The tables of what goes with a call: arguments, results, enumerations, contexts, select expressions.
+// The tables of what goes with a call: arguments, results, enumerations, contexts, select
+// expressions.
 
 #include "host/core.h"
 #include "host/value_check.h"
@@ -39,8 +40,7 @@ namespace {
 CMPIrc check_output(Core& core, const Method& method, const char* name, Value& value) {
     const Parameter* parameter = method.find(name);
     if (!parameter || !parameter->out) {
-        report(&core, FaultKind::bad_output,
-               "addArg: " + method.name + " has no output " + name);
+        report(&core, FaultKind::bad_output, "addArg: " + method.name + " has no output " + name);
         return CMPI_RC_ERR_INVALID_PARAMETER;
     }
     if (Complaint wrong = check_value(core.classes, *parameter, value)) {
@@ -107,7 +107,7 @@ ResultBody* use_result(const CMPIResult* result, Answer answer, const char* func
     ResultBody* body = body_of<ResultBody>(result, function);
     if (!body)
         return nullptr;
-    const char* wrong = body->done                ? " after returnDone"
+    const char* wrong = body->done               ? " after returnDone"
                         : body->answer != answer ? " in a call that answers something else"
                                                  : nullptr;
     if (wrong)
@@ -221,9 +221,9 @@ CMPIResult* result_clone(const CMPIResult* result, CMPIStatus* status) noexcept 
 
 } // namespace
 
-const CMPIResultFT ResultBody::table = {
-    CMPIVersion100, release<ResultBody>, result_clone, result_data,
-    result_instance, result_path,        result_done};
+const CMPIResultFT ResultBody::table = {CMPIVersion100, release<ResultBody>, result_clone,
+                                        result_data,    result_instance,     result_path,
+                                        result_done};
 
 // ---- CMPIEnumeration ----
 
@@ -258,9 +258,9 @@ CMPIArray* enumeration_array(const CMPIEnumeration* enumeration, CMPIStatus* sta
 
 } // namespace
 
-const CMPIEnumerationFT EnumerationBody::table = {
-    CMPIVersion100,   release<EnumerationBody>, clone<EnumerationBody>,
-    enumeration_next, enumeration_has_next,     enumeration_array};
+const CMPIEnumerationFT EnumerationBody::table = {CMPIVersion100,         release<EnumerationBody>,
+                                                  clone<EnumerationBody>, enumeration_next,
+                                                  enumeration_has_next,   enumeration_array};
 
 // ---- CMPIContext ----
 
@@ -303,9 +303,9 @@ CMPIStatus context_add(const CMPIContext* context, const char* name, const CMPIV
 
 } // namespace
 
-const CMPIContextFT ContextBody::table = {
-    CMPIVersion100,   release<ContextBody>, clone<ContextBody>, context_entry,
-    context_entry_at, context_count,        context_add};
+const CMPIContextFT ContextBody::table = {CMPIVersion100, release<ContextBody>, clone<ContextBody>,
+                                          context_entry,  context_entry_at,     context_count,
+                                          context_add};
 
 // ---- CMPISelectExp: carries its text; conditions are not evaluated here ----
 

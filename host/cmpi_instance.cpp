@@ -62,8 +62,8 @@ CMPICount instance_property_count(const CMPIInstance* inst, CMPIStatus* status) 
     return count;
 }
 
-CMPIStatus instance_set_property(const CMPIInstance* inst, const char* name,
-                                 const CMPIValue* value, CMPIType type) noexcept {
+CMPIStatus instance_set_property(const CMPIInstance* inst, const char* name, const CMPIValue* value,
+                                 CMPIType type) noexcept {
     InstanceBody* body = use(inst, "setProperty", nullptr);
     if (!body)
         return answer(CMPI_RC_ERR_INVALID_HANDLE);
@@ -131,15 +131,9 @@ CMPIStatus instance_set_path(CMPIInstance* inst, const CMPIObjectPath* op) noexc
 
 } // namespace
 
-const CMPIInstanceFT InstanceBody::table = {CMPIVersion100,
-                                            release<InstanceBody>,
-                                            clone<InstanceBody>,
-                                            instance_property,
-                                            instance_property_at,
-                                            instance_property_count,
-                                            instance_set_property,
-                                            instance_path,
-                                            instance_filter,
-                                            instance_set_path};
+const CMPIInstanceFT InstanceBody::table = {
+    CMPIVersion100,       release<InstanceBody>,   clone<InstanceBody>,   instance_property,
+    instance_property_at, instance_property_count, instance_set_property, instance_path,
+    instance_filter,      instance_set_path};
 
 } // namespace host

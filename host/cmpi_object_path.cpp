@@ -142,7 +142,8 @@ CMPIString* path_text(const CMPIObjectPath* op, CMPIStatus* status) noexcept {
 
 } // namespace
 
-// The functions for qualifiers are optional in the interface, and real object managers leave them out.
+// The functions for qualifiers are optional in the interface, and real object managers leave them
+// out.
 const CMPIObjectPathFT ObjectPathBody::table = {CMPIVersion100,
                                                 release<ObjectPathBody>,
                                                 clone<ObjectPathBody>,

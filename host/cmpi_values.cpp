@@ -122,8 +122,8 @@ CMPIStatus array_set(CMPIArray* array, CMPICount index, const CMPIValue* value,
 
 } // namespace
 
-const CMPIArrayFT ArrayBody::table = {
-    CMPIVersion100, release<ArrayBody>, clone<ArrayBody>, array_size,
-    array_type,     array_element,      array_set};
+const CMPIArrayFT ArrayBody::table = {CMPIVersion100, release<ArrayBody>, clone<ArrayBody>,
+                                      array_size,     array_type,         array_element,
+                                      array_set};
 
 } // namespace host

@@ -30,8 +30,8 @@ public:
     FaultList faults;
     Counters counters;
 
-    // Objects that belong to no call: results of clone, contexts for threads, and what was made where
-    // nothing may be made.
+    // Objects that belong to no call: results of clone, contexts for threads, and what was made
+    // where nothing may be made.
     Arena clones;
     Arena contexts;
     Arena strays;
@@ -54,8 +54,8 @@ public:
     // Records what is alive as leaks and frees it.
     void report_leaks();
 
-    // The manager that a fault is reported to when its object cannot tell: that of the running call,
-    // else the youngest one; null if there is none.
+    // The manager that a fault is reported to when its object cannot tell: that of the running
+    // call, else the youngest one; null if there is none.
     static Core* any();
 };
 

@@ -72,9 +72,8 @@ std::size_t FaultList::count() const {
 
 std::size_t FaultList::count(FaultKind kind) const {
     const std::lock_guard lock(_mutex);
-    return static_cast<std::size_t>(
-        std::count_if(_faults.begin(), _faults.end(),
-                      [kind](const Fault& fault) { return fault.kind == kind; }));
+    return static_cast<std::size_t>(std::count_if(
+        _faults.begin(), _faults.end(), [kind](const Fault& fault) { return fault.kind == kind; }));
 }
 
 void FaultList::clear() {

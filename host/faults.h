@@ -13,14 +13,14 @@
 namespace host {
 
 enum class FaultKind {
-    unknown_class,      // an object of a class that the schema does not have
-    unknown_property,   // a property or key that the class does not have
-    type_mismatch,      // a value of another type than declared, or a reference to another class
-    bad_path,           // an object path with a missing or unknown key where a complete one is needed
-    bad_argument,       // a null, a size or a code that no caller may give
-    wrong_result,       // a result of the wrong kind or class, or after returnDone
-    bad_output,         // an output that the method does not have, or of another type
-    double_release,     // release of an object that was released before
+    unknown_class,    // an object of a class that the schema does not have
+    unknown_property, // a property or key that the class does not have
+    type_mismatch,    // a value of another type than declared, or a reference to another class
+    bad_path,         // an object path with a missing or unknown key where a complete one is needed
+    bad_argument,     // a null, a size or a code that no caller may give
+    wrong_result,     // a result of the wrong kind or class, or after returnDone
+    bad_output,       // an output that the method does not have, or of another type
+    double_release,   // release of an object that was released before
     use_after_release,  // use of an object that was released, or that went with its call
     foreign_object,     // a pointer to something that the object manager never made, or overwrote
     released_parameter, // release of a parameter of the call

@@ -2,9 +2,9 @@
 //
 // It knows the classes from MOF, hands the provider only what the interface promises, checks
 // everything that comes back, frees what a call leaves behind, and keeps a list of the provider's
-// faults. Up-calls are answered from platform instances and, for classes of the module itself, by the
-// providers. Any number of threads may use a manager at once, also while a module is in a long call;
-// load and close are called by one thread, with no call running.
+// faults. Up-calls are answered from platform instances and, for classes of the module itself, by
+// the providers. Any number of threads may use a manager at once, also while a module is in a long
+// call; load and close are called by one thread, with no call running.
 #ifndef HOST_MANAGER_H
 #define HOST_MANAGER_H
 
@@ -31,7 +31,8 @@ struct Options {
     // Where, beside name_space, up-calls reach the providers of the module.
     std::vector<std::string> more_name_spaces = {"root/pg_interop"};
     std::string principal = "root";
-    // Released texts are overwritten and kept for a while, so that a late use is seen, and harmless.
+    // Released texts are overwritten and kept for a while, so that a late use is seen, and
+    // harmless.
     bool strict = true;
     // Microseconds since the epoch, for new datetimes; empty: the system's clock.
     std::function<std::uint64_t()> clock;
@@ -56,7 +57,8 @@ struct Reply {
 using Property_List = std::optional<std::vector<std::string>>;
 
 // Empty texts: no restriction. Without via, every association class of the module that can have the
-// instance at an end is asked, in the order of the catalogue; a base class stands for its subclasses.
+// instance at an end is asked, in the order of the catalogue; a base class stands for its
+// subclasses.
 struct Association_Filter {
     std::string via;
     std::string result_class;
@@ -84,7 +86,7 @@ struct Statistics {
     std::size_t calls = 0;           // into the module
     std::size_t up_calls = 0;        // from it
     std::size_t objects_created = 0; // CMPI objects
-    std::size_t objects_left = 0;    // of these, freed by the end of their call, parameters included
+    std::size_t objects_left = 0; // of these, freed by the end of their call, parameters included
 };
 
 class Manager {
@@ -97,8 +99,8 @@ public:
 
     // Opens a module; its providers are made at the first call for their class. One at a time.
     Status load(const std::string& module_path);
-    // Calls cleanup for every interface that was made. Terminating or not, a provider that agrees is
-    // made anew at its next call. Answers the first code that is not OK.
+    // Calls cleanup for every interface that was made. Terminating or not, a provider that agrees
+    // is made anew at its next call. Answers the first code that is not OK.
     Status cleanup(bool terminating);
     // Cleans up, unloads the module, records what is still alive as leaks and frees it.
     void close();
@@ -112,7 +114,8 @@ public:
     Parsed_Path parse_path(std::string_view text) const;
 
     // An empty namespace stands for options().name_space. A class without a provider is served from
-    // the platform. An unknown class is CMPI_RC_ERR_INVALID_CLASS; nothing of that reaches a provider.
+    // the platform. An unknown class is CMPI_RC_ERR_INVALID_CLASS; nothing of that reaches a
+    // provider.
     Reply<std::vector<Instance>> enumerate(const std::string& class_name,
                                            const Property_List& properties = std::nullopt,
                                            const std::string& name_space = "");
@@ -136,7 +139,8 @@ public:
     Reply<std::vector<ObjectPath>> reference_names(const ObjectPath& path,
                                                    const Association_Filter& filter = {});
 
-    // A method without the qualifier Static needs a complete path. Inputs are checked by the method.
+    // A method without the qualifier Static needs a complete path. Inputs are checked by the
+    // method.
     Reply<Method_Result> invoke(const ObjectPath& path, const std::string& method,
                                 const Named_Values& inputs);
 

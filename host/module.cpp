@@ -53,15 +53,14 @@ Provider& Module::provider(const Class& known) {
 namespace {
 
 Status no_provider(const Class& known, const char* kind) {
-    return {CMPI_RC_ERR_NOT_SUPPORTED,
-            "the module has no provider for this kind of request (" + std::string(kind) + ") to " +
-                known.name};
+    return {CMPI_RC_ERR_NOT_SUPPORTED, "the module has no provider for this kind of request (" +
+                                           std::string(kind) + ") to " + known.name};
 }
 
 // The tables must be of this level, as every slot is called without further ado.
 template <class MI>
 bool is_usable(Core& core, const Class& known, const MI* made) {
-    const char* wrong = !made->ft ? "without a function table"
+    const char* wrong = !made->ft                              ? "without a function table"
                         : made->ft->ftVersion < CMPIVersion100 ? "with a table below level 1.00"
                         : !made->ft->cleanup                   ? "without a cleanup function"
                                                                : nullptr;

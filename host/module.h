@@ -48,7 +48,8 @@ public:
     CMPIAssociationMI* association(Core& core, const Class& known, Status& status);
     CMPIMethodMI* method(Core& core, const Class& known, Status& status);
 
-    // Calls cleanup of every interface; those that agree are forgotten. The first code that is not OK.
+    // Calls cleanup of every interface; those that agree are forgotten. The first code that is not
+    // OK.
     Status cleanup(Core& core, bool terminating);
 
 private:

@@ -10,10 +10,9 @@
 namespace host {
 
 const char* to_string(Kind kind) {
-    constexpr const char* names[] = {"CMPIString",      "CMPIArray",    "CMPIDateTime",
-                                     "CMPIObjectPath",  "CMPIInstance", "CMPIArgs",
-                                     "CMPIResult",      "CMPIEnumeration", "CMPIContext",
-                                     "CMPISelectExp"};
+    constexpr const char* names[] = {
+        "CMPIString", "CMPIArray",  "CMPIDateTime",    "CMPIObjectPath", "CMPIInstance",
+        "CMPIArgs",   "CMPIResult", "CMPIEnumeration", "CMPIContext",    "CMPISelectExp"};
     static_assert(std::size(names) == KIND_COUNT);
     return names[static_cast<std::size_t>(kind)];
 }
@@ -32,8 +31,7 @@ constexpr std::size_t RESTING_SLOTS = 4096;   // released slots that are not use
 constexpr std::size_t RESTING_BODIES = 1024;
 
 struct Chunk {
-    static constexpr std::size_t slots =
-        (CHUNK_SIZE - sizeof(std::size_t)) / sizeof(Object);
+    static constexpr std::size_t slots = (CHUNK_SIZE - sizeof(std::size_t)) / sizeof(Object);
     std::size_t used = 0;
     Object objects[slots];
 };

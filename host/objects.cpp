@@ -199,8 +199,8 @@ std::optional<Value> read_array(const CMPIArray* pointer, const char* use) {
     if (!body)
         return std::nullopt;
     for (const ArrayBody::Held& held : body->held) {
-        if (held.object && (held.object->state.load() != Object::live ||
-                            held.object->serial != held.serial)) {
+        if (held.object &&
+            (held.object->state.load() != Object::live || held.object->serial != held.serial)) {
             report(&core_of(pointer), FaultKind::stale_element,
                    "an element was released before the array was used");
             break;
@@ -268,13 +268,11 @@ bool is_chars(CMPIType type) {
 
 } // namespace
 
-std::optional<Value> from_cmpi(Core& core, const CMPIValue* value, CMPIType type,
-                               const char* use) {
+std::optional<Value> from_cmpi(Core& core, const CMPIValue* value, CMPIType type, const char* use) {
     const auto element = static_cast<CMPIType>(type & ~CMPI_ARRAY);
     if (!value) // a null of the type meant
-        return Value::null(is_chars(element)
-                               ? static_cast<CMPIType>(CMPI_string | (type & CMPI_ARRAY))
-                               : type);
+        return Value::null(
+            is_chars(element) ? static_cast<CMPIType>(CMPI_string | (type & CMPI_ARRAY)) : type);
     if ((type & CMPI_ARRAY) != 0)
         return value->array ? read_array(value->array, use) : Value::null(type);
     switch (type) {

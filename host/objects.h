@@ -1,7 +1,8 @@
 // The CMPI objects of this object manager, a body and a function table for each kind.
 //
-// A table function may be handed anything by a provider: it examines the pointer first, and a bad one
-// is a fault of the provider and CMPI_RC_ERR_INVALID_HANDLE. Running out of memory ends the process.
+// A table function may be handed anything by a provider: it examines the pointer first, and a bad
+// one is a fault of the provider and CMPI_RC_ERR_INVALID_HANDLE. Running out of memory ends the
+// process.
 #ifndef HOST_OBJECTS_H
 #define HOST_OBJECTS_H
 
@@ -141,14 +142,14 @@ Arena& arena_for(Core& core, Owner owner);
 
 template <class B>
 typename B::Cmpi* make(Core& core, B body, Owner owner = Owner::call) {
-    Object* object = create_object(core, B::kind, &B::table,
-                                   std::make_unique<B>(std::move(body)), arena_for(core, owner));
+    Object* object = create_object(core, B::kind, &B::table, std::make_unique<B>(std::move(body)),
+                                   arena_for(core, owner));
     object->parameter = owner == Owner::parameter;
     return reinterpret_cast<typename B::Cmpi*>(object);
 }
 
-// Examines a pointer that a provider handed in. Null, after a fault was recorded, if it is not a live
-// object of the kind; use names the function for the report.
+// Examines a pointer that a provider handed in. Null, after a fault was recorded, if it is not a
+// live object of the kind; use names the function for the report.
 Object* examine_use(const void* pointer, Kind kind, const char* use);
 
 template <class B>
@@ -191,14 +192,14 @@ CMPIString* new_string(Core& core, std::string text);
 
 // ---- Between host values and CMPI data ----
 
-// A value with an object of the call for everything that is one. Keys are flagged as such, and integers
-// among them come in their widest form, as many object managers hand them over.
+// A value with an object of the call for everything that is one. Keys are flagged as such, and
+// integers among them come in their widest form, as many object managers hand them over.
 CMPIData to_data(Core& core, const Value& value);
 CMPIData to_key_data(Core& core, const Value& value);
 CMPIData missing_data(CMPIType type = CMPI_null);
 
-// Reads what a provider gave. Nothing for a type that cannot be given or an object that is not usable;
-// a fault is recorded then.
+// Reads what a provider gave. Nothing for a type that cannot be given or an object that is not
+// usable; a fault is recorded then.
 std::optional<Value> from_cmpi(Core& core, const CMPIValue* value, CMPIType type, const char* use);
 
 // The contents of an instance object, path and properties in the order of the class.

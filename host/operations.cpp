@@ -94,8 +94,8 @@ Reply<std::vector<Instance>> enumerate(Core& core, const Target& target,
     if (target.platform) {
         for (Instance& found :
              core.platform.instances(target.name_space, *target.known, core.classes))
-            reply.value.push_back(filtered(*core.classes.find(found.class_name()),
-                                           std::move(found), properties));
+            reply.value.push_back(
+                filtered(*core.classes.find(found.class_name()), std::move(found), properties));
         return reply;
     }
     CMPIInstanceMI* mi = core.module.instance(core, *target.known, reply.status);
@@ -146,9 +146,9 @@ Reply<Instance> get(Core& core, const Target& target, const ObjectPath& path,
     if (!mi)
         return reply;
     Request request(core, *target.known, "getInstance", target.name_space);
-    reply.status = request.finish(mi->ft->getInstance(
-        mi, request.context(), request.result(Answer::instances, target.known), request.path(path),
-        request.property_list(properties)));
+    reply.status = request.finish(
+        mi->ft->getInstance(mi, request.context(), request.result(Answer::instances, target.known),
+                            request.path(path), request.property_list(properties)));
     std::vector<Instance>& found = request.answered().instances;
     if (reply.ok() && found.size() != 1) {
         if (!found.empty())
@@ -168,9 +168,9 @@ Reply<ObjectPath> create(Core& core, const Target& target, const Instance& insta
     if (!mi)
         return reply;
     Request request(core, *target.known, "createInstance", target.name_space);
-    reply.status = request.finish(mi->ft->createInstance(
-        mi, request.context(), request.result(Answer::paths, target.known),
-        request.path(instance.path), request.instance(instance)));
+    reply.status = request.finish(
+        mi->ft->createInstance(mi, request.context(), request.result(Answer::paths, target.known),
+                               request.path(instance.path), request.instance(instance)));
     if (reply.ok() && !request.answered().paths.empty())
         reply.value = std::move(request.answered().paths.front());
     return reply;
@@ -185,10 +185,10 @@ Status modify(Core& core, const Target& target, const Instance& instance,
     if (!mi)
         return status;
     Request request(core, *target.known, "modifyInstance", target.name_space);
-    return request.finish(mi->ft->modifyInstance(
-        mi, request.context(), request.result(Answer::paths, target.known),
-        request.path(instance.path), request.instance(instance),
-        request.property_list(properties)));
+    return request.finish(
+        mi->ft->modifyInstance(mi, request.context(), request.result(Answer::paths, target.known),
+                               request.path(instance.path), request.instance(instance),
+                               request.property_list(properties)));
 }
 
 Status remove(Core& core, const Target& target, const ObjectPath& path) {
@@ -199,9 +199,8 @@ Status remove(Core& core, const Target& target, const ObjectPath& path) {
     if (!mi)
         return status;
     Request request(core, *target.known, "deleteInstance", target.name_space);
-    return request.finish(mi->ft->deleteInstance(mi, request.context(),
-                                                 request.result(Answer::nothing, nullptr),
-                                                 request.path(path)));
+    return request.finish(mi->ft->deleteInstance(
+        mi, request.context(), request.result(Answer::nothing, nullptr), request.path(path)));
 }
 
 // ---- Methods ----
@@ -213,17 +212,17 @@ Reply<Method_Result> invoke(Core& core, const Target& target, const ObjectPath& 
         return {{CMPI_RC_ERR_METHOD_NOT_AVAILABLE, "the platform offers no methods"}, {}};
     const Method* called = target.known->find_method(method);
     if (!called) // known to the caller's checks; kept for up-calls
-        return {{CMPI_RC_ERR_METHOD_NOT_FOUND, target.known->name + " has no method " + method}, {}};
+        return {{CMPI_RC_ERR_METHOD_NOT_FOUND, target.known->name + " has no method " + method},
+                {}};
     CMPIMethodMI* mi = core.module.method(core, *target.known, reply.status);
     if (!mi)
         return reply;
     Request request(core, *target.known, "invokeMethod", target.name_space);
     CMPIArgs* in = request.args(inputs);
     CMPIArgs* out = request.args({}, called);
-    reply.status = request.finish(
-        mi->ft->invokeMethod(mi, request.context(),
-                             request.result(Answer::data, nullptr, &called->result),
-                             request.path(path), called->name.c_str(), in, out));
+    reply.status = request.finish(mi->ft->invokeMethod(
+        mi, request.context(), request.result(Answer::data, nullptr, &called->result),
+        request.path(path), called->name.c_str(), in, out));
     const ResultBody& answered = request.answered();
     reply.value.value = answered.data ? *answered.data : Value::null(called->result.type);
     reply.value.outputs = request.outputs().values;

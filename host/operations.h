@@ -1,7 +1,7 @@
 // The operations of a manager, once for its clients and once more for up-calls.
 //
-// Each call here runs one provider, which is chosen already. Complete checks of what the client gave
-// come before; what the provider answers was checked by the time it comes back.
+// Each call here runs one provider, which is chosen already. Complete checks of what the client
+// gave come before; what the provider answers was checked by the time it comes back.
 #ifndef HOST_OPERATIONS_H
 #define HOST_OPERATIONS_H
 

@@ -47,8 +47,8 @@ Plan make_plan(Core& core, const ObjectPath& path, const Association_Filter& fil
     plan.source = core.classes.find(path.class_name);
     const Class* via = core.classes.find(filter.via);
     plan.result_class = core.classes.find(filter.result_class);
-    for (const auto& [given, found] : {std::pair(&filter.via, via),
-                                       std::pair(&filter.result_class, plan.result_class)})
+    for (const auto& [given, found] :
+         {std::pair(&filter.via, via), std::pair(&filter.result_class, plan.result_class)})
         if (!given->empty() && !found)
             plan.status = {CMPI_RC_ERR_INVALID_CLASS, "unknown class " + *given};
     if (plan.status.ok() && via && !via->is_association)
@@ -56,10 +56,11 @@ Plan make_plan(Core& core, const ObjectPath& path, const Association_Filter& fil
     if (!plan.status.ok())
         return plan;
     for (const auto& known : core.classes.classes()) {
-        // An association that was named is asked in any case: what it answers is the provider's part.
+        // An association that was named is asked in any case: what it answers is the provider's
+        // part.
         const bool asked =
-            via ? known->is_a(via) && (known.get() == via || can_reach(*known, *plan.source, filter,
-                                                                       plan.result_class))
+            via ? known->is_a(via) && (known.get() == via ||
+                                       can_reach(*known, *plan.source, filter, plan.result_class))
                 : can_reach(*known, *plan.source, filter, plan.result_class);
         if (asked && core.module.serves_association(*known))
             plan.associations.push_back(known.get());
@@ -104,8 +105,8 @@ Status ask(Core& core, const Plan& plan, const Class& association, Walk what, bo
         cmpi_status =
             ft.associatorNames(mi, context, result, path, via, result_class, role, result_role);
     else
-        cmpi_status = ft.associators(mi, context, result, path, via, result_class, role,
-                                     result_role, list);
+        cmpi_status =
+            ft.associators(mi, context, result, path, via, result_class, role, result_role, list);
     status = request.finish(cmpi_status);
     ResultBody& answered = request.answered();
     std::move(answered.instances.begin(), answered.instances.end(), std::back_inserter(instances));
@@ -123,9 +124,9 @@ Status ask_all(Core& core, const ObjectPath& path, Walk what, bool names,
         Status status =
             ask(core, plan, *association, what, names, filter, properties, instances, paths);
         if (first.ok() && !status.ok())
-            first = {status.rc, association->name + ": " + (status.message.empty()
-                                                                ? rc_sentence(status.rc)
-                                                                : status.message)};
+            first = {status.rc,
+                     association->name + ": " +
+                         (status.message.empty() ? rc_sentence(status.rc) : status.message)};
     }
     return first;
 }

@@ -1,8 +1,8 @@
 // Object paths as text: namespace:Class.Key="value",Other=5,End="Class.Key=\"nested\"".
 //
 // This is the form of the DMTF's DSP0004 for the name of an object without a host part. A text is
-// quoted, with the escapes of MOF; a reference is the quoted text of its path; so whatever bytes a key
-// holds, the text is one line and reads back the same.
+// quoted, with the escapes of MOF; a reference is the quoted text of its path; so whatever bytes a
+// key holds, the text is one line and reads back the same.
 #ifndef HOST_PATH_TEXT_H
 #define HOST_PATH_TEXT_H
 

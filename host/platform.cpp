@@ -73,8 +73,8 @@ Instance read_instance(const Item& item, const ClassRepository& classes) {
     const std::string class_name = item.text("class");
     const Class* known = classes.find(class_name);
     if (!known)
-        item.fail("class", "unknown class " + class_name +
-                               did_you_mean(class_name, classes.names()));
+        item.fail("class",
+                  "unknown class " + class_name + did_you_mean(class_name, classes.names()));
     instance.path.class_name = known->name;
     const Json* properties = item.part("properties");
     if (!properties)
@@ -104,8 +104,7 @@ void Platform::read(const std::string& path, ClassRepository& classes) {
     read_text(*text, path, classes);
 }
 
-void Platform::read_text(std::string_view text, const std::string& name,
-                         ClassRepository& classes) {
+void Platform::read_text(std::string_view text, const std::string& name, ClassRepository& classes) {
     const Located_Json file = parse_located_json(text, name);
     const Json* instances = &file.value;
     std::string prefix;
@@ -145,8 +144,9 @@ std::vector<Instance> Platform::instances(std::string_view name_space, const Cla
 }
 
 const Instance* Platform::find(const ObjectPath& path) const {
-    const auto found = std::find_if(_instances.begin(), _instances.end(),
-                                    [&](const Instance& instance) { return instance.path == path; });
+    const auto found =
+        std::find_if(_instances.begin(), _instances.end(),
+                     [&](const Instance& instance) { return instance.path == path; });
     return found == _instances.end() ? nullptr : &*found;
 }
 

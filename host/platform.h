@@ -1,8 +1,8 @@
 // Instances of the platform's own classes, from a file, as up-calls find them.
 //
 // The file is JSON: a list of {"namespace", "class", "properties"}, or an object with that list as
-// "instances" and, as "classes", a list of {"name", "superclass"} for classes that the schema does not
-// have. Properties are typed by the class. Read once, then used by any number of threads.
+// "instances" and, as "classes", a list of {"name", "superclass"} for classes that the schema does
+// not have. Properties are typed by the class. Read once, then used by any number of threads.
 #ifndef HOST_PLATFORM_H
 #define HOST_PLATFORM_H
 

@@ -71,12 +71,11 @@ Status Request::finish(CMPIStatus status) {
     if (status.msg)
         if (const StringBody* text = body_of<StringBody>(status.msg, "the text of a status"))
             result.message = text->text;
-    _call.core.trace("     " + _call.class_name + " " + _call.operation + ": " +
-                     rc_name(result.rc) +
-                     (_result ? ", " + std::to_string(_result->instances.size() +
-                                                      _result->paths.size()) +
-                                    " answers"
-                              : ""));
+    _call.core.trace(
+        "     " + _call.class_name + " " + _call.operation + ": " + rc_name(result.rc) +
+        (_result
+             ? ", " + std::to_string(_result->instances.size() + _result->paths.size()) + " answers"
+             : ""));
     return result;
 }
 

@@ -17,7 +17,8 @@ public:
     CMPIInstance* instance(const Instance& instance);
     CMPIArgs* args(Named_Values values, const Method* outputs_of = nullptr);
     CMPIResult* result(Answer answer, const Class* of_class, const Slot_Type* data_type = nullptr);
-    // A null-terminated list for the provider, null for no restriction; lives as long as the request.
+    // A null-terminated list for the provider, null for no restriction; lives as long as the
+    // request.
     const char** property_list(const Property_List& properties);
 
     // The provider's status with its text.

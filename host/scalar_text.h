@@ -9,9 +9,9 @@ namespace host {
 // A boolean ("TRUE"), number or character code; reals have a point or an exponent.
 std::string number_to_text(const Value& value);
 
-// A scalar of the type from its text: decimal or 0x numbers, TRUE or FALSE in any case, a datetime in
-// 25 characters, a string as it stands. References and objects are not read here. What is wrong goes
-// to error.
+// A scalar of the type from its text: decimal or 0x numbers, TRUE or FALSE in any case, a datetime
+// in 25 characters, a string as it stands. References and objects are not read here. What is wrong
+// goes to error.
 Value scalar_from_text(CMPIType type, std::string_view text, std::string& error);
 
 } // namespace host

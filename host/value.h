@@ -24,9 +24,9 @@ struct Instance;
 // always CMPI_string, however they were handed in.
 struct Value {
     using Array = std::vector<Value>; // elements have the element type; some may be null
-    using Data = std::variant<std::monostate, bool, std::uint64_t, std::int64_t, double,
-                              std::string, std::shared_ptr<const ObjectPath>,
-                              std::shared_ptr<const Instance>, Array>;
+    using Data =
+        std::variant<std::monostate, bool, std::uint64_t, std::int64_t, double, std::string,
+                     std::shared_ptr<const ObjectPath>, std::shared_ptr<const Instance>, Array>;
 
     CMPIType type = CMPI_null;
     Data data; // uint64_t also for char16, string also for a datetime in its 25 characters

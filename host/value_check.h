@@ -1,7 +1,7 @@
 // Fitting values to what a class declares: types, ranges, classes of references, keys of paths.
 //
-// Every function says in plain words what is wrong, or nothing when all is well; the words fit behind
-// the name of the thing that was set ("uint16 expected, got string").
+// Every function says in plain words what is wrong, or nothing when all is well; the words fit
+// behind the name of the thing that was set ("uint16 expected, got string").
 #ifndef HOST_VALUE_CHECK_H
 #define HOST_VALUE_CHECK_H
 
@@ -20,7 +20,8 @@ Complaint check_value(const ClassRepository& classes, const Slot_Type& slot, Val
 Complaint check_key(const ClassRepository& classes, const Property& property, Value& value);
 
 // A complete name of an object: the class is known, all its keys are there and not null, no other
-// ones, references in it included. Puts names into the spelling of the class and keys into its order.
+// ones, references in it included. Puts names into the spelling of the class and keys into its
+// order.
 Complaint check_path(const ClassRepository& classes, ObjectPath& path);
 
 } // namespace host

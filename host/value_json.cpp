@@ -75,8 +75,8 @@ Value number_from_json(CMPIType type, const Json& json) {
     if (json.is_number_integer() && !json.is_number_unsigned() &&
         fits_signed(type, json.get<std::int64_t>()))
         return Value::signed_number(type, json.get<std::int64_t>());
-    refuse("", json.dump(-1, ' ', false, Json::error_handler_t::replace) + " is no " +
-                   type_name(type));
+    refuse("",
+           json.dump(-1, ' ', false, Json::error_handler_t::replace) + " is no " + type_name(type));
 }
 
 Value scalar_from_json(const ClassRepository& classes, const Slot_Type& slot, CMPIType type,
@@ -188,7 +188,8 @@ Named_Values properties_from_json(const ClassRepository& classes, const Class& k
         if (find(values, name))
             refuse(name, "the property is given twice");
         try {
-            values.push_back({property->name, value_from_json(classes, *property, part, name_space)});
+            values.push_back(
+                {property->name, value_from_json(classes, *property, part, name_space)});
         } catch (const Json_Complaint& inner) {
             refuse(below(name, inner.path), inner.text);
         }

@@ -1,8 +1,8 @@
 // Values and instances as JSON, exactly, and values from JSON, typed by what a class declares.
 //
-// Integers are exact to 64 bits, null is null, a reference is the text of its path, a datetime its 25
-// characters, an embedded object {"class", "properties"}. Bytes that are no UTF-8 become U+FFFD when
-// the JSON is written.
+// Integers are exact to 64 bits, null is null, a reference is the text of its path, a datetime its
+// 25 characters, an embedded object {"class", "properties"}. Bytes that are no UTF-8 become U+FFFD
+// when the JSON is written.
 #ifndef HOST_VALUE_JSON_H
 #define HOST_VALUE_JSON_H
 

@@ -257,19 +257,3 @@ HBA_STATUS HBA_GetAdapterPortAttributes(HBA_HANDLE handle, HBA_UINT32 index,
         *attributes = hba->ports[index];
     return status;
 }
-
-// No unit of the SAN answers here.
-HBA_STATUS HBA_GetFcpTargetMapping(HBA_HANDLE, HBA_FCPTARGETMAPPING* mapping) {
-    mapping->NumberOfEntries = 0;
-    return HBA_STATUS_OK;
-}
-
-HBA_STATUS HBA_SendScsiInquiry(HBA_HANDLE, HBA_WWN, HBA_UINT64, HBA_UINT8, HBA_UINT32, void*,
-                               HBA_UINT32, void*, HBA_UINT32) {
-    return HBA_STATUS_ERROR;
-}
-
-HBA_STATUS HBA_SendReadCapacity(HBA_HANDLE, HBA_WWN, HBA_UINT64, void*, HBA_UINT32, void*,
-                                HBA_UINT32) {
-    return HBA_STATUS_ERROR;
-}

@@ -83,7 +83,7 @@ TEST_F(Vpd_Test, TagsGoToTheirFields) {
     fake_vpd.entry("RI", "\xFE");
     fake_vpd.entry("FW", "V:10.2.261.13-very-long,x,D:03152014");
     ASSERT_EQ(read(), AX_STATUS_OK);
-    const AX_WWN wwn = {{0x10, 0, 0, 0x90, 0xFA, 0, 0, 3}};
+    const uint8_t wwn[8] = {0x10, 0, 0, 0x90, 0xFA, 0, 0, 3};
     EXPECT_EQ(std::memcmp(&fake_vpd.asked, &wwn, sizeof wwn), 0);
     EXPECT_EQ(fake_vpd.version, 1u);
     EXPECT_EQ(fake_vpd.size, 1536u);

@@ -4,6 +4,7 @@
 
 #include <fstream>
 #include <sstream>
+#include <thread>
 
 namespace road {
 
@@ -118,6 +119,16 @@ std::size_t Road::count_in_log(const std::string& text) const {
     for (std::size_t at = log.find(text); at != std::string::npos; at = log.find(text, at + 1))
         ++count;
     return count;
+}
+
+void Road::wait_for_refreshes(std::size_t count) {
+    constexpr int LIMIT = 100000;
+    for (int i = 0; i < LIMIT; ++i) {
+        if (count_in_log("PERF: DataFetch_Handler Thread END") >= count)
+            return;
+        std::this_thread::yield();
+    }
+    FAIL() << "no refresh number " << count << " within bounds";
 }
 
 std::string text_of(const host::Instance& instance, const std::string& property) {

@@ -40,6 +40,8 @@ public:
     std::filesystem::path root() const { return _root; }
     std::string log_text() const; // of the provider's log file
     std::size_t count_in_log(const std::string& text) const;
+    // Until that many refresh threads have ended since the start. Needs the log.
+    void wait_for_refreshes(std::size_t count);
 
 private:
     std::filesystem::path _root;

@@ -47,8 +47,8 @@ host::Json array_to_json(const host::Slot_Type& slot, CMPIType type, const std::
     return array;
 }
 
-host::Value read_value(const Context& context, const host::Slot_Type& slot,
-                       const std::string& name, const std::string& text) {
+host::Value read_value(const Context& context, const host::Slot_Type& slot, const std::string& name,
+                       const std::string& text) {
     const auto element = static_cast<CMPIType>(slot.type & ~CMPI_ARRAY);
     try {
         const host::Json json = (slot.type & CMPI_ARRAY) != 0 ? array_to_json(slot, element, text)
@@ -61,7 +61,8 @@ host::Value read_value(const Context& context, const host::Slot_Type& slot,
     }
 }
 
-// declared is the property or parameter of the name, or null; unknown_text says what there is instead.
+// declared is the property or parameter of the name, or null; unknown_text says what there is
+// instead.
 template <class Find, class Unknown>
 host::Named_Values read_all(const Context& context, const std::vector<std::string>& assignments,
                             Find declared, Unknown unknown_text) {

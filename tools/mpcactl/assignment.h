@@ -9,7 +9,8 @@
 
 namespace mpcactl {
 
-// Throw Usage_Error for a name that the class or method does not have, or a value that does not fit.
+// Throw Usage_Error for a name that the class or method does not have, or a value that does not
+// fit.
 host::Named_Values read_properties(const host::ClassRepository& classes, const host::Class& known,
                                    const std::vector<std::string>& assignments,
                                    const std::string& name_space);

@@ -196,24 +196,35 @@ std::vector<std::string> option_names(const CLI::App& app) {
     return names;
 }
 
+// The first argument that is neither an option nor the value of one: where a command should stand.
+std::string first_word(const CLI::App& app, int argc, char** argv) {
+    for (int i = 1; i < argc; ++i) {
+        const std::string argument = argv[i];
+        if (argument.empty() || argument[0] != '-')
+            return argument;
+        const CLI::Option* option = app.get_option_no_throw(argument);
+        if (option && option->get_expected_max() > 0)
+            ++i;
+    }
+    return "";
+}
+
 // The parser's words, and what is known in place of what was not.
 std::string explain(const CLI::App& app, int argc, char** argv, const CLI::ParseError& error) {
-    std::string text = error.what();
-    const bool has_command = !app.get_subcommands().empty();
-    for (int i = 1; i < argc && error.get_name() == "ExtrasError"; ++i) {
-        const std::string argument = argv[i];
-        const bool option = argument.rfind("--", 0) == 0;
-        if (text.find(argument) == std::string::npos || (!option && has_command))
-            continue;
-        const std::string name = argument.substr(0, argument.find('='));
-        return option ? "unknown option " + name + host::did_you_mean(name, option_names(app))
-                      : "unknown command " + argument +
-                            host::did_you_mean(argument, command_names(app)) +
-                            "\nCommands: " + host::join_or(command_names(app));
+    const std::string text = error.what();
+    const std::string commands = "\nCommands: " + host::join_or(command_names(app));
+    if (app.get_subcommands().empty()) {
+        const std::string word = first_word(app, argc, argv);
+        if (!word.empty() && !app.get_subcommand_no_throw(word))
+            return "unknown command " + word + host::did_you_mean(word, command_names(app)) +
+                   commands;
+        return dynamic_cast<const CLI::RequiredError*>(&error) ? text + commands : text;
     }
-    if (!has_command && error.get_name() != "ValidationError" &&
-        error.get_name() != "ArgumentMismatch")
-        text += "\nCommands: " + host::join_or(command_names(app));
+    for (int i = 1; i < argc && dynamic_cast<const CLI::ExtrasError*>(&error); ++i) {
+        const std::string argument = argv[i], name = argument.substr(0, argument.find('='));
+        if (argument.rfind("--", 0) == 0 && text.find(argument) != std::string::npos)
+            return "unknown option " + name + host::did_you_mean(name, option_names(app));
+    }
     return text;
 }
 

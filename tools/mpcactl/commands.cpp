@@ -69,8 +69,8 @@ int list_classes(Session& session) {
 
 int enumerate(Session& session) {
     const host::Class& known = session.known_class(session.settings.class_name);
-    print_instances(print_context(session), take(session.manager().enumerate(
-                                                known.name, session.properties(&known))));
+    print_instances(print_context(session),
+                    take(session.manager().enumerate(known.name, session.properties(&known))));
     return EXIT_FINE;
 }
 
@@ -167,9 +167,8 @@ int associators(Session& session) {
 }
 
 int associator_names(Session& session) {
-    print_paths(
-        print_context(session),
-        take(session.manager().associator_names(session.path(), association_filter(session))));
+    print_paths(print_context(session), take(session.manager().associator_names(
+                                            session.path(), association_filter(session))));
     return EXIT_FINE;
 }
 
@@ -181,9 +180,8 @@ int references(Session& session) {
 }
 
 int reference_names(Session& session) {
-    print_paths(
-        print_context(session),
-        take(session.manager().reference_names(session.path(), association_filter(session))));
+    print_paths(print_context(session), take(session.manager().reference_names(
+                                            session.path(), association_filter(session))));
     return EXIT_FINE;
 }
 

@@ -23,9 +23,9 @@ public:
 class Cim_Error : public std::runtime_error {
 public:
     explicit Cim_Error(const host::Status& status)
-        : std::runtime_error(host::rc_name(status.rc) + ": " +
-                             (status.message.empty() ? host::rc_sentence(status.rc)
-                                                     : status.message)) {}
+        : std::runtime_error(
+              host::rc_name(status.rc) + ": " +
+              (status.message.empty() ? host::rc_sentence(status.rc) : status.message)) {}
 };
 
 } // namespace mpcactl

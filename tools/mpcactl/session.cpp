@@ -26,9 +26,7 @@ host::Options host_options(const Settings& settings) {
     options.name_space = settings.name_space;
     options.more_name_spaces.push_back("root/vorlan");
     if (settings.trace_calls)
-        options.trace = [](const std::string& line) {
-            std::fprintf(stderr, "%s\n", line.c_str());
-        };
+        options.trace = [](const std::string& line) { std::fprintf(stderr, "%s\n", line.c_str()); };
     return options;
 }
 
@@ -69,16 +67,15 @@ const host::Class& Session::known_association(const std::string& name) const {
     throw Usage_Error(known.name + " is no association" + host::did_you_mean(name, associations));
 }
 
-const host::Method& Session::known_method(const host::Class& known,
-                                          const std::string& name) const {
+const host::Method& Session::known_method(const host::Class& known, const std::string& name) const {
     if (const host::Method* method = known.find_method(name))
         return *method;
     std::vector<std::string> names;
     for (const host::Method& method : known.methods)
         names.push_back(method.name);
-    throw Usage_Error(known.name + " has no method " + name + host::did_you_mean(name, names) +
-                      (names.empty() ? "\nIt has no methods."
-                                     : "\nIts methods: " + host::join_or(names)));
+    throw Usage_Error(
+        known.name + " has no method " + name + host::did_you_mean(name, names) +
+        (names.empty() ? "\nIt has no methods." : "\nIts methods: " + host::join_or(names)));
 }
 
 host::ObjectPath Session::path() const {

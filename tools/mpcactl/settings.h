@@ -31,7 +31,8 @@ struct Settings {
     std::string via, role, result_role, result_class;
 };
 
-// Reads the arguments of main. Prints help and answers false if that was asked for. Throws Usage_Error.
+// Reads the arguments of main. Prints help and answers false if that was asked for. Throws
+// Usage_Error.
 bool read_command_line(int argc, char** argv, Settings& settings);
 
 } // namespace mpcactl

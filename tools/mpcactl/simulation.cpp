@@ -106,8 +106,8 @@ Simulation::~Simulation() {
 }
 
 std::vector<std::string> Simulation::violations() const {
-    const auto* count = function<decltype(vlnsim_violations)>("vlnsim_violations");
-    const auto* text_of = function<decltype(vlnsim_violation)>("vlnsim_violation");
+    auto* const count = function<decltype(vlnsim_violations)>("vlnsim_violations");
+    auto* const text_of = function<decltype(vlnsim_violation)>("vlnsim_violation");
     std::vector<std::string> texts;
     for (size_t i = 0, n = count(); i < n; ++i) {
         char text[512] = "";

@@ -12,8 +12,8 @@ namespace mpcactl {
 // Lives longer than the module that uses it.
 class Simulation {
 public:
-    // scenario is a path, or the name of a scenario with or without ".json". An empty host_root gives
-    // the host a fresh temporary folder, which goes with the simulation. Throws Usage_Error.
+    // scenario is a path, or the name of a scenario with or without ".json". An empty host_root
+    // gives the host a fresh temporary folder, which goes with the simulation. Throws Usage_Error.
     Simulation(const std::string& scenario, const std::string& host_root, bool trace);
     ~Simulation();
     Simulation(const Simulation&) = delete;

@@ -22,33 +22,35 @@ struct Property_Row {
 };
 
 constexpr Property_Row PROPERTIES[] = {
-    {"InstanceID", CMPI_string, "VLN-4102-X:10000090FA942779", 0},
-    {"Description", CMPI_string, "Vorlan VLN-4102-X 2-port 10GbE converged network adapter", 0},
-    {"ElementName", CMPI_string, "eth0", 0},
+    {"InstanceID", CMPI_string, "VMC-2210:100002564C000000", 0},
+    {"Description", CMPI_string, "Vorlan VMC-2210 10Gb 2-port PCIe Converged Network Adapter", 0},
+    {"ElementName", CMPI_string, "vln0p0", 0},
     {"Generation", CMPI_uint64, nullptr, 0},
-    {"Name", CMPI_string, "eth0", 0},
-    {"OperationalStatus", CMPI_uint16A, nullptr, 2},
+    {"Name", CMPI_string, "vln0p0", 0},
+    {"OperationalStatus", CMPI_uint16A, "2", 0},
     {"StatusDescriptions", CMPI_stringA, "OK", 0},
     {"EnabledState", CMPI_uint16, nullptr, 2},
     {"RequestedState", CMPI_uint16, nullptr, 12},
     {"SystemCreationClassName", CMPI_string, "CIM_ComputerSystem", 0},
     {"SystemName", CMPI_string, "server.example", 0},
     {"CreationClassName", CMPI_string, CLASS_NAME, 0},
-    {"OtherIdentifyingInfo", CMPI_stringA, "VLN0123456789:00|VLN0123456789:1|VLN0123456789", 0},
+    {"OtherIdentifyingInfo", CMPI_stringA, "VR10420117:00|VR10420117:0|VR10420117", 0},
     {"IdentifyingDescriptions", CMPI_stringA,
      "SerialNumber + Sub-AdapterID|SerialNumber:PhysicalPortNumber|SerialNumber", 0},
     {"Speed", CMPI_uint64, nullptr, 10000000000ull},
     {"MaxSpeed", CMPI_uint64, nullptr, 10000000000ull},
     {"PortType", CMPI_uint16, nullptr, 0},
-    {"PortNumber", CMPI_uint16, nullptr, 1},
+    {"PortNumber", CMPI_uint16, nullptr, 0},
     {"LinkTechnology", CMPI_uint16, nullptr, 2},
-    {"PermanentAddress", CMPI_string, "0090FA942779", 0},
-    {"NetworkAddresses", CMPI_stringA, "0090FA942779", 0},
+    {"PermanentAddress", CMPI_string, "02564c000000", 0},
+    {"NetworkAddresses", CMPI_stringA, "02564c000000", 0},
     {"SupportedMaximumTransmissionUnit", CMPI_uint64, nullptr, 9000},
     {"ActiveMaximumTransmissionUnit", CMPI_uint64, nullptr, 1500},
-    {"FunctionalQosBandwidth", CMPI_string, "10000", 0},
-    {"FunctionalQosMinBandwidth", CMPI_string, "100", 0},
-    {"PCIBusNumber", CMPI_uint32, nullptr, 3},
+    {"Capabilities", CMPI_uint16A, "2|3|4", 0},
+    {"EnabledCapabilities", CMPI_uint16A, "3|4", 0},
+    {"FunctionalQosBandwidth", CMPI_string, "10 Gbps", 0},
+    {"FunctionalQosMinBandwidth", CMPI_string, "1 Gbps", 0},
+    {"PCIBusNumber", CMPI_uint32, nullptr, 16},
     {"FunctionalPortSpeed", CMPI_string, "10 Gbps", 0},
 };
 
@@ -69,13 +71,13 @@ CMPIValue string_value(const char* text) {
     return value;
 }
 
-// The pieces of a '|' separated list, one string element each.
-CMPIValue string_array(const char* list) {
+// An array of the pieces of a '|' separated list.
+CMPIValue array_value(const char* list, CMPIType type) {
     unsigned count = 1;
     for (const char* p = list; *p; ++p)
         count += *p == '|';
     CMPIValue array;
-    array.array = broker->eft->newArray(broker, count, CMPI_string, nullptr);
+    array.array = broker->eft->newArray(broker, count, type, nullptr);
     for (unsigned i = 0; i < count; ++i) {
         char piece[128];
         unsigned n = 0;
@@ -83,8 +85,12 @@ CMPIValue string_array(const char* list) {
             piece[n++] = *list++;
         piece[n] = 0;
         list += *list == '|';
-        CMPIValue element = string_value(piece);
-        array.array->ft->setElementAt(array.array, i, &element, CMPI_string);
+        CMPIValue element;
+        if (type == CMPI_string)
+            element = string_value(piece);
+        else
+            element.uint64 = std::strtoul(piece, nullptr, 10);
+        array.array->ft->setElementAt(array.array, i, &element, type);
     }
     return array;
 }
@@ -93,15 +99,8 @@ CMPIValue value_of(const Property_Row& row) {
     CMPIValue value;
     if (row.type == CMPI_string)
         return string_value(row.text);
-    if (row.type == CMPI_stringA)
-        return string_array(row.text);
-    if (row.type == CMPI_uint16A) {
-        value.array = broker->eft->newArray(broker, 1, CMPI_uint16, nullptr);
-        CMPIValue element;
-        element.uint16 = static_cast<CMPIUint16>(row.number);
-        value.array->ft->setElementAt(value.array, 0, &element, CMPI_uint16);
-        return value;
-    }
+    if (row.type & CMPI_ARRAY)
+        return array_value(row.text, static_cast<CMPIType>(row.type & ~CMPI_ARRAY));
     value.uint64 = row.number; // little-endian: the narrower members read its low bytes
     return value;
 }

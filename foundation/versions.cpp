@@ -7,7 +7,6 @@
 #include <cstdio>
 #include <cstdlib>
 #include <cstring>
-#include <exception>
 
 namespace cimple {
 
@@ -75,7 +74,7 @@ sint32 VLN_Common::parseVersion(const char* text, VLN_FirmwareVersion& out) {
         }
         VLN_LOG(VLN_DBG, "Input Version String: [%s]", text);
         return parse(text, out);
-    } catch (const std::exception&) {
+    } catch (...) {
         VLN_LOG(VLN_ERR, "parseVersion: error occurred while parsing...");
         return VLN_GENERAL_ERROR;
     }

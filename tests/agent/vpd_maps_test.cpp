@@ -224,7 +224,7 @@ TEST_F(Vpd_Maps_Test, PortsAndSoftwareFindEachOther) {
     EXPECT_EQ(maps.GetLogicalPortAddress(SERIAL, 2, &text), 0u);
     EXPECT_EQ(text, PORT);
     EXPECT_EQ(maps.GetLogicalPortAddress("VR10420117:1", 2, &text), 0u);
-    EXPECT_STREQ(text.c_str(), "100002564C000100");
+    EXPECT_STREQ(text.c_str(), "100002564C000101");
     EXPECT_EQ(maps.GetLogicalPortAddress("", 2, &text), 0u);
     EXPECT_EQ(text, PORT);
     EXPECT_EQ(maps.GetLogicalPortAddress("other", 2, &text), 32768u);

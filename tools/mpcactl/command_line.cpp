@@ -5,7 +5,7 @@
 
 #include <CLI/CLI.hpp>
 
-#include <cstring>
+#include <algorithm>
 #include <map>
 
 namespace mpcactl {
@@ -215,9 +215,9 @@ std::string explain(const CLI::App& app, int argc, char** argv, const CLI::Parse
     const std::string commands = "\nCommands: " + host::join_or(command_names(app));
     if (app.get_subcommands().empty()) {
         const std::string word = first_word(app, argc, argv);
-        if (!word.empty() && !app.get_subcommand_no_throw(word))
-            return "unknown command " + word + host::did_you_mean(word, command_names(app)) +
-                   commands;
+        const std::vector<std::string> known = command_names(app);
+        if (!word.empty() && std::find(known.begin(), known.end(), word) == known.end())
+            return "unknown command " + word + host::did_you_mean(word, known) + commands;
         return dynamic_cast<const CLI::RequiredError*>(&error) ? text + commands : text;
     }
     for (int i = 1; i < argc && dynamic_cast<const CLI::ExtrasError*>(&error); ++i) {

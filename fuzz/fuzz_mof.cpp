@@ -12,7 +12,7 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
         }
     } catch (const mof::Error& error) {
         // The place that an error names lies in the text.
-        const auto lines = 1 + std::count(text.begin(), text.end(), '\n');
+        const auto lines = static_cast<std::size_t>(1 + std::count(text.begin(), text.end(), '\n'));
         FUZZ_CHECK(error.where().line >= 1 && error.where().line <= lines);
         FUZZ_CHECK(error.where().column >= 1 && error.where().column <= text.size() + 1);
     }

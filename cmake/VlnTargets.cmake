@@ -49,6 +49,10 @@ function(vln_test name)
         set(ARG_TIMEOUT 120)
     endif()
     set_tests_properties(${name} PROPERTIES TIMEOUT ${ARG_TIMEOUT})
+    if(VLN_SANITIZE STREQUAL "thread")
+        set_tests_properties(${name} PROPERTIES ENVIRONMENT
+            "TSAN_OPTIONS=suppressions=${CMAKE_SOURCE_DIR}/tests/tsan.supp:halt_on_error=1")
+    endif()
 endfunction()
 
 # The rooms that the shared library is made of.
@@ -56,8 +60,8 @@ set(VLN_PRODUCT_ROOMS vln_cimple vln_schema_meta vln_schema vln_foundation vln_d
     vln_operations vln_agent vln_services vln_derivedObjects)
 
 # A module of the product's objects. With REPLACE, the objects of the named sources are left out and
-# the given sources take their place: the simulation's module differs in the host's root folder and in
-# the clock, and in nothing else.
+# the given sources take their place: the simulation's module differs in the host's root folder, the
+# clock and the kernel's network interfaces, and in nothing else.
 #   vln_module(TARGET OUTPUT_DIRECTORY [REPLACE name...] [WITH source...] [LIBRARIES target...]
 #              [NO_EXPORT_MAP])
 function(vln_module target directory)
@@ -85,8 +89,10 @@ function(vln_module target directory)
         target_link_options(${target} PRIVATE
             "LINKER:--version-script=${VLN_GENERATED_DIR}/export.map")
     endif()
-    target_link_options(${target} PRIVATE "LINKER:-z,relro"
-        $<$<NOT:$<BOOL:${VLN_SANITIZE}>>:LINKER:--no-undefined>)
+    target_link_options(${target} PRIVATE "LINKER:-z,relro")
+    if(NOT VLN_SANITIZE)
+        target_link_options(${target} PRIVATE "LINKER:--no-undefined")
+    endif()
     target_include_directories(${target} PRIVATE "${VLN_GENERATED_DIR}")
     add_dependencies(${target} vln_generate)
 endfunction()

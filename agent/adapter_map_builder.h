@@ -8,6 +8,7 @@
 #ifndef VLN_AGENT_ADAPTER_MAP_BUILDER_H
 #define VLN_AGENT_ADAPTER_MAP_BUILDER_H
 
+#include "agent/associations.h"
 #include "agent/provider_agent.h"
 #include "classes/CIM_Chassis.h"
 #include "classes/CIM_ComputerSystem.h"
@@ -19,7 +20,12 @@
 #include "classes/VLNMPCA_Product.h"
 #include "device/nic_adapter.h"
 
+#include <vector>
+
 namespace cimple {
+
+struct IP_Interface;
+class VLN_IPInterfaceConfig;
 
 enum Map_Status : uint32 {
     MAP_OK = 0,
@@ -36,6 +42,10 @@ public:
 
 private:
     // adapter_maps.cpp
+    uint32 createNICClasses();
+    void registerBaseProfiles();
+    uint32 createNICPart();
+    uint32 createNICSoftware();
     void updateSoftwareIdentities();
 
     // A NIC function on its way through the card loop, with what its card shares with others.
@@ -45,17 +55,21 @@ private:
         VLNMPCA_Product* product;
         VLNMPCA_Card* card;
         bool new_card; // made for this function, and not yet tied to its surroundings
+        VLNMPCA_Chip* chip = nullptr;
     };
     // One port of it.
     struct NIC_Port {
         const NIC_Function& function;
         const NICPortAttributes* attributes;
+        uint32 index;             // among the ports of its adapter
         String name;              // of the device model: 16 digits
         String serial_and_number; // "serial:port number", which functions of one connector share
         VLNMPCA_PhysicalConnector* connector = nullptr;
         VLNMPCA_EthernetPort* ethernet_port = nullptr;
         VLNMPCA_LANEndpoint* lan_endpoint = nullptr;
         VLNMPCA_PortController* port_controller = nullptr;
+        bool new_port_controller = false; // made for this port
+        VLNMPCA_SoftwareIdentity* firmware = nullptr;
     };
 
     // platform_maps.cpp
@@ -68,31 +82,81 @@ private:
     // configuration_maps.cpp
     uint32 createConfigurationSettings();
 
+    // software_maps.cpp
+    void createProviderIdentity();
+    VLNMPCA_SoftwareIdentity* findProviderIdentity() const;
+    uint32 createDriverIdentity();
+    uint32 CreateDriverIdentity(NICAdapter& adapter);
+
+    // firmware_maps.cpp
+    void findOrMakeFirmware(NIC_Port& port);
+    VLNMPCA_SoftwareIdentity* CreateFirmwareIdentityInstance(const NICAdapterAttributes& adapter);
+    void joinFirmwareToPort(const NIC_Port& port);
+    void joinFirmwareToController(const NIC_Port& port);
+    void joinFlashImage(const NIC_Port& port);
+
+    // install_service_maps.cpp
+    uint32 StartSoftwareInstallationService();
+    void joinInstallService(const VLNMPCA_SoftwareInstallationService* service);
+    void affectByInstallService(Instance_Map_Base& store, const Instance* element,
+                                const Insert_Failure& failure = {});
+
+    // record_log_maps.cpp
+    uint32 createRecordLogs();
+    void conformRecordLog(const VLNMPCA_RecordLog& log);
+    void createRecordLogCapabilities(const VLNMPCA_RecordLog* provider_log);
+    uint32 joinRecordLogs();
+    void conformPortControllers();
+
     // card_maps.cpp
-    void createNICCards();
-    void createNICCard(NICAdapter& adapter);
+    uint32 createNICCards();
+    uint32 createNICCard(NICAdapter& adapter);
     VLNMPCA_Product* findOrMakeProduct(const NICAdapterAttributes& attributes);
     VLNMPCA_Card* CreateMPCACardInstance(const NICAdapterAttributes& attributes);
     void updateFRUData(const NIC_Function& function);
     void tieNewCard(NIC_Function& function);
+    void conformCard(const VLNMPCA_Card& card);
     void findOrMakeConnector(NIC_Port& port);
     void joinConnector(const NIC_Port& port);
 
+    // chip_maps.cpp
+    void findOrMakeChip(NIC_Function& function);
+    uint32 CreateMPCAChipInstance(NIC_Function& function);
+
     // port_maps.cpp
-    void createNICPort(NIC_Function& function, Port& port);
+    uint32 createNICPort(NIC_Function& function, Port& port);
     Ref<VLNMPCA_EthernetPort> CreateEthernetPort(const NIC_Port& port) const;
     void createLANEndpoint(NIC_Port& port);
     void joinLANEndpoint(const NIC_Port& port);
+    void conformEthernetPort(const VLNMPCA_EthernetPort& port);
+
+    // pci_maps.cpp, vital_product_maps.cpp
+    uint32 CreatePCIDeviceInstance(const NIC_Port& port);
+    uint32 joinPCIDevice(const NIC_Port& port, const VLNMPCA_PCIDevice& device);
+    VLNMPCA_VitalProductData* CreateVPD(const NIC_Port& port);
+
+    // vlan_maps.cpp
+    void createVLANObjects(const NIC_Port& port);
 
     // port_controller_maps.cpp
     void findOrMakePortController(NIC_Port& port);
     void joinPortController(const NIC_Port& port);
+    void conformPortController(const VLNMPCA_PortController& controller);
     void joinControlledBy(const NIC_Port& port);
 
+    // transceiver_maps.cpp
+    void createTransceiver(const NIC_Port& port);
+
+    // ip_maps.cpp
+    uint32 createIPClasses();
+    void createIPEndpoint(NICAdapter& adapter, Port& port, VLN_IPInterfaceConfig& kernel);
+    void joinIPEndpoint(const IP_Interface& interface);
+
     ProviderAgent& _agent;
-    CIM_ComputerSystem* _system = nullptr; // in its store
-    Ref<CIM_Chassis> _platform_chassis;    // found by the up-call, not yet in its store
-    CIM_Chassis* _chassis = nullptr;       // in its store
+    CIM_ComputerSystem* _system = nullptr;    // in its store
+    Ref<CIM_Chassis> _platform_chassis;       // found by the up-call, not yet in its store
+    CIM_Chassis* _chassis = nullptr;          // in its store
+    std::vector<VLNMPCA_Card*> _untied_cards; // in their store; see createNICCard
 };
 
 } // namespace cimple

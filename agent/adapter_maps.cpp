@@ -1,6 +1,7 @@
 // The order of the adapter pass.
 
 #include "agent/adapter_map_builder.h"
+#include "agent/profile_maps.h"
 #include "agent/vpd_maps.h"
 
 namespace cimple {
@@ -17,16 +18,70 @@ uint32 Adapter_Map_Builder::run() {
         return END_PASS;
     }
     findChassis();
+    registerBaseProfiles();
     if (const uint32 status = createConfigurationSettings())
         return status;
     if (const uint32 status = createChassis())
         return status;
-    if (_agent.m_pData->hasNICAdapter)
-        createNICCards();
-    else
-        VLN_LOG(VLN_DBG, "No NIC card found");
+    Profile_Maps(_agent).registerForSystem(PROFILE_SOFTWARE_UPDATE);
+    if (const uint32 status = createNICPart())
+        return status;
+    if (const uint32 status = createRecordLogs())
+        return status;
     updateSoftwareIdentities();
     VLN_LOG(VLN_DBG, "PERF: updateAdapterMaps: cleanExit");
+    return MAP_OK;
+}
+
+void Adapter_Map_Builder::registerBaseProfiles() {
+    constexpr Profile BASE_PROFILES[] = {
+        PROFILE_REGISTRATION, PROFILE_ETHERNET_PORT,  PROFILE_HOST_LAN_NETWORK_PORT,
+        PROFILE_PCI_DEVICE,   PROFILE_PHYSICAL_ASSET, PROFILE_SOFTWARE_INVENTORY,
+        PROFILE_SOFTWARE,
+    };
+    for (Profile profile : BASE_PROFILES)
+        Profile_Maps(_agent).registerForSystem(profile);
+}
+
+uint32 Adapter_Map_Builder::createNICPart() {
+    if (!_agent.m_pData->hasNICAdapter) {
+        VLN_LOG(VLN_DBG, "No NIC card found");
+        return MAP_OK;
+    }
+    if (const uint32 status = createNICSoftware())
+        return status;
+    return createNICClasses();
+}
+
+// What the NIC cards are tied to beside the platform: the installation service, the identities of
+// provider and driver, and the profiles of storage hosts.
+uint32 Adapter_Map_Builder::createNICSoftware() {
+    VLN_LOG(VLN_DBG, "Ethernet Port Profile");
+    if (StartSoftwareInstallationService() != MAP_OK) {
+        VLN_LOG(VLN_CRIT, "StartSoftwareInstallationService failed");
+        return END_PASS;
+    }
+    createProviderIdentity();
+    if (createDriverIdentity() != MAP_OK) {
+        VLN_LOG(VLN_CRIT, "CreateDriverIdentity failed");
+        return END_PASS;
+    }
+    VLN_LOG(VLN_DBG, "create VLNMPCA_RegisteredProfile (Host Discovered Resources)");
+    Profile_Maps profiles(_agent);
+    profiles.registerForSystem(PROFILE_HOST_DISCOVERED_RESOURCES);
+    profiles.registerForSystem(PROFILE_ACCESS_POINTS);
+    return MAP_OK;
+}
+
+// What throws in here ends all that is made of NIC adapters, and nothing else.
+uint32 Adapter_Map_Builder::createNICClasses() {
+    try {
+        if (const uint32 status = createNICCards())
+            return status;
+        return createIPClasses();
+    } catch (...) {
+        VLN_LOG(VLN_DBG, "Unknown exception in  NIC card discovery");
+    }
     return MAP_OK;
 }
 

@@ -65,4 +65,10 @@ Instance* associate(Instance_Map_Base& store, const Instance* first, const Insta
     return insert_instance(store, association, failure);
 }
 
+Instance* associate_as(Instance_Map_Base& store, const String& text, const Instance* first,
+                       const Instance* second, const Insert_Failure& failure) {
+    VLN_LOG(VLN_DBG, "Generating %s (%s)", store.meta_class()->name, text.c_str());
+    return associate(store, first, second, failure);
+}
+
 } // namespace cimple

@@ -47,6 +47,10 @@ T* insert_instance(Instance_Map<T>& store, Ref<T> instance, const Insert_Failure
 Instance* associate(Instance_Map_Base& store, const Instance* first, const Instance* second,
                     const Insert_Failure& failure = {});
 
+// The same after a line that tells the class and, in the text, who is joined.
+Instance* associate_as(Instance_Map_Base& store, const String& text, const Instance* first,
+                       const Instance* second, const Insert_Failure& failure = {});
+
 } // namespace cimple
 
 #endif // VLN_AGENT_ASSOCIATIONS_H

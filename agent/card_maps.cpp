@@ -6,9 +6,13 @@
 #include "agent/adapter_map_builder.h"
 #include "agent/associations.h"
 #include "agent/port_name.h"
+#include "agent/profile_maps.h"
+#include "agent/software_identity.h"
 #include "agent/store_search.h"
 #include "agent/text.h"
 #include "agent/vpd_maps.h"
+#include "classes/VLNMPCA_Chip.h"
+#include "classes/VLNMPCA_SoftwareIdentity.h"
 
 namespace cimple {
 
@@ -87,22 +91,20 @@ Ref<VLNMPCA_PhysicalConnector> connector_instance(const NICAdapterAttributes& ad
 
 } // namespace
 
-void Adapter_Map_Builder::createNICCards() {
-    try {
-        for (const auto& adapter : _agent.m_pData->adapters) {
-            if (adapter->getAdapterType() != ADAPTER_NIC) {
-                VLN_LOG(VLN_DBG, "Skippping Adapter [%s] since it is not a NIC Adapter",
-                        adapter->getAdapterName().c_str());
-                continue;
-            }
-            createNICCard(static_cast<NICAdapter&>(*adapter));
+uint32 Adapter_Map_Builder::createNICCards() {
+    for (const auto& adapter : _agent.m_pData->adapters) {
+        if (adapter->getAdapterType() != ADAPTER_NIC) {
+            VLN_LOG(VLN_DBG, "Skippping Adapter [%s] since it is not a NIC Adapter",
+                    adapter->getAdapterName().c_str());
+            continue;
         }
-    } catch (...) {
-        VLN_LOG(VLN_DBG, "Unknown exception in  NIC card discovery");
+        if (const uint32 status = createNICCard(static_cast<NICAdapter&>(*adapter)))
+            return status;
     }
+    return MAP_OK;
 }
 
-void Adapter_Map_Builder::createNICCard(NICAdapter& adapter) {
+uint32 Adapter_Map_Builder::createNICCard(NICAdapter& adapter) {
     const auto& attributes =
         static_cast<const NICAdapterAttributes&>(*adapter.getAdapterAttributes());
     NIC_Function function{&adapter, &attributes, findOrMakeProduct(attributes), nullptr, false};
@@ -121,9 +123,16 @@ void Adapter_Map_Builder::createNICCard(NICAdapter& adapter) {
         updateFRUData(function);
         associate(_agent.m_VLNMPCA_ProductPhysicalComponent_map, function.product, function.card,
                   "Insert Failed (CNA): VLNMPCA_ProductPhysicalComponent");
+    } else {
+        function.new_card = std::erase(_untied_cards, function.card) != 0;
     }
     for (const auto& port : adapter.getPorts())
-        createNICPort(function, *port);
+        if (const uint32 status = createNICPort(function, *port))
+            return status;
+    // None of the function's ports could be read: the next function of the card ties it.
+    if (function.new_card)
+        _untied_cards.push_back(function.card);
+    return MAP_OK;
 }
 
 VLNMPCA_Product* Adapter_Map_Builder::findOrMakeProduct(const NICAdapterAttributes& attributes) {
@@ -153,9 +162,29 @@ void Adapter_Map_Builder::tieNewCard(NIC_Function& function) {
     if (!function.new_card)
         return;
     function.new_card = false;
+    conformCard(*function.card);
+    set_software_status(associate(_agent.m_VLNMPCA_ProviderElementSoftwareIdentity_map,
+                                  findProviderIdentity(), function.card),
+                        {STATUS_CURRENT, STATUS_NEXT});
     if (_chassis)
         associate(_agent.m_VLNMPCA_ChassisContainsCard_map, _chassis, function.card,
                   "Insert Failed:VLNMPCA_ChassisContainsCard");
+}
+
+void Adapter_Map_Builder::conformCard(const VLNMPCA_Card& card) {
+    constexpr struct {
+        const char* text;
+        Profile profile;
+    } ROWS[] = {
+        {"Access Points", PROFILE_ACCESS_POINTS},
+        {"Host Discovered Resource", PROFILE_HOST_DISCOVERED_RESOURCES},
+        {"Physical Asset", PROFILE_PHYSICAL_ASSET},
+    };
+    Profile_Maps profiles(_agent);
+    for (const auto& row : ROWS)
+        profiles.createCardConforms(
+            format_text("MPCA Card %s, %s", card.VLNSerialNumber.value.c_str(), row.text),
+            row.profile, &card);
 }
 
 void Adapter_Map_Builder::findOrMakeConnector(NIC_Port& port) {
@@ -176,6 +205,9 @@ void Adapter_Map_Builder::joinConnector(const NIC_Port& port) {
               "Insert Failed (CNA): VLNMPCA_ProductPhysicalConnector");
     associate(_agent.m_VLNMPCA_Container_map, port.function.card, port.connector,
               "Insert Failed (CNA): VLNMPCA_Container");
+    if (port.function.chip)
+        associate(_agent.m_VLNMPCA_ConnectorDependsOnChip_map, port.connector, port.function.chip,
+                  "Insert Failed (CNA): VLNMPCA_ConnectorDependsOnChip");
 }
 
 } // namespace cimple

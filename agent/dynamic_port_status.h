@@ -10,9 +10,11 @@
 namespace cimple {
 
 struct Dynamic_Port_Row {
+    static constexpr std::size_t NAME_LENGTH = 20; // at most
+
     uint32 functional_state;
     uint32 physical_state;
-    char name[24]; // port name, at most 20 characters and the end mark
+    char name[24]; // of the port, with its end mark
 };
 static_assert(sizeof(Dynamic_Port_Row) == 32);
 

@@ -14,7 +14,8 @@ namespace cimple {
 // scope.
 class Gate {
 public:
-    Gate(Mutex& mutex, Cond& cond, const bool& ready) : _lock(mutex) {
+    template <class Flag>
+    Gate(Mutex& mutex, Cond& cond, const Flag& ready) : _lock(mutex) {
         if (!ready)
             cond.wait(mutex);
     }

@@ -5,9 +5,11 @@
 #include "agent/beacon.h"
 #include "agent/mac_text.h"
 #include "agent/port_name.h"
+#include "agent/profile_maps.h"
 #include "agent/state_tables.h"
 #include "agent/text.h"
 #include "classes/VLNMPCA_EnabledLogicalElementCapabilities.h"
+#include "classes/VLNMPCA_RegisteredProfile.h"
 
 namespace cimple {
 
@@ -80,29 +82,41 @@ Ref<VLNMPCA_EnabledLogicalElementCapabilities> capabilities_instance(const Strin
 
 // The steps of one port, in order. A port whose Ethernet port can't be made is left out from there
 // on.
-void Adapter_Map_Builder::createNICPort(NIC_Function& function, Port& nic_port) {
+uint32 Adapter_Map_Builder::createNICPort(NIC_Function& function, Port& nic_port) {
     VLN_LOG(VLN_DBG, "Creating classes for Adapter# %d # --- NIC port# %d #",
             static_cast<int>(function.adapter->getAdapterNumber()),
             static_cast<int>(nic_port.getPortIndex()));
     const auto& attributes = static_cast<const NICPortAttributes&>(*nic_port.getPortAttributes());
-    NIC_Port port{function, &attributes, text(nic_port.getPortName()),
+    NIC_Port port{function, &attributes, nic_port.getPortIndex(), text(nic_port.getPortName()),
                   format_text("%s:%d", function.attributes->SerialNumber.c_str(),
                               static_cast<int>(function.attributes->PortNumber))};
     tieNewCard(function);
+    findOrMakeChip(function);
     findOrMakeConnector(port);
     joinConnector(port);
+    findOrMakeFirmware(port);
     port.ethernet_port =
         insert_instance(_agent.m_VLNMPCA_EthernetPort_map, CreateEthernetPort(port));
     if (!port.ethernet_port)
-        return;
+        return MAP_OK;
+    const uint32 status = CreatePCIDeviceInstance(port);
+    if (status != MAP_OK && status != SKIP_DEVICE) {
+        VLN_LOG(VLN_CRIT, "CreatePCIDeviceInstance failed");
+        return END_PASS;
+    }
     associate(_agent.m_VLNMPCA_Realizes_map, port.connector, port.ethernet_port,
               "Insert Failed (CNA): m_VLNMPCA_Realizes_map");
     createLANEndpoint(port);
     joinLANEndpoint(port);
+    createVLANObjects(port);
     VLN_LOG(VLN_DBG, "Adding the port controller classes");
     findOrMakePortController(port);
+    joinFirmwareToPort(port);
+    joinFlashImage(port);
+    createTransceiver(port);
     VLN_LOG(VLN_DBG, "Creating controlledby");
     joinControlledBy(port);
+    return MAP_OK;
 }
 
 // Null for a port whose address is no MAC address.
@@ -160,11 +174,19 @@ void Adapter_Map_Builder::createLANEndpoint(NIC_Port& port) {
 void Adapter_Map_Builder::joinLANEndpoint(const NIC_Port& port) {
     const auto* capabilities = insert_instance(
         _agent.m_VLNMPCA_EnabledLogicalElementCapabilities_map, capabilities_instance(port.name));
+    conformEthernetPort(*port.ethernet_port);
     associate(_agent.m_VLNMPCA_NICCapabilities_map, port.ethernet_port, capabilities);
     associate(_agent.m_VLNMPCA_EndpointCapabilities_map, port.lan_endpoint, capabilities);
     associate(_agent.m_VLNMPCA_NICSAPImplementation_map, port.ethernet_port, port.lan_endpoint);
     associate(_agent.m_VLNMPCA_HostedLANEndpoint_map, _system, port.lan_endpoint);
     associate(_agent.m_VLNMPCA_EthernetPortSystemDevice_map, _system, port.ethernet_port);
+}
+
+// The endpoint is part of the second profile, but what conforms to one is an Ethernet port.
+void Adapter_Map_Builder::conformEthernetPort(const VLNMPCA_EthernetPort& port) {
+    const Profile_Maps profiles(_agent);
+    for (Profile profile : {PROFILE_ETHERNET_PORT, PROFILE_HOST_LAN_NETWORK_PORT})
+        associate(_agent.m_VLNMPCA_NICPortConformsToProfile_map, profiles.find(profile), &port);
 }
 
 } // namespace cimple

@@ -165,11 +165,12 @@ void ProviderAgent::shutDown() {
     unloadRuntimeLibraries();
 }
 
-// Waits for a poll of the thread at most.
+// Waits for one port's poll at most: a sleeping thread is woken.
 void ProviderAgent::stopDynamicThread() {
     if (!m_DynamicPortThreadInitialized)
         return;
-    m_bStopDynamicThread = true;
+    raise_flag(m_bStopDynamicThread);
+    Time::wake();
     void* value = nullptr;
     Thread::join(m_DynamicPortThread, value);
     m_pDynamicPortStatus.reset();

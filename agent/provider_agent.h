@@ -10,6 +10,8 @@
 #define VLN_AGENT_PROVIDER_AGENT_H
 
 #include "agent/dynamic_port_status.h"
+#include "agent/dynamic_status.h"
+#include "agent/plain_flag.h"
 #include "agent/stores.h"
 #include "cimple/thread.h"
 #include "device/data.h"
@@ -17,6 +19,7 @@
 #include "foundation/logger.h"
 #include "operations/method_wrapper.h"
 
+#include <atomic>
 #include <memory>
 #include <string>
 
@@ -58,12 +61,15 @@ public:
 
     // ---- Members ----
 
-    bool m_bAdapterRefreshRequested = true; // one-shot: the first refresh always has adapter data
-    bool m_bRefreshAdapterData = false;     // every refresh runs the adapter pass
-    bool m_bSANRefreshRequested = false;    // one-shot
-    bool m_bRefreshSANData = true;          // every refresh runs the SAN pass
-    uint32 m_CacheTimeout = 10;             // minutes
-    bool m_bLibraryLoaded = false;          // the device layer may be used
+    // The tuning values, which a client may change at any time.
+    std::atomic<bool> m_bRefreshAdapterData = false; // every refresh runs the adapter pass
+    std::atomic<bool> m_bRefreshSANData = true;      // every refresh runs the SAN pass
+    std::atomic<uint32> m_CacheTimeout = 10;         // minutes
+
+    // One-shot: the first refresh always has adapter data.
+    Plain_Flag<flag::m_bAdapterRefreshRequested> m_bAdapterRefreshRequested = true;
+    Plain_Flag<flag::m_bSANRefreshRequested> m_bSANRefreshRequested = false; // one-shot
+    Plain_Flag<flag::m_bLibraryLoaded> m_bLibraryLoaded = false; // the device layer may be used
 
     std::unique_ptr<VLN_Data> m_pData;
     std::unique_ptr<VLN_MethodWrapper> m_pMethodWrapper;
@@ -77,12 +83,12 @@ public:
     Mutex m_AdapterDataReadyMutex;
     Cond m_AdapterDataReadyCond;
 
-    bool m_bIsAdapterMapsReady = false;
+    Plain_Flag<flag::m_bIsAdapterMapsReady> m_bIsAdapterMapsReady = false;
     bool m_bIsAdapterMapsBuilding = false;
     Mutex m_AdapterMapsReadyMutex;
     Cond m_AdapterMapsReadyCond;
 
-    bool m_bIsSANMapsReady = false;
+    Plain_Flag<flag::m_bIsSANMapsReady> m_bIsSANMapsReady = false;
     bool m_bIsSANMapsBuilding = false;
     Mutex m_SANMapsReadyMutex;
     Cond m_SANMapsReadyCond;
@@ -90,6 +96,8 @@ public:
     // Holds the refresh back. Nothing sets it today: the test in BuildCimpleInfo is the one place
     // that a future writer has to reach.
     bool m_bDiagnosticsRunning = false;
+
+    Datetime m_LastUpdates[NUM_DYNAMIC_UPDATES]; // all zero: not yet
 
     bool m_DynamicPortThreadInitialized = false;
     bool m_bStopDynamicThread = false;

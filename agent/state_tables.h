@@ -41,9 +41,32 @@ struct Enabled_State {
 };
 
 inline constexpr uint16 OTHER_ENABLED_STATE = 1;
+inline constexpr uint32 PHYSICAL_STATE_UP = 2; // any other is a port without a speed
 
 inline constexpr Enabled_State enabledStateMap[] = {
     {2, 2}, {5, 7}, {1, 0}, {3, 3}, {6, 3}, {21, 3}, {22, 3},
+};
+
+// Kind of a Fibre Channel port: the library's number, CIM_FCPort.PortType and its name.
+struct Port_Type {
+    uint32 type;
+    uint16 port_type;
+    const char* name;
+};
+
+inline constexpr Port_Type UNKNOWN_PORT_TYPE = {0, 0, "Unknown"};
+
+// CIM has no numbers for the last two: they are "other" as well.
+inline constexpr Port_Type portTypeMap[] = {
+    {2, 1, "Other"},
+    {5, 10, "N"},
+    {6, 11, "NL"},
+    {7, 16, "FL"},
+    {8, 15, "F"},
+    {9, 14, "E"},
+    {10, 18, "G"},
+    {20, 1, "Private Loop"},
+    {21, 1, "Point to Point"},
 };
 
 struct Speed_Code {
@@ -63,6 +86,19 @@ constexpr const Port_State& find_port_state(const Port_State (&map)[N], uint32 s
         if (row.state == state)
             return row;
     return UNKNOWN_PORT_STATE;
+}
+
+// State of an FCoE port between refreshes: a link that is down counts among the other states there.
+inline constexpr Port_State FCOE_LINK_DOWN = {6, 1, "Other"};
+constexpr const Port_State& find_fcoe_port_state(uint32 state) {
+    return state == FCOE_LINK_DOWN.state ? FCOE_LINK_DOWN : find_port_state(portStateMap, state);
+}
+
+constexpr const Port_Type& find_port_type(uint32 type) {
+    for (const Port_Type& row : portTypeMap)
+        if (row.type == type)
+            return row;
+    return UNKNOWN_PORT_TYPE;
 }
 
 constexpr uint16 enabled_state(uint32 state) {
@@ -93,6 +129,14 @@ template <class Device>
 void append_port_state(Device* device, const Port_State& state) {
     device->OperationalStatus.append(state.operational_status);
     device->StatusDescriptions.append(String(state.description));
+}
+
+// The same in place of what the properties hold.
+template <class Device>
+void replace_port_state(Device* device, const Port_State& state) {
+    device->OperationalStatus.clear();
+    device->StatusDescriptions.clear();
+    append_port_state(device, state);
 }
 
 } // namespace cimple

@@ -2,6 +2,12 @@
 
 #include "agent/provider_agent.h"
 #include "classes/VLNMPCA_EthernetPort.h"
+#include "device/bound_functions.h"
+#include "simulator/vlnsim.h"
+
+#include <dlfcn.h>
+
+#include <sched.h>
 
 #include <cstdio>
 
@@ -32,4 +38,51 @@ void vln_bench_clones() {
         copies.insert(clone(store.at(i)));
     for (uint32 i = 0; i < copies.size(); ++i)
         destroy(clone(copies.at(i)));
+}
+
+void vln_bench_bound_calls() {
+    for (unsigned i = 0; i < VLN_BENCH_CALLS; ++i)
+        AX_GetNumberOfLocalAdapters();
+}
+
+void vln_bench_direct_calls() {
+    void* library = dlopen("liblaxapi.so", RTLD_NOW);
+    const auto entry = reinterpret_cast<decltype(&AX_GetNumberOfLocalAdapters)>(
+        library ? dlsym(library, "AX_GetNumberOfLocalAdapters") : nullptr);
+    for (unsigned i = 0; entry && i < VLN_BENCH_CALLS; ++i)
+        entry();
+    if (library)
+        dlclose(library);
+}
+
+namespace {
+
+bool refresh_running(ProviderAgent& agent) {
+    Auto_Mutex lock(agent.m_DataFetchMutex);
+    return agent.m_bDataFetchRunning;
+}
+
+} // namespace
+
+bool vln_bench_refresh() {
+    constexpr uint64 HOUR = 3600ull * 1000000; // more than the data may be old
+    ProviderAgent* agent = ProviderAgent::current();
+    while (refresh_running(*agent))
+        sched_yield();
+    agent->m_bRefreshSANData = false;
+    const Datetime last = agent->m_LoadedTime;
+    vlnsim_advance(HOUR);
+    agent->BuildCimpleInfo();
+    while (refresh_running(*agent))
+        sched_yield();
+    return !(agent->m_LoadedTime == last);
+}
+
+unsigned vln_bench_instances() {
+    ProviderAgent* agent = ProviderAgent::current();
+    Auto_Mutex lock(agent->m_DataMutex);
+    unsigned count = 0;
+    for (const Store_Row& row : store_table)
+        count += row.store(*agent).size();
+    return count;
 }

@@ -12,4 +12,17 @@ VLN_BENCH_HOOK unsigned vln_bench_fill(unsigned count);
 // into a local map, and one more of each to give away.
 VLN_BENCH_HOOK void vln_bench_clones();
 
+// Call one function of the management library so many times: through its bound function, and by a
+// pointer to it. The difference is what the binding costs.
+inline constexpr unsigned VLN_BENCH_CALLS = 100000;
+VLN_BENCH_HOOK void vln_bench_bound_calls();
+VLN_BENCH_HOOK void vln_bench_direct_calls();
+
+// One full pass over the adapters, from the decision to the end of the thread, without a SAN pass,
+// an hour of the virtual clock after the last. False when none was made.
+VLN_BENCH_HOOK bool vln_bench_refresh();
+
+// Instances in all stores.
+VLN_BENCH_HOOK unsigned vln_bench_instances();
+
 #endif // BENCH_BENCH_HOOKS_H

@@ -1,4 +1,5 @@
 // Wall-clock times, for orientation: they vary with the machine, the instruction counts do not.
+#include "bench/bench_hooks.h"
 #include "host/manager.h"
 #include "simulator/vlnsim.h"
 
@@ -64,6 +65,26 @@ void enumeration_from_the_cache(benchmark::State& state) {
         benchmark::DoNotOptimize(manager.enumerate("VLNMPCA_EthernetPort"));
 }
 BENCHMARK(enumeration_from_the_cache)->Unit(benchmark::kMicrosecond);
+
+// So many calls of a function of the management library, with its binding and without.
+void library_calls(benchmark::State& state, const char* hook) {
+    simulate("two-port-cna.json");
+    host::Manager manager;
+    manager.load(VLN_BENCH_MODULE);
+    manager.enumerate("VLNMPCA_Card");
+    void* module = dlopen(VLN_BENCH_MODULE, RTLD_NOW);
+    const auto work = reinterpret_cast<void (*)()>(module ? dlsym(module, hook) : nullptr);
+    if (!work) {
+        state.SkipWithError("no such hook");
+        return;
+    }
+    for (auto _ : state)
+        work();
+    state.SetItemsProcessed(static_cast<int64_t>(state.iterations()) * VLN_BENCH_CALLS);
+    dlclose(module);
+}
+BENCHMARK_CAPTURE(library_calls, bound, "vln_bench_bound_calls");
+BENCHMARK_CAPTURE(library_calls, direct, "vln_bench_direct_calls");
 
 } // namespace
 

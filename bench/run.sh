@@ -1,17 +1,25 @@
 #!/usr/bin/env bash
-# Prints what an enumeration costs, from instruction counts (which repeat), then times and sizes.
+# Prints what an enumeration, a walk and a refresh cost, from instruction counts (which repeat), then
+# times and sizes.
 #   bench/run.sh BUILD-FOLDER
 set -euo pipefail
 build="$1"
 work="$(mktemp -d)"
 trap 'rm -rf "$work"' EXIT
 
-# Instructions inside the measured function.
-instructions() {
-    valgrind --tool=callgrind --callgrind-out-file="$work/out" --toggle-collect=vln_measured \
-        "$build/bin/bench_enumeration" "$1" "$2" >"$work/log" 2>&1 ||
-        { cat "$work/log" >&2; exit 1; }
+# Instructions of a program while the functions that the options toggle are running. What the program
+# itself prints stays in $work/result.
+count() {
+    local options="$1"
+    shift
+    # shellcheck disable=SC2086 # several options
+    valgrind --tool=callgrind --callgrind-out-file="$work/out" $options "$@" \
+        >"$work/result" 2>"$work/log" || { cat "$work/log" >&2; exit 1; }
     sed -n 's/.*Collected : \([0-9]*\).*/\1/p' "$work/log"
+}
+
+instructions() {
+    count --toggle-collect=vln_measured "$build/bin/bench_enumeration" "$1" "$2"
 }
 
 echo "Enumerating VLNMPCA_EthernetPort through the in-process object manager, instructions per instance"
@@ -24,6 +32,45 @@ for count in 100 1000 20000; do
     printf '%9d %10d %10d %10d %24s\n' $count $floor $clones $library \
         "$(awk "BEGIN { printf \"%.3f\", ($library - $clones) / $floor }")"
 done
+
+calls=100000 # as bench/bench_hooks.h has it
+bound=$(instructions bound 100)
+direct=$(instructions direct 100)
+echo
+echo "What a bound function adds to a call of the library: $(((bound - direct + calls / 2) / calls)) instructions"
+
+host="$build/bin/bench_host"
+echo
+echo "Walking every association of every instance of blade-16-functions, and of twice its cards"
+printf '%9s %10s %10s %14s %14s %18s\n' 'asked for' sources twice instructions twice 'ratio, at most 2.6'
+for what in names instances; do
+    once=$(count --toggle-collect=vln_measured "$host" walk $what 1)
+    read -r sources _ <"$work/result"
+    twice=$(count --toggle-collect=vln_measured "$host" walk $what 2)
+    read -r more _ <"$work/result"
+    printf '%9s %10d %10d %14d %14d %18s\n' $what "$sources" "$more" "$once" "$twice" \
+        "$(awk "BEGIN { printf \"%.2f\", $twice / $once }")"
+done
+
+# The adapters' library is left out by toggling again at each of its entries.
+pass="--toggle-collect=cimple::ProviderAgent::rebuildAdapterData()
+      --toggle-collect=cimple::ProviderAgent::rebuildAdapterMaps()"
+all=$(count "$pass" "$host" refresh 1)
+library="vlnsim::library"
+own=$(count "$pass --toggle-collect=${library}::AX_* --toggle-collect=${library}::LAX_*
+             --toggle-collect=${library}::HBA_*" "$host" refresh 1)
+read -r made passes _ <"$work/result"
+read -r _ _ time <<<"$("$host" refresh 1)"
+echo
+awk -v own="$own" -v all="$all" -v time="$time" -v made="$made" -v passes="$passes" 'BEGIN {
+    printf "A full adapter refresh of blade-16-functions makes %d instances, each at %.0f instructions", made,
+        own / passes / made
+    printf " and %.1f us\n(the library not counted; it takes %.0f %% of the %.0f us of a refresh)\n",
+        time * own / all / made, 100 * (1 - own / all), time }'
+read -r median most longest <<<"$("$host" latency 1)"
+printf 'An enumeration of VLNMPCA_EthernetPort while refreshes run: median %d us, 99 %% %d us, longest %d us\n' \
+    "$median" "$most" "$longest"
+printf 'memory: %d bytes per instance, the model of the devices included\n' "$("$host" memory 1)"
 
 module="$build/lib/libvorlan_mpca_provider.so"
 strip -o "$work/stripped.so" "$module"

@@ -2,7 +2,9 @@
 //
 // The provider that answers is the association's own, so the association class of a request is not
 // looked at. Most association providers implement no association operation at all: the answer is
-// then derived by enumerating the association and matching its references with the source.
+// then derived by enumerating the association and matching its references with the source. The
+// enumeration is told what the matching will look for, so that a provider can spare itself the
+// rest; docs/association-index.md says why that changes no answer.
 //
 // No function here calls CMReturnDone: the object manager closes the result at the end of the call.
 #include "cimple/cmpi_frame.h"
@@ -139,8 +141,9 @@ sint32 enum_associator_names_with_fallback(const Call& call, const Request& requ
 
     const Ref<Instance> model = make_association_model(call);
     Associator_Match match = {request, handler, client_data};
+    const Enumeration_Focus focus = {Enumeration_Focus::REFERENCES_TO, request.source};
     const sint32 enum_status =
-        call.provider(OP_ENUM_INSTANCES, model.get(), &pass_associators, &match);
+        call.provider(OP_ENUM_INSTANCES, model.get(), &pass_associators, &match, &focus);
     const sint32 answer = enum_status == ENUM_INSTANCES_FAILED ? ENUM_ASSOCIATOR_NAMES_FAILED
                           : enum_status == ENUM_INSTANCES_ACCESS_DENIED
                               ? ENUM_ASSOCIATOR_NAMES_ACCESS_DENIED
@@ -178,7 +181,9 @@ sint32 enum_references_with_fallback(const Call& call, const Instance* source,
         return status;
 
     Reference_Match match = {source, role, handler, client_data};
-    const sint32 enum_status = call.provider(OP_ENUM_INSTANCES, model, &pass_reference, &match);
+    const Enumeration_Focus focus = {Enumeration_Focus::REFERENCES_TO, source};
+    const sint32 enum_status =
+        call.provider(OP_ENUM_INSTANCES, model, &pass_reference, &match, &focus);
     const sint32 answer = enum_status == ENUM_INSTANCES_FAILED ? ENUM_REFERENCES_FAILED
                           : enum_status == ENUM_INSTANCES_ACCESS_DENIED
                               ? ENUM_REFERENCES_ACCESS_DENIED

@@ -143,7 +143,8 @@ sint32 get_instance_with_fallback(const Call& call, const Instance* model, Ref<I
     if (status != GET_INSTANCE_UNSUPPORTED)
         return status;
     Key_Search search = {model, {}};
-    call.provider(OP_ENUM_INSTANCES, model, &keep_match, &search);
+    const Enumeration_Focus focus = {Enumeration_Focus::KEYS, model};
+    call.provider(OP_ENUM_INSTANCES, model, &keep_match, &search, &focus);
     found = search.found;
     return found ? GET_INSTANCE_OK : GET_INSTANCE_NOT_FOUND;
 }

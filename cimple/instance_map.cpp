@@ -1,40 +1,27 @@
 #include "cimple/instance_map.h"
 
-#include "cimple/instance_detail.h"
+#include "cimple/end_index.h"
 
-#include <algorithm>
-#include <bit>
 #include <utility>
-#include <vector>
 
 namespace cimple {
 
 using detail::Key_Signature;
 
 // An open hash table of member positions, so that filling or copying a store stays linear.
-//
-// Equal keys imply equal hashes only within one shape, see Key_Signature. A store practically
-// always has one; the index keeps count of them all, and says when a look-up has to walk the
-// members.
 struct Instance_Map_Base::Key_Index {
-    struct Shape {
-        uint64 shape;
-        uint32 count;
-        const Instance* sample; // any member of that shape
-    };
-
     static constexpr uint32 FREE = 0xFFFFFFFF;
     static constexpr std::size_t SMALLEST_TABLE = 16;
 
-    std::vector<Key_Signature> signatures; // one per member
-    std::vector<uint32> table;             // positions; a power of two, at most half full
-    std::vector<Shape> shapes;
+    std::vector<Key_Signature> signatures;      // one per member
+    std::vector<uint32> table;                  // positions; a power of two, at most half full
+    detail::Key_Shapes<const Instance*> shapes; // the sample: any member of that shape
 
     // Makes the next add succeed without allocating.
     void reserve_one() {
         const std::size_t count = signatures.size() + 1;
         signatures.reserve(std::bit_ceil(count));
-        shapes.reserve(std::bit_ceil(shapes.size() + 1));
+        shapes.reserve_one();
         if (2 * count > table.size()) {
             std::vector<uint32> grown(std::max(SMALLEST_TABLE, std::bit_ceil(2 * count)), FREE);
             table.swap(grown);
@@ -45,12 +32,7 @@ struct Instance_Map_Base::Key_Index {
     void add(const Instance* instance, const Key_Signature& signature) noexcept {
         place(static_cast<uint32>(signatures.size()), signature.hash);
         signatures.push_back(signature);
-        const auto known = std::find_if(shapes.begin(), shapes.end(),
-                                        [&](const Shape& s) { return s.shape == signature.shape; });
-        if (known != shapes.end())
-            ++known->count;
-        else
-            shapes.push_back({signature.shape, 1, instance});
+        shapes.add(signature.shape, instance);
     }
 
     // Forgets a member that has left the list already.
@@ -59,37 +41,18 @@ struct Instance_Map_Base::Key_Index {
         signatures.erase(signatures.begin() + static_cast<std::ptrdiff_t>(position));
         std::fill(table.begin(), table.end(), FREE);
         place_all();
-        const auto known = std::find_if(shapes.begin(), shapes.end(),
-                                        [&](const Shape& s) { return s.shape == shape; });
-        if (--known->count == 0) {
-            shapes.erase(known);
-            return;
-        }
-        const auto heir = std::find_if(signatures.begin(), signatures.end(),
-                                       [&](const Key_Signature& s) { return s.shape == shape; });
-        known->sample = members[static_cast<uint32>(heir - signatures.begin())];
-    }
-
-    void assign(const Array<Instance*>& members) {
-        Key_Index fresh;
-        for (const Instance* member : members) {
-            fresh.reserve_one();
-            fresh.add(member, detail::key_signature(member));
-        }
-        *this = std::move(fresh);
+        shapes.remove(shape, [&]() noexcept -> const Instance* {
+            const auto heir =
+                std::find_if(signatures.begin(), signatures.end(),
+                             [&](const Key_Signature& s) { return s.shape == shape; });
+            return members[static_cast<uint32>(heir - signatures.begin())];
+        });
     }
 
     void clear() noexcept {
         signatures.clear();
         table.clear();
         shapes.clear();
-    }
-
-    // Whether a member of another shape than the keys' might still match them.
-    bool needs_walk(const Instance* keys, const Key_Signature& signature) const {
-        return std::any_of(shapes.begin(), shapes.end(), [&](const Shape& s) {
-            return s.shape != signature.shape && detail::keys_embed(keys, s.sample);
-        });
     }
 
     // First position with that signature that match accepts, or -1.
@@ -140,22 +103,22 @@ Instance* Instance_Map_Base::at(uint32 index) const noexcept {
     return index < _members.size() ? _members[index] : nullptr;
 }
 
-sint32 Instance_Map_Base::find_match(const Instance* keys, const Key_Signature& signature) const {
-    if (_index->needs_walk(keys, signature)) {
-        for (uint32 i = 0; i < _members.size(); ++i) {
-            if (key_eq(keys, _members[i]))
-                return static_cast<sint32>(i);
-        }
-        return -1;
+sint32 Instance_Map_Base::find_match(const Key_Index& index, const Instance* keys,
+                                     const Key_Signature& signature) const {
+    const auto matches = [&](uint32 position) { return key_eq(keys, _members[position]); };
+    if (!index.shapes.others_may_match(keys, signature, [](const Instance* s) { return s; }))
+        return index.find(signature, matches);
+    for (uint32 i = 0; i < index.signatures.size(); ++i) {
+        if (matches(i))
+            return static_cast<sint32>(i);
     }
-    return _index->find(signature,
-                        [&](uint32 position) { return key_eq(keys, _members[position]); });
+    return -1;
 }
 
 sint32 Instance_Map_Base::find(const Instance* keys) const {
     if (!keys || _members.empty())
         return -1;
-    return find_match(keys, detail::key_signature(keys));
+    return find_match(*_index, keys, detail::key_signature(keys));
 }
 
 Instance* Instance_Map_Base::lookup(const Instance* keys) const {
@@ -205,7 +168,8 @@ sint32 Instance_Map_Base::modify_instance(const Instance* model, const Instance*
     copy(member, instance, model);
     // A key reference may now lead to an instance with more keys than the one that it matched.
     if (!(detail::key_signature(member) == _index->signatures[static_cast<std::size_t>(index)]))
-        _index->assign(_members);
+        reindex();
+    changed();
     return MODIFY_INSTANCE_OK;
 }
 
@@ -213,11 +177,12 @@ sint32 Instance_Map_Base::insert(Instance* instance) {
     if (!instance)
         return -1;
     const Key_Signature signature = detail::key_signature(instance);
-    if (find_match(instance, signature) >= 0)
+    if (find_match(*_index, instance, signature) >= 0)
         return -1;
     _index->reserve_one();
     _members.append(instance);
     _index->add(instance, signature);
+    changed();
     return static_cast<sint32>(_members.size()) - 1;
 }
 
@@ -226,12 +191,54 @@ void Instance_Map_Base::remove(uint32 index) {
         return;
     _members.remove(index);
     _index->remove(index, _members);
+    changed();
+}
+
+// Does to the members' keys what a copy of the store does: whether each of them would go in.
+bool Instance_Map_Base::reindex() {
+    auto fresh = std::make_unique<Key_Index>();
+    bool distinct = true;
+    for (const Instance* member : _members) {
+        const Key_Signature signature = detail::key_signature(member);
+        distinct = distinct && find_match(*fresh, member, signature) < 0;
+        fresh->reserve_one();
+        fresh->add(member, signature);
+    }
+    _index = std::move(fresh);
+    return distinct;
+}
+
+void Instance_Map_Base::changed() noexcept {
+    _keys = Keys::UNCHECKED;
+    _ends.reset();
+}
+
+std::optional<std::vector<uint32>> Instance_Map_Base::narrow(const Enumeration_Focus& focus) {
+    if (_keys == Keys::UNCHECKED)
+        _keys = reindex() ? Keys::DISTINCT : Keys::EQUAL;
+    if (_keys == Keys::EQUAL)
+        return std::nullopt;
+    std::vector<uint32> positions;
+    if (focus.kind == Enumeration_Focus::KEYS) {
+        if (const sint32 match = find(focus.instance); match >= 0)
+            positions.push_back(static_cast<uint32>(match));
+        return positions;
+    }
+    if (!_ends) {
+        auto ends = std::make_unique<End_Index>();
+        ends->build(_members);
+        _ends = std::move(ends);
+    }
+    if (!_ends->find(focus.instance, _members, positions))
+        return std::nullopt;
+    return positions;
 }
 
 void Instance_Map_Base::clear() noexcept {
     Array<Instance*> members;
     members.swap(_members);
     _index->clear();
+    changed();
     for (Instance* member : members)
         unref(member);
 }

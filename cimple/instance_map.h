@@ -4,15 +4,19 @@
 // providers directly. Not locked: the owner's mutex guards it. Whoever holds that may change a
 // member in place, but not its keys: the store looks members up by the keys they came with. Filling
 // a store and copying it are linear in its size, a look-up is constant, taking a member out is
-// linear.
+// linear. narrow takes linear time once after a change of the store, and then as much as it finds.
 #ifndef CIMPLE_INSTANCE_MAP_H
 #define CIMPLE_INSTANCE_MAP_H
 
 #include "cimple/registration.h"
 
 #include <memory>
+#include <optional>
+#include <vector>
 
 namespace cimple {
+
+class End_Index;
 
 namespace detail {
 struct Key_Signature;
@@ -32,6 +36,12 @@ public:
     sint32 find(const Instance* keys) const;      // first index with key_eq(keys, member), or -1
     Instance* lookup(const Instance* keys) const; // borrowed, or null
 
+    // Ascending positions of members with all those among them that a receiver with this focus does
+    // not ignore: enough of the store for it. Nothing when all of the store is needed, because that
+    // cannot be told, or because two members have equal keys, which the copy of the store is to
+    // find.
+    std::optional<std::vector<uint32>> narrow(const Enumeration_Focus& focus);
+
     // Provider-visible operations. What goes in is copied, what comes out is the caller's.
     sint32 get_instance(const Instance* keys, Instance*& out) const;    // 0 or 60
     sint32 enum_instances(const Enum_Instances_Handler& handler) const; // 0; ends when told to stop
@@ -49,11 +59,19 @@ public:
 
 private:
     struct Key_Index; // hash of the key values to positions
-    sint32 find_match(const Instance* keys, const detail::Key_Signature& signature) const;
+    enum class Keys : uint8 { UNCHECKED, DISTINCT, EQUAL };
+
+    // Searches the members that are in the index.
+    sint32 find_match(const Key_Index& index, const Instance* keys,
+                      const detail::Key_Signature& signature) const;
+    bool reindex();
+    void changed() noexcept;
 
     const Meta_Class* _meta_class;
     Array<Instance*> _members;
     std::unique_ptr<Key_Index> _index;
+    Keys _keys = Keys::UNCHECKED;     // since the last change
+    std::unique_ptr<End_Index> _ends; // null: not built since the last change
 };
 
 template <class T>

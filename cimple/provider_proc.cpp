@@ -86,8 +86,9 @@ private:
 
 sint32 enum_instances(const Provider_Operations& operations, const Provider_Word (&args)[8]) {
     const In_Class model(operations.meta_class, pointer<Instance>(args[1]));
-    const sint32 status = operations.enum_instances(pointer<void>(args[0]), model.get(),
-                                                    handler_of(args[2], args[3]));
+    const Instance_Handler handler(reinterpret_cast<Instance_Proc>(args[2]), pointer<void>(args[3]),
+                                   pointer<const Enumeration_Focus>(args[4]));
+    const sint32 status = operations.enum_instances(pointer<void>(args[0]), model.get(), handler);
     return close_stream(args[2], args[3], status);
 }
 

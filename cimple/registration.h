@@ -1,5 +1,5 @@
-// How a class is bound to its provider: the registration record, the numbered provider procedure, the
-// enumeration handler and the status numbers that providers answer.
+// How a class is bound to its provider: the registration record, the numbered provider procedure,
+// the enumeration handler and the status numbers that providers answer.
 #ifndef CIMPLE_REGISTRATION_H
 #define CIMPLE_REGISTRATION_H
 
@@ -35,7 +35,8 @@ enum Provider_Operation : int {
     OP_LOAD = 3,                 //
     OP_UNLOAD = 4,               //
     OP_GET_INSTANCE = 5,         // keys Instance*, Instance** out (caller owns)
-    OP_ENUM_INSTANCES = 6,       // model Instance*, Instance_Proc, client data
+    OP_ENUM_INSTANCES = 6,       // model Instance*, Instance_Proc, client data, and, or 0,
+                                 // const Enumeration_Focus*
     OP_CREATE_INSTANCE = 7,      // Instance*
     OP_DELETE_INSTANCE = 8,      // Instance*
     OP_MODIFY_INSTANCE = 9,      // model Instance*, Instance*
@@ -45,7 +46,7 @@ enum Provider_Operation : int {
     OP_GET_REPOSITORY = 13,      // arg0: const Meta_Repository** out
     // Instance*, result class, role, result role (const char*), Instance_Proc, client data
     OP_ENUM_ASSOCIATOR_NAMES = 14,
-    OP_ENUM_REFERENCES = 15, // Instance*, model Instance*, role, Instance_Proc, client data
+    OP_ENUM_REFERENCES = 15,  // Instance*, model Instance*, role, Instance_Proc, client data
     OP_ENUM_ASSOCIATORS = 16, // as 14
 };
 
@@ -54,17 +55,33 @@ enum Provider_Operation : int {
 using Instance_Proc = bool (*)(Instance* instance, sint32 status, void* client_data);
 using Indication_Proc = bool (*)(Instance* indication, void* client_data);
 
+// What the receiver of an enumeration is after: it ignores every other instance. A provider that
+// can tell them at less cost may leave those out, and nothing else: what it delivers stays in its
+// order. Most providers take no notice.
+struct Enumeration_Focus {
+    enum Kind : uint8 {
+        KEYS,          // the first instance for which key_eq(this one, it) holds
+        REFERENCES_TO, // associations for which is_reference_to(it, this one, "") holds
+    };
+    Kind kind;
+    const Instance* instance;
+};
+
 // What a provider hands its instances to.
 class Instance_Handler {
 public:
-    Instance_Handler(Instance_Proc proc, void* client_data) noexcept
-        : _proc(proc), _client_data(client_data) {}
+    Instance_Handler(Instance_Proc proc, void* client_data,
+                     const Enumeration_Focus* focus = nullptr) noexcept
+        : _proc(proc), _client_data(client_data), _focus(focus) {}
+    // Null: everything is wanted.
+    const Enumeration_Focus* focus() const noexcept { return _focus; }
     // Takes over the instance; false asks the provider to stop.
     bool handle(Instance* instance) const { return _proc(instance, 0, _client_data); }
 
 private:
     Instance_Proc _proc;
     void* _client_data;
+    const Enumeration_Focus* _focus;
 };
 using Enum_Instances_Handler = Instance_Handler;
 using Enum_Associator_Names_Handler = Instance_Handler;

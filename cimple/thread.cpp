@@ -9,10 +9,15 @@
 #include <cerrno>
 #include <cstdio>
 #include <cstring>
+#include <ctime>
 #include <memory>
 #include <new>
 
 namespace cimple {
+
+namespace {
+constexpr uint64 USEC_PER_SECOND = 1000000;
+}
 
 // ---- The lock order ----
 
@@ -116,6 +121,13 @@ void Cond::broadcast() {
 
 void Cond::wait(Mutex& mutex) {
     pthread_cond_wait(&_cond, &mutex._mutex);
+}
+
+bool Cond::wait_until(Mutex& mutex, uint64 monotonic_usec) {
+    timespec end{};
+    end.tv_sec = static_cast<time_t>(monotonic_usec / USEC_PER_SECOND);
+    end.tv_nsec = static_cast<long>(monotonic_usec % USEC_PER_SECOND * 1000);
+    return pthread_cond_clockwait(&_cond, &mutex._mutex, CLOCK_MONOTONIC, &end) == 0;
 }
 
 // ---- Thread ----
@@ -223,8 +235,34 @@ Thread Thread::self() {
 // ---- Time ----
 
 namespace {
+
 std::atomic<const Time::Clock*> the_clock{&system_clock};
+
+// All pauses of the process share one condition: there are few, and a stop is rare.
+constinit Process_Wide<Mutex> pause_mutex;
+constinit Process_Wide<Cond> pause_cond;
+
+uint64 monotonic_now() {
+    timespec present{};
+    clock_gettime(CLOCK_MONOTONIC, &present);
+    return static_cast<uint64>(present.tv_sec) * USEC_PER_SECOND +
+           static_cast<uint64>(present.tv_nsec) / 1000;
 }
+
+void host_pause(uint64 usec, const bool& stop) {
+    const uint64 end = monotonic_now() + usec;
+    Auto_Mutex lock(*pause_mutex);
+    while (!load_flag(stop) && pause_cond->wait_until(*pause_mutex, end))
+        ;
+}
+
+// The flag went up before: a thread that has tested it under the mutex waits by now.
+void host_wake() {
+    Auto_Mutex lock(*pause_mutex);
+    pause_cond->broadcast();
+}
+
+} // namespace
 
 uint64 Time::now() {
     return the_clock.load(std::memory_order_relaxed)->now();
@@ -232,6 +270,18 @@ uint64 Time::now() {
 
 void Time::sleep(uint64 usec) {
     the_clock.load(std::memory_order_relaxed)->sleep(usec);
+}
+
+void Time::pause(uint64 usec, const bool& stop) {
+    const auto clock_pause = the_clock.load(std::memory_order_relaxed)->pause;
+    (clock_pause ? clock_pause : host_pause)(usec, stop);
+}
+
+// Both ways: a thread that is to be woken may have gone to rest before the clock was replaced.
+void Time::wake() {
+    host_wake();
+    if (const auto clock_wake = the_clock.load(std::memory_order_relaxed)->wake)
+        clock_wake();
 }
 
 void Time::replace_clock(const Clock* clock) {

@@ -67,6 +67,8 @@ public:
     void broadcast();
     // One wait, no time-out, no loop: the caller tests its condition itself.
     void wait(Mutex& mutex);
+    // The same, until that time of the monotonic clock at the latest; false when it has come.
+    bool wait_until(Mutex& mutex, uint64 monotonic_usec);
 
 private:
     pthread_cond_t _cond = PTHREAD_COND_INITIALIZER;
@@ -114,15 +116,30 @@ private:
     pthread_t _thread{};
 };
 
+// A plain byte that threads share without a lock, where a late reading does no harm.
+inline bool load_flag(const bool& flag) noexcept {
+    return __atomic_load_n(&flag, __ATOMIC_RELAXED);
+}
+inline void raise_flag(bool& flag) noexcept {
+    __atomic_store_n(&flag, true, __ATOMIC_RELAXED);
+}
+
 // The process's clock. Tests replace it; the product never does.
 class Time {
 public:
     static uint64 now();            // microseconds since the epoch, 0 if the clock fails
     static void sleep(uint64 usec); // a signal ends it early
+    // A sleep of a thread that another one may want to join: it ends early once `stop` is raised
+    // and wake called, in this order. A flag that is up already ends it at once.
+    static void pause(uint64 usec, const bool& stop);
+    static void wake();
 
     struct Clock {
         uint64 (*now)();
         void (*sleep)(uint64 usec);
+        // Without them a pause takes the host's time.
+        void (*pause)(uint64 usec, const bool& stop) = nullptr;
+        void (*wake)() = nullptr;
     };
     static void replace_clock(const Clock* clock); // null: system_clock
 };

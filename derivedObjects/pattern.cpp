@@ -3,59 +3,89 @@
 #include "agent/gates.h"
 #include "agent/provider_agent.h"
 
+#include <optional>
+#include <vector>
+
 namespace cimple {
 
 namespace {
 
-// Clones the row's stores. False, with a line in the log, when two of their instances have equal
-// keys.
-bool copy_stores(ProviderAgent& agent, const Pattern_Row& row, Instance_Map_Base& copies) {
-    for (Store_Id id : row.stores) {
+// What an enumeration makes under the locks, to be delivered without them.
+struct Copying {
+    const Pattern_Row& row;
+    const Enumeration_Focus* focus; // null: everything is wanted
+    Instance_Map_Base copies;
+};
+
+// False, with a line in the log, when a copy has an equal key.
+bool copy_member(const Instance_Map_Base& store, uint32 index, Instance_Map_Base& copies) {
+    Ref<Instance> copy(clone(store.at(index)));
+    if (copies.insert(copy.get()) < 0) {
+        VLN_LOG(VLN_CRIT, "Insert failed for %zu", static_cast<std::size_t>(index));
+        return false;
+    }
+    copy.release();
+    return true;
+}
+
+// The members that the receiver will look at, if the store can tell them. Only a store by itself
+// knows its members' keys to be distinct: several stores of one class are copied whole.
+std::optional<std::vector<uint32>> wanted_members(Instance_Map_Base& store,
+                                                  const Copying& copying) {
+    if (!copying.focus || copying.row.stores[1] != NO_STORE)
+        return std::nullopt;
+    return store.narrow(*copying.focus);
+}
+
+// Clones the row's stores. False when two of their instances have equal keys.
+bool copy_stores(ProviderAgent& agent, Copying& copying) {
+    for (Store_Id id : copying.row.stores) {
         if (id == NO_STORE)
             return true;
-        const Instance_Map_Base& store = agent.store(id);
-        for (uint32 i = 0; i < store.size(); ++i) {
-            Ref<Instance> copy(clone(store.at(i)));
-            if (copies.insert(copy.get()) < 0) {
-                VLN_LOG(VLN_CRIT, "Insert failed for %zu", static_cast<std::size_t>(i));
-                return false;
-            }
-            copy.release();
+        Instance_Map_Base& store = agent.store(id);
+        if (const auto wanted = wanted_members(store, copying)) {
+            for (uint32 index : *wanted)
+                if (!copy_member(store, index, copying.copies))
+                    return false;
+            continue;
         }
+        for (uint32 i = 0; i < store.size(); ++i)
+            if (!copy_member(store, i, copying.copies))
+                return false;
     }
     return true;
 }
 
-bool copy_adapter_group(ProviderAgent& agent, const Pattern_Row& row, Instance_Map_Base& copies) {
+bool copy_adapter_group(ProviderAgent& agent, Copying& copying) {
     agent.BuildCimpleInfo();
     const Gate maps = adapter_maps_gate(agent);
     Auto_Mutex data(agent.m_DataMutex);
-    return copy_stores(agent, row, copies);
+    return copy_stores(agent, copying);
 }
 
-bool copy_san_group(ProviderAgent& agent, const Pattern_Row& row, Instance_Map_Base& copies) {
+bool copy_san_group(ProviderAgent& agent, Copying& copying) {
     request_stale_san_maps(agent);
     agent.BuildCimpleInfo();
     const Gate maps = san_maps_gate(agent);
     Auto_Mutex data(agent.m_DataMutex);
-    return copy_stores(agent, row, copies);
+    return copy_stores(agent, copying);
 }
 
-bool copy_active(ProviderAgent& agent, const Pattern_Row& row, Instance_Map_Base& copies) {
+bool copy_active(ProviderAgent& agent, Copying& copying) {
     agent.BuildCimpleInfo();
     const Gate adapters = adapter_data_gate(agent);
     const Gate maps = adapter_maps_gate(agent);
     Auto_Mutex data(agent.m_DataMutex);
     {
-        Auto_Mutex update(row.update_mutex());
-        if (row.update)
-            row.update(agent);
+        Auto_Mutex update(copying.row.update_mutex());
+        if (copying.row.update)
+            copying.row.update(agent);
     }
-    return copy_stores(agent, row, copies);
+    return copy_stores(agent, copying);
 }
 
 struct Shape_Steps {
-    bool (*copy)(ProviderAgent& agent, const Pattern_Row& row, Instance_Map_Base& copies);
+    bool (*copy)(ProviderAgent& agent, Copying& copying);
     const char* exception; // the line of the guard
 };
 
@@ -78,9 +108,9 @@ void enumerate(ProviderAgent& agent, const Pattern_Row& row,
                const Enum_Instances_Handler& handler) {
     const Shape_Steps& shape = SHAPES[static_cast<std::size_t>(row.shape)];
     try {
-        Instance_Map_Base copies(row.meta_class);
-        if (shape.copy(agent, row, copies))
-            deliver(copies, handler);
+        Copying copying = {row, handler.focus(), Instance_Map_Base(row.meta_class)};
+        if (shape.copy(agent, copying))
+            deliver(copying.copies, handler);
     } catch (...) {
         VLN_LOG(VLN_CRIT, "%s", shape.exception);
     }

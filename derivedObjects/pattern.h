@@ -63,7 +63,8 @@ sint32 pattern_load() noexcept;
 // Gives the reference back; the last one destroys the agent.
 sint32 pattern_unload(const Pattern_Row& row) noexcept;
 
-// Hands a clone of each stored instance to the handler, on the caller's thread with no lock held.
+// Hands a clone of each stored instance to the handler, on the caller's thread with no lock held;
+// of those only that the handler looks at, if it tells and the store can find them.
 // Answers 0 always: an exception makes the enumeration short, and two stored instances with equal
 // keys make it empty.
 sint32 pattern_enum_instances(const Pattern_Row& row,

@@ -1,6 +1,7 @@
 // The row of each of the provider's classes. A class has the shape of its store's group, and six
 // classes are active.
 
+#include "agent/dynamic_status.h"
 #include "agent/lock_order.h"
 #include "derivedObjects/pattern.h"
 #include "stored_classes.h"
@@ -23,13 +24,16 @@ struct Active_Row {
 
 // The classes that refresh some of their properties at the moment of the call.
 constexpr Active_Row ACTIVE_ROWS[] = {
-    {PATTERN_VLNMPCA_PortController, nullptr, update_mutex<PATTERN_VLNMPCA_PortController>},
-    {PATTERN_VLNMPCA_EthernetPort, nullptr, update_mutex<PATTERN_VLNMPCA_EthernetPort>},
-    {PATTERN_VLNMPCA_Card, nullptr, update_mutex<PATTERN_VLNMPCA_Card>},
-    {PATTERN_VLNMPCA_FCPortStatistics, nullptr, update_mutex<PATTERN_VLNMPCA_FCPortStatistics>},
+    {PATTERN_VLNMPCA_PortController, UpdatePhyLinkDownReason,
+     update_mutex<PATTERN_VLNMPCA_PortController>},
+    {PATTERN_VLNMPCA_EthernetPort, UpdateEthernetPortStatus,
+     update_mutex<PATTERN_VLNMPCA_EthernetPort>},
+    {PATTERN_VLNMPCA_Card, UpdateBoardTemp, update_mutex<PATTERN_VLNMPCA_Card>},
+    {PATTERN_VLNMPCA_FCPortStatistics, GetFCoEPortStats,
+     update_mutex<PATTERN_VLNMPCA_FCPortStatistics>},
     {PATTERN_VLNMPCA_DriverParameterSettingData, nullptr,
      update_mutex<PATTERN_VLNMPCA_DriverParameterSettingData>},
-    {PATTERN_VLNMPCA_FCPort, nullptr, update_mutex<PATTERN_VLNMPCA_FCPort>},
+    {PATTERN_VLNMPCA_FCPort, UpdateFCoEPortStatus, update_mutex<PATTERN_VLNMPCA_FCPort>},
 };
 
 struct Extra_Store {

@@ -17,4 +17,7 @@ struct Provider_For {
 
 } // namespace cimple
 
+#include "services/base_server_profile.h"
+#include "services/configuration_setting.h"
+
 #endif // VLN_DERIVED_OBJECTS_PROVIDER_FOR_H

@@ -9,21 +9,12 @@
 #include <net/if.h>
 #include <sys/ioctl.h>
 #include <sys/socket.h>
-#include <unistd.h>
 
 namespace cimple {
 
 namespace {
 
-constexpr IP_Calls KERNEL = {
-    ::socket,
-    [](int descriptor, unsigned long request, void* argument) {
-        return ::ioctl(descriptor, request, argument);
-    },
-    ::close,
-};
-
-std::atomic<const IP_Calls*> calls{&KERNEL};
+std::atomic<const IP_Calls*> calls{&kernel_ip_calls};
 
 // What the kernel answers, in a record with the interface's name. False if it does not.
 bool ask(int socket, unsigned long request, const std::string& name, ifreq& record) {
@@ -58,7 +49,7 @@ VLN_IPInterfaceConfig::~VLN_IPInterfaceConfig() {
 }
 
 void VLN_IPInterfaceConfig::setCalls(const IP_Calls* replacement) {
-    calls = replacement ? replacement : &KERNEL;
+    calls = replacement ? replacement : &kernel_ip_calls;
 }
 
 bool VLN_IPInterfaceConfig::GetInterfaceState(const std::string& interfaceName) {

@@ -10,12 +10,16 @@
 
 namespace cimple {
 
-// The kernel's calls of these queries, netdevice(7). Tests put their own in their place.
+// The kernel's calls of these queries, netdevice(7).
 struct IP_Calls {
     int (*socket)(int domain, int type, int protocol);
     int (*ioctl)(int descriptor, unsigned long request, void* argument);
     int (*close)(int descriptor);
 };
+
+// What is asked unless a test puts its own in the place. Of a source of its own: the module for
+// simulation is linked with another one.
+extern const IP_Calls kernel_ip_calls;
 
 class VLN_IPInterfaceConfig {
 public:

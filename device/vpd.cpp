@@ -137,7 +137,8 @@ void store(FRUVPD& record, Entry& entry) {
 // So there is room behind for the longest one, all zero, which also ends a list without an end.
 constexpr std::size_t ROOM_BEHIND = AX_VPD_TAG_SIZE + AX_VPD_VALUE_SIZE;
 
-void walk(FRUVPD& record, char* buffer) {
+template <class Take>
+void walk(char* buffer, Take take) {
     char* cursor = buffer;
     while (cursor < buffer + AX_VPD_BUFFER_SIZE) {
         Entry entry{};
@@ -145,7 +146,7 @@ void walk(FRUVPD& record, char* buffer) {
             AX_GetNextVpdEntry(cursor, entry.tag, AX_VPD_TAG_SIZE, entry.value, AX_VPD_VALUE_SIZE);
         if (!next)
             return;
-        store(record, entry);
+        take(entry);
         // Only forward, and not out of the buffer, whatever the library answers.
         const auto step =
             reinterpret_cast<std::uintptr_t>(next) - reinterpret_cast<std::uintptr_t>(cursor);
@@ -153,6 +154,37 @@ void walk(FRUVPD& record, char* buffer) {
             return;
         cursor += step;
     }
+}
+
+// Reads the data with call(wwn, buffer, size) and hands each entry to take(entry).
+template <class Call, class Take>
+AX_STATUS read_entries(const char* deviceId, const char* function, Call call, Take take) {
+    char colonForm[VLN_MethodWrapper::HBA_NAME_SIZE];
+    if (VLN_MethodWrapper::Id2HBAName(colonForm, deviceId) != 0) {
+        VLN_LOG(VLN_DBG, "Id2HBAName failed");
+        return AX_STATUS_ERROR;
+    }
+    HBA_WWN name{};
+    if (VLN_MethodWrapper::str2HBAName(&name, colonForm) != 0) {
+        VLN_LOG(VLN_DBG, "str2HBAName failed");
+        return AX_STATUS_ERROR;
+    }
+    const auto buffer = std::make_unique<char[]>(AX_VPD_BUFFER_SIZE + ROOM_BEHIND);
+    uint32 size = AX_VPD_BUFFER_SIZE;
+    const AX_STATUS status = call(AX_WwnOf(&name), buffer.get(), &size);
+    if (status != AX_STATUS_OK) {
+        VLN_LOG(VLN_DBG, "ERROR: %s call failed : %d", function, status);
+        return status;
+    }
+    walk(buffer.get(), take);
+    return AX_STATUS_OK;
+}
+
+std::string ascii_text(const char* characters) {
+    std::string text = characters;
+    std::replace_if(
+        text.begin(), text.end(), [](char c) { return c < ' ' || c > '~'; }, '?');
+    return text;
 }
 
 } // namespace
@@ -171,26 +203,23 @@ AX_STATUS VLN_Vpd::GetFRUVPD(const char* deviceId, FRUVPD* record) {
         VLN_LOG(VLN_DBG, "Invalid Parameter");
         return AX_STATUS_INVALID_ARGUMENT;
     }
-    char colonForm[VLN_MethodWrapper::HBA_NAME_SIZE];
-    if (VLN_MethodWrapper::Id2HBAName(colonForm, deviceId) != 0) {
-        VLN_LOG(VLN_DBG, "Id2HBAName failed");
-        return AX_STATUS_ERROR;
-    }
-    HBA_WWN name{};
-    if (VLN_MethodWrapper::str2HBAName(&name, colonForm) != 0) {
-        VLN_LOG(VLN_DBG, "str2HBAName failed");
-        return AX_STATUS_ERROR;
-    }
     constexpr uint32 VERSION = 1;
-    const auto buffer = std::make_unique<char[]>(AX_VPD_BUFFER_SIZE + ROOM_BEHIND);
-    uint32 size = AX_VPD_BUFFER_SIZE;
-    const AX_STATUS status = AX_GetVPDV2(AX_WwnOf(&name), VERSION, buffer.get(), &size);
-    if (status != AX_STATUS_OK) {
-        VLN_LOG(VLN_DBG, "ERROR: AX_GetVPDV2 call failed : %d", status);
-        return status;
+    return read_entries(
+        deviceId, "AX_GetVPDV2",
+        [](AX_WWN wwn, void* buffer, uint32_t* size) {
+            return AX_GetVPDV2(wwn, VERSION, buffer, size);
+        },
+        [record](Entry& entry) { store(*record, entry); });
+}
+
+AX_STATUS VLN_Vpd::GetPCIVPD(const char* deviceId, std::vector<PCI_VPD_Entry>* entries) {
+    if (!deviceId || !entries) {
+        VLN_LOG(VLN_DBG, "Invalid Parameter");
+        return AX_STATUS_INVALID_ARGUMENT;
     }
-    walk(*record, buffer.get());
-    return AX_STATUS_OK;
+    return read_entries(deviceId, "AX_GetVPD", AX_GetVPD, [entries](const Entry& entry) {
+        entries->push_back({ascii_text(entry.tag), ascii_text(entry.value)});
+    });
 }
 
 uint32 VLN_Vpd::GetCardFunctionText(uint32 function, std::string& text) {

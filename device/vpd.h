@@ -7,6 +7,7 @@
 
 #include <cstddef>
 #include <string>
+#include <vector>
 
 namespace cimple {
 
@@ -45,6 +46,13 @@ static_assert(sizeof(FRUVPD) == 1520);
 
 inline constexpr uint32 VLN_NOT_FOUND = 32768; // the system's own status of a look-up
 
+// An entry of the PCI function's own vital product data, PCI Local Bus Specification 3.0, appendix
+// I: a keyword and its value up to the first zero byte, "?" for what is no ASCII character.
+struct PCI_VPD_Entry {
+    std::string keyword;
+    std::string value;
+};
+
 class VLN_Vpd {
 public:
     VLN_Vpd();
@@ -56,6 +64,9 @@ public:
     // device identifier is 16 digits. A status of the library; 4 for a null argument, 1 for an
     // identifier that is none.
     AX_STATUS GetFRUVPD(const char* deviceId, FRUVPD* record);
+
+    // Appends the entries in the adapter's order. Statuses as above.
+    AX_STATUS GetPCIVPD(const char* deviceId, std::vector<PCI_VPD_Entry>* entries);
 
     // The texts of a card function, PCI Local Bus Specification 3.0, appendix I, and of a software
     // classification. 0, or 32768 for a value without a text, which leaves `text` alone.

@@ -38,7 +38,7 @@ struct Folder {
 } // namespace
 
 void listen_to_log() {
-    static Drain drain;
+    static Drain& drain = *new Drain; // lines come until the very end of the process
     cimple::CLogger::instance().set_enabled();
     cimple::CLogger::instance().add_logger(&drain);
 }

@@ -22,8 +22,10 @@ HBA_HANDLE open_adapter(char*) {
 HBA_STATUS get_mapping(HBA_HANDLE, HBA_FCPTARGETMAPPING* mapping) {
     const HBA_UINT32 room = mapping->NumberOfEntries;
     const HBA_STATUS result = status();
-    const bool absurd = input.byte() > 250;
-    const HBA_UINT32 count = absurd ? input.word() : input.below(600);
+    const HBA_UINT32 choice = input.byte();
+    const HBA_UINT32 count = choice > 250   ? input.word()
+                             : choice > 240 ? 200 + choice // beyond the first room
+                                            : choice % 5;
     // A few entries, so that an input of some kilobytes reaches the commands behind.
     for (HBA_UINT32 i = 0; i < std::min({room, count, HBA_UINT32{4}}); ++i)
         input.fill(&mapping->entry[i], sizeof mapping->entry[i]);

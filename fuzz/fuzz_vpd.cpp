@@ -16,6 +16,10 @@ AX_STATUS get_vpd(AX_WWN, uint32_t, void* buffer, uint32_t* size) {
     return AX_STATUS_OK;
 }
 
+AX_STATUS get_pci_vpd(AX_WWN wwn, void* buffer, uint32_t* size) {
+    return get_vpd(wwn, 0, buffer, size);
+}
+
 // Reads as the library does, along the lengths that it finds.
 void* next_entry(void* cursor, char* tag, uint32_t tag_size, char* value, uint32_t value_size) {
     auto* at = static_cast<std::uint8_t*>(cursor);
@@ -32,6 +36,7 @@ void* next_entry(void* cursor, char* tag, uint32_t tag_size, char* value, uint32
 }
 
 const fuzz::Symbol LIBRARY[] = {
+    fuzz::symbol("AX_GetVPD", get_pci_vpd),
     fuzz::symbol("AX_GetVPDV2", get_vpd),
     fuzz::symbol("AX_GetNextVpdEntry", next_entry),
 };
@@ -53,5 +58,12 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
         FUZZ_CHECK(c == 0);
     std::string text;
     VLN_Vpd::GetCardFunctionText(record.cardFunction, text);
+
+    input = fuzz::Input(data, size);
+    honest_cursors = input.byte() & 1;
+    std::vector<PCI_VPD_Entry> entries;
+    FUZZ_CHECK(VLN_Vpd().GetPCIVPD("10000090FA000003", &entries) == AX_STATUS_OK);
+    for (const PCI_VPD_Entry& entry : entries)
+        FUZZ_CHECK(entry.keyword.size() <= 4 && entry.value.size() <= 256);
     return 0;
 }

@@ -22,18 +22,18 @@ void replay(const std::filesystem::path& path) {
 } // namespace
 
 int main(int argc, char** argv) {
-    int count = 0;
+    // Listed before the first one runs: a fuzzer may change the working folder.
+    std::vector<std::filesystem::path> inputs;
     for (int i = 1; i < argc; ++i) {
-        if (!std::filesystem::is_directory(argv[i])) {
-            replay(argv[i]);
-            ++count;
-            continue;
-        }
-        for (const auto& entry : std::filesystem::directory_iterator(argv[i])) {
-            replay(entry.path());
-            ++count;
-        }
+        const auto path = std::filesystem::absolute(argv[i]);
+        if (!std::filesystem::is_directory(path))
+            inputs.push_back(path);
+        else
+            for (const auto& entry : std::filesystem::directory_iterator(path))
+                inputs.push_back(entry.path());
     }
-    std::printf("%d inputs\n", count);
-    return count > 0 ? 0 : 1;
+    for (const auto& path : inputs)
+        replay(path);
+    std::printf("%zu inputs\n", inputs.size());
+    return inputs.empty() ? 1 : 0;
 }

@@ -8,7 +8,8 @@ cd "$(dirname "$0")/.."
 
 seconds="${1:-60}"
 [ $# -gt 0 ] && shift
-build="${VLN_FUZZ_BUILD:-build/fuzz}"
+build="$(realpath -m "${VLN_FUZZ_BUILD:-build/fuzz}")"
+seeds="$PWD/fuzz/corpus" # absolute: a fuzzer may change its working folder
 
 if [ ! -f "$build/build.ninja" ]; then
     cmake -S . -B "$build" -G Ninja -Wno-dev -DCMAKE_C_COMPILER=clang -DCMAKE_CXX_COMPILER=clang++ \
@@ -25,7 +26,7 @@ run_one() {
     mkdir -p "$build/corpus/$name" "$build/findings"
     if "$build/bin/fuzz_$name" -max_total_time="$seconds" -timeout=10 -rss_limit_mb=2048 \
         -artifact_prefix="$build/findings/$name-" -print_final_stats=1 -verbosity=1 \
-        "$build/corpus/$name" "fuzz/corpus/$name" >"$log" 2>&1; then
+        "$build/corpus/$name" "$seeds/$name" >"$log" 2>&1; then
         printf '%-14s ok      %s runs, %s\n' "$name" \
             "$(sed -n 's/^stat::number_of_executed_units: *//p' "$log")" \
             "$(sed -n 's/^#[0-9]*[ \t]*DONE *\(cov: [0-9]* ft: [0-9]*\).*/\1/p' "$log")"
@@ -37,7 +38,7 @@ run_one() {
     fi
 }
 export -f run_one
-export seconds build
+export seconds build seeds
 
-[ $# -gt 0 ] || set -- $(ls fuzz/corpus)
+[ $# -gt 0 ] || set -- $(ls "$seeds")
 printf '%s\n' "$@" | xargs -P "$(nproc)" -I{} bash -c 'run_one {}'

@@ -92,10 +92,10 @@ Reply<std::vector<Instance>> enumerate(Core& core, const Target& target,
                                        const Property_List& properties) {
     Reply<std::vector<Instance>> reply;
     if (target.platform) {
-        for (Instance& found :
+        for (const Instance& found :
              core.platform.instances(target.name_space, *target.known, core.classes))
             reply.value.push_back(
-                filtered(*core.classes.find(found.class_name()), std::move(found), properties));
+                filtered(*core.classes.find(found.class_name()), found, properties));
         return reply;
     }
     CMPIInstanceMI* mi = core.module.instance(core, *target.known, reply.status);

@@ -78,6 +78,18 @@ AX_STATUS VLN_MethodWrapper::GetNIMALibVersion(std::string* text) {
     return queryVersion(QUERY, "VLN_MethodWrapper::GetNIMALibVersion", text);
 }
 
+AX_STATUS VLN_MethodWrapper::getTargetOS_info(char* text) {
+    Operation_Frame frame("VLN_MethodWrapper::getTargetOS_info");
+    if (!frame.given(text))
+        return frame.status();
+    AX_ServerAttributes server{};
+    static_assert(sizeof server.targetOS == TARGET_OS_SIZE);
+    const AX_STATUS status = AX_GetServerAttributes(&server);
+    std::memcpy(text, server.targetOS, TARGET_OS_SIZE);
+    text[TARGET_OS_SIZE - 1] = '\0';
+    return status;
+}
+
 bool VLN_MethodWrapper::IsTesselCNA(const HBA_WWN* name) {
     Operation_Frame frame("VLN_MethodWrapper::IsTesselCNA");
     uint32 value = 0;

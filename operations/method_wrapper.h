@@ -28,6 +28,8 @@ class VLN_MethodWrapper {
 public:
     // Bytes of a name in colon form with its end mark.
     static constexpr std::size_t HBA_NAME_SIZE = 24;
+    // Bytes of the name of the host's system with its end mark.
+    static constexpr std::size_t TARGET_OS_SIZE = 41;
 
     // The object brackets the lifetime of the library; the ProviderAgent owns the only one. The
     // constructor initialises the library once in this process, over a POSIX named semaphore, and
@@ -63,6 +65,8 @@ public:
     // makes no difference: they are released as one. 8 when out of memory.
     static AX_STATUS GetLibraryVersion(const char* library, std::string* text);
     static AX_STATUS GetNIMALibVersion(std::string* text);
+    // What system the host runs, as the library tells it; text has room for TARGET_OS_SIZE.
+    static AX_STATUS getTargetOS_info(char* text);
     // True for the Tessel generation; false also when the adapter can't be asked.
     static bool IsTesselCNA(const HBA_WWN* name);
     // What the port does beside Ethernet. On failure the flags are as far as they were found, and

@@ -3,36 +3,61 @@
 #include "simulator/vlnsim.h"
 
 #include <cerrno>
+#include <chrono>
+#include <condition_variable>
 #include <ctime>
+#include <iterator>
 #include <mutex>
+#include <set>
 
 namespace {
 
 constexpr std::uint64_t usec_per_second = 1000000;
 
-std::mutex clock_mutex;
-bool is_virtual = false;
-std::uint64_t virtual_now = 0;
+// It lives from the first use to the end of the process, as threads may pause for as long.
+struct Clock {
+    std::mutex mutex; // guards the rest
+    std::condition_variable moved;
+    bool is_virtual = false;
+    std::uint64_t now = 0;     // of a virtual clock
+    unsigned long changes = 0; // from one clock to another
+    std::multiset<std::uint64_t> pause_ends;
+};
+constexpr std::uint64_t NEVER = ~std::uint64_t{0}; // the end of a pause on the system's clock
+
+Clock& the_clock() {
+    static Clock* const clock = new Clock;
+    return *clock;
+}
 
 // Whether time is virtual; then it has advanced by usec.
 bool advance(std::uint64_t usec) {
-    std::lock_guard lock(clock_mutex);
-    if (is_virtual)
-        virtual_now += usec;
-    return is_virtual;
+    Clock& clock = the_clock();
+    std::lock_guard lock(clock.mutex);
+    if (clock.is_virtual) {
+        clock.now += usec;
+        clock.moved.notify_all();
+    }
+    return clock.is_virtual;
+}
+
+void change_clock(bool is_virtual, std::uint64_t start_usec) {
+    Clock& clock = the_clock();
+    std::lock_guard lock(clock.mutex);
+    clock.is_virtual = is_virtual;
+    clock.now = start_usec;
+    ++clock.changes;
+    clock.moved.notify_all();
 }
 
 } // namespace
 
 void vlnsim_use_virtual_clock(uint64_t start_usec) {
-    std::lock_guard lock(clock_mutex);
-    is_virtual = true;
-    virtual_now = start_usec;
+    change_clock(true, start_usec);
 }
 
 void vlnsim_use_system_clock(void) {
-    std::lock_guard lock(clock_mutex);
-    is_virtual = false;
+    change_clock(false, 0);
 }
 
 void vlnsim_advance(uint64_t usec) {
@@ -41,9 +66,10 @@ void vlnsim_advance(uint64_t usec) {
 
 uint64_t vlnsim_now(void) {
     {
-        std::lock_guard lock(clock_mutex);
-        if (is_virtual)
-            return virtual_now;
+        Clock& clock = the_clock();
+        std::lock_guard lock(clock.mutex);
+        if (clock.is_virtual)
+            return clock.now;
     }
     timespec now{};
     if (clock_gettime(CLOCK_REALTIME, &now) != 0)
@@ -60,4 +86,34 @@ void vlnsim_sleep(uint64_t usec) {
     left.tv_nsec = static_cast<long>(usec % usec_per_second * 1000);
     while (nanosleep(&left, &left) != 0 && errno == EINTR)
         ;
+}
+
+void vlnsim_pause(uint64_t usec, int (*stopped)(const void* context), const void* context) {
+    Clock& clock = the_clock();
+    std::unique_lock lock(clock.mutex);
+    const auto deadline = std::chrono::steady_clock::now() + std::chrono::microseconds(usec);
+    const unsigned long changes = clock.changes;
+    const std::uint64_t end = clock.is_virtual ? clock.now + usec : NEVER;
+    const auto place = clock.pause_ends.insert(end);
+    const auto over = [&] {
+        return stopped(context) || clock.changes != changes || clock.now >= end;
+    };
+    if (clock.is_virtual)
+        clock.moved.wait(lock, over);
+    else
+        clock.moved.wait_until(lock, deadline, over);
+    clock.pause_ends.erase(place);
+}
+
+void vlnsim_wake(void) {
+    Clock& clock = the_clock();
+    std::lock_guard lock(clock.mutex);
+    clock.moved.notify_all();
+}
+
+size_t vlnsim_paused(void) {
+    Clock& clock = the_clock();
+    std::lock_guard lock(clock.mutex);
+    return static_cast<size_t>(
+        std::distance(clock.pause_ends.upper_bound(clock.now), clock.pause_ends.end()));
 }

@@ -57,6 +57,10 @@ enum : std::uint16_t {
     port_discovered_ports = 782,
     port_physical_state = 802,
     port_permanent_mac = 804,
+    port_ip_endpoint_name = 810,
+    port_ip_type = 811,
+    port_ipv4_address = 812,
+    port_subnet_mask = 813,
     port_current_mac = 817,
     port_first = 768 // adapter attributes have smaller numbers
 };

@@ -177,6 +177,32 @@ std::uint32_t read_authentication(const Node& values) {
     return static_cast<std::uint32_t>(it - std::begin(names));
 }
 
+// A page of a transceiver's memory: all its bytes, or pieces of it by their offset, bytes or text.
+void read_page(const Node& values, std::uint8_t (&page)[256]) {
+    const auto put = [&](const Node& value, std::size_t offset, const Bytes& bytes) {
+        if (bytes.size() > sizeof page - offset)
+            value.fail("reaches past the end of the page of 256 bytes");
+        std::copy(bytes.begin(), bytes.end(), page + offset);
+    };
+    if (!values.is(Value::Kind::object)) {
+        put(values, 0, values.bytes());
+        return;
+    }
+    for (const auto& [key, source] : values.value().members) {
+        const Node value(source, values.scope());
+        const auto number = parse_number(key);
+        if (!number || *number >= sizeof page)
+            value.fail("\"" + key + "\" is no offset below 256");
+        const auto offset = static_cast<std::size_t>(*number);
+        if (value.is(Value::Kind::object)) {
+            put(value, offset, read_attribute(value, nullptr).bytes);
+        } else {
+            const std::string text = value.text();
+            put(value, offset, Bytes(text.begin(), text.end()));
+        }
+    }
+}
+
 } // namespace
 
 std::vector<std::pair<std::string, Bytes>> read_vpd(const Node& values) {
@@ -246,17 +272,10 @@ AX_Ini_NetworkProperties read_network(const Node& values) {
 AX_SffData read_sff(const Node& values) {
     values.expect_object({"a0", "a2"});
     AX_SffData data{};
-    const auto page = [&](std::string_view key, std::uint8_t(&bytes)[256]) {
-        const auto node = values.member(key);
-        if (!node)
-            return;
-        const Bytes read = node->bytes();
-        if (read.size() > sizeof bytes)
-            node->fail("longer than 256 bytes");
-        std::copy(read.begin(), read.end(), bytes);
-    };
-    page("a0", data.pageA0);
-    page("a2", data.pageA2);
+    if (const auto page = values.member("a0"))
+        read_page(*page, data.pageA0);
+    if (const auto page = values.member("a2"))
+        read_page(*page, data.pageA2);
     return data;
 }
 

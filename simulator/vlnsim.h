@@ -91,6 +91,31 @@ VLNSIM_API uint64_t vlnsim_now(void);
 VLNSIM_API void
 vlnsim_sleep(uint64_t usec); /* a virtual clock advances and the call returns at once */
 
+/* A sleep that waits for the clock, a virtual one as well: until others have advanced it to the end
+ * of the span, or until stopped(context) is not 0, which is asked at the start and at each
+ * vlnsim_wake, under the clock's lock. A change of the clock ends it. */
+VLNSIM_API void vlnsim_pause(uint64_t usec, int (*stopped)(const void* context),
+                             const void* context);
+VLNSIM_API void vlnsim_wake(void);
+/* Threads in a pause whose end has not come; on the system's clock, in any pause. */
+VLNSIM_API size_t vlnsim_paused(void);
+
+/* ---- Network interfaces
+ * --------------------------------------------------------------------------
+ */
+
+/* What the simulated host's kernel knows of an interface. */
+struct vlnsim_interface {
+    int up;           /* the port's functional state is 2 */
+    int family;       /* AF_INET, AF_INET6, 0 without an address */
+    char address[64]; /* attributes IPv4Address and SubnetMask, as texts */
+    char mask[64];
+};
+
+/* The interface is that of the first function with the port attribute IPProtocolEndpointName of
+ * that value. Returns 0, or 1 if there is none. */
+VLNSIM_API int vlnsim_find_interface(const char* name, struct vlnsim_interface* found);
+
 /* ---- Faults
  * -------------------------------------------------------------------------------------- */
 

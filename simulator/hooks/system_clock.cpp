@@ -14,8 +14,16 @@ void sleep(uint64 usec) {
     vlnsim_sleep(usec);
 }
 
+int is_raised(const void* flag) {
+    return load_flag(*static_cast<const bool*>(flag));
+}
+
+void pause(uint64 usec, const bool& stop) {
+    vlnsim_pause(usec, &is_raised, &stop);
+}
+
 } // namespace
 
-const Time::Clock system_clock = {&now, &sleep};
+const Time::Clock system_clock = {&now, &sleep, &pause, &vlnsim_wake};
 
 } // namespace cimple

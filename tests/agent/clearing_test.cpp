@@ -38,7 +38,7 @@ TEST_F(Clearing_Test, EveryStoreIsInOneGroup) {
         ++sizes[row.group];
         EXPECT_TRUE(names.insert(row.name).second) << row.name << " stands twice";
     }
-    EXPECT_EQ(NUM_STORES, 300);
+    EXPECT_EQ(NUM_STORES, 301);
     EXPECT_EQ(sizes[Store_Group::PLATFORM], 2);
     EXPECT_EQ(sizes[Store_Group::RECORD_LOG], 5);
     EXPECT_EQ(sizes[Store_Group::SOFTWARE_UPDATE_SERVICE], 2);
@@ -95,7 +95,7 @@ TEST_F(Clearing_Test, EveryProviderClassHasItsRow) {
         }
         EXPECT_EQ(row.shape == Pattern_Shape::ACTIVE, row.update_mutex != nullptr);
     }
-    EXPECT_EQ(without_store, 7);
+    EXPECT_EQ(without_store, 6);
     EXPECT_EQ(with_three, 3);
     EXPECT_EQ(shapes[Pattern_Shape::SAN_GROUP], 34);
     EXPECT_EQ(shapes[Pattern_Shape::ACTIVE], 6);

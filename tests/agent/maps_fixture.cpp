@@ -1,18 +1,32 @@
 #include "tests/agent/maps_fixture.h"
 
+#include "device/ip_interface.h"
 #include "device/runtime_loader.h"
 
 #include <cstdlib>
 
 namespace cimple {
 
+namespace {
+
+// A kernel without network interfaces: the machine's own are not the tests' concern.
+constexpr IP_Calls NO_INTERFACES = {
+    [](int, int, int) { return -1; },
+    [](int, unsigned long, void*) { return -1; },
+    [](int) { return 0; },
+};
+
+} // namespace
+
 void Maps_Test::SetUp() {
     Agent_Test::SetUp();
+    VLN_IPInterfaceConfig::setCalls(&NO_INTERFACES);
     VLN_Runtime_Loader::setCalls(nullptr); // the simulator's libraries are loaded already
 }
 
 void Maps_Test::TearDown() {
     Agent_Test::TearDown();
+    VLN_IPInterfaceConfig::setCalls(nullptr);
     vlnsim_close_libraries();
     EXPECT_EQ(vlnsim_violations(), 0u);
 }

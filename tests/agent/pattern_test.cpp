@@ -112,6 +112,7 @@ TEST_F(Pattern_Test, RecordLogsComeFromThreeStores) {
     for (int i = 0; i < 3; ++i) {
         auto* log = create<VLNMPCA_RecordLog>();
         log->InstanceID.set(ids[i]);
+        stores[i]->clear();
         stores[i]->insert(log);
     }
     EXPECT_EQ(count_instances(VLNMPCA_RecordLog::static_meta_class), 3);

@@ -35,6 +35,31 @@ TEST(State_Tables, PortStates) {
         EXPECT_STREQ(port.description, row.port_text) << row.state;
         EXPECT_EQ(controller.operational_status, row.controller_status) << row.state;
         EXPECT_STREQ(controller.description, row.controller_text) << row.state;
+        const Port_State& fcoe = find_fcoe_port_state(row.state);
+        EXPECT_EQ(fcoe.operational_status, row.state == 6 ? 1 : row.port_status) << row.state;
+        EXPECT_STREQ(fcoe.description, row.state == 6 ? "Other" : row.port_text) << row.state;
+    }
+}
+
+TEST(State_Tables, PortTypes) {
+    const struct {
+        uint32 type;
+        uint16 port_type;
+        const char* name;
+    } rows[] = {{1, 0, "Unknown"},
+                {2, 1, "Other"},
+                {5, 10, "N"},
+                {6, 11, "NL"},
+                {7, 16, "FL"},
+                {8, 15, "F"},
+                {9, 14, "E"},
+                {10, 18, "G"},
+                {20, 1, "Private Loop"},
+                {21, 1, "Point to Point"},
+                {22, 0, "Unknown"}};
+    for (const auto& row : rows) {
+        EXPECT_EQ(find_port_type(row.type).port_type, row.port_type) << row.type;
+        EXPECT_STREQ(find_port_type(row.type).name, row.name) << row.type;
     }
 }
 

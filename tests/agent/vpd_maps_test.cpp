@@ -54,7 +54,8 @@ TEST_F(Vpd_Maps_Test, NewCardTakesItsFruData) {
     expect_counts(**agent, {{STORE_VLNMPCA_Card, 1},
                             {STORE_VLNMPCA_FRUVitalProductData, 1},
                             {STORE_VLNMPCA_FRUElementVPD, 1}});
-    EXPECT_EQ(vlnsim_calls("AX_GetVPDV2"), 1u); // for all four functions of the card
+    // Once for all four functions of the card, and once for its firmware.
+    EXPECT_EQ(vlnsim_calls("AX_GetVPDV2"), 2u);
     const struct {
         const Property<String>& property;
         const char* value;
@@ -130,7 +131,6 @@ TEST_F(Vpd_Maps_Test, CardWithoutFruDataKeepsWhatItHas) {
     EXPECT_EQ(card()->Name.value, "VMC-2210");
     EXPECT_EQ(log.count(VLN_DBG, "Unable to get the FRU VPD for Card : VR10420117 "), 1);
     EXPECT_EQ(log.count(VLN_DBG, "Updating FRU information to Softwareidentity Class"), 1);
-    EXPECT_EQ(log.count(VLN_DBG, "No SoftwareIdentity instance to update the FRU Data"), 1);
     EXPECT_EQ(log.count(VLN_DBG, "Failed to update FRU VPD data to cim_softwareidentity instances"),
               1);
 }
@@ -175,6 +175,11 @@ TEST_F(Vpd_Maps_Test, CardsOfOneUuidStayApart) {
 TEST_F(Vpd_Maps_Test, FirmwareIdentitiesTakeTheirCardsData) {
     load(R"({"use": "nic"})");
     refresh();
+    Log_Capture log;
+    (*agent)->m_VLNMPCA_SoftwareIdentity_map.clear();
+    EXPECT_EQ(VPD_Maps(**agent).UpdateFRUToSoftwareInstance(), 32768u);
+    EXPECT_EQ(log.count(VLN_DBG, "No SoftwareIdentity instance to update the FRU Data"), 1);
+
     auto* driver = add_software("driver", 2, SERIAL);
     auto* firmware = add_software("firmware", 10, SERIAL);
     auto* further = add_software("further", 10, SERIAL);
@@ -231,6 +236,7 @@ TEST_F(Vpd_Maps_Test, PortsAndSoftwareFindEachOther) {
     EXPECT_EQ(maps.GetLogicalPortAddress(SERIAL, 1, &text), 32768u);
     EXPECT_EQ(maps.GetLogicalPortAddress(SERIAL, 2, nullptr), 32768u);
 
+    (*agent)->m_VLNMPCA_SoftwareIdentity_map.clear();
     EXPECT_EQ(maps.GetSoftwareInstanceName(PORT, text), 32768u);
     add_software("driver", 2, SERIAL);
     add_software("firmware", 10, SERIAL);

@@ -3,6 +3,7 @@
 #include "cimple/cmpi_thread_context.h"
 #include "tests/cimple/cmpi_fixture.h"
 
+#include <atomic>
 #include <cstring>
 #include <stdexcept>
 #include <thread>
@@ -170,6 +171,23 @@ TEST(Time_Test, TheClockIsReplaceable) {
     Time::replace_clock(nullptr);
     EXPECT_GT(Time::now(), 1700000000000000u);
     Time::sleep(1);
+}
+
+// A clock that has no pauses of its own leaves them to the host's time.
+TEST(Time_Test, APauseEndsByItselfOrByAWake) {
+    bool stop = false;
+    Time::pause(1, stop);
+    std::atomic<bool> over{false};
+    std::thread sleeper([&] {
+        Time::pause(3600ull * 1000000, stop);
+        over = true;
+    });
+    Time::wake(); // not meant for it: the flag is down
+    EXPECT_FALSE(over);
+    raise_flag(stop);
+    Time::wake();
+    sleeper.join();
+    Time::pause(3600ull * 1000000, stop);
 }
 
 // ---- Up-calls ----

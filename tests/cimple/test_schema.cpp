@@ -145,6 +145,15 @@ const Meta_Feature* const features[] = {&id, &object, &objects, &count};
 constexpr uint8 locals[] = {1, 1, 1, 1};
 } // namespace holder
 
+namespace crowd {
+using T = Test_Crowd;
+const Meta_Reference head REFERENCE(Head, 0, Test_Base, KEY);
+const Meta_Reference tail REFERENCE(Tail, 0, Test_Base, KEY);
+const Meta_Reference others REFERENCE(Others, -1, Test_Base, 0);
+const Meta_Feature* const features[] = {&head, &tail, &others};
+constexpr uint8 locals[] = {1, 1, 1};
+} // namespace crowd
+
 namespace run_method {
 using T = Test_Service_Run_method;
 const Meta_Property level{{{0}, FLAG_PROPERTY | FLAG_IN, "Level", level_qualifiers, 1},
@@ -179,6 +188,7 @@ const Meta_Class* const classes[] = {
     &Test_Leaf::static_meta_class,     &Test_Types::static_meta_class,
     &Test_Link::static_meta_class,     &Test_Chain::static_meta_class,
     &Test_Holder::static_meta_class,   &Test_Service::static_meta_class,
+    &Test_Crowd::static_meta_class,
 };
 
 } // namespace
@@ -197,6 +207,7 @@ CLASS(Test_Types, FLAG_CLASS, nullptr, 0, types::features, types::locals, nullpt
 CLASS(Test_Link, FLAG_ASSOCIATION, nullptr, 0, link::features, link::locals, nullptr, 2)
 CLASS(Test_Chain, FLAG_ASSOCIATION, nullptr, 0, chain::features, chain::locals, nullptr, 1)
 CLASS(Test_Holder, FLAG_CLASS, nullptr, 0, holder::features, holder::locals, nullptr, 1)
+CLASS(Test_Crowd, FLAG_ASSOCIATION, nullptr, 0, crowd::features, crowd::locals, nullptr, 2)
 CLASS(Test_Service, FLAG_CLASS, nullptr, 0, service::features, service::locals, nullptr, 1)
 
 constinit const Meta_Method Test_Service_Run_method::static_meta_class{

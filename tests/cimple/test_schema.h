@@ -83,6 +83,14 @@ struct Test_Holder : Instance {
     static const Meta_Class static_meta_class;
 };
 
+// A link with references besides its ends: many in an array.
+struct Test_Crowd : Instance {
+    Test_Base* Head; // key
+    Test_Base* Tail; // key
+    Property<Array<Test_Base*>> Others;
+    static const Meta_Class static_meta_class;
+};
+
 struct Test_Service_Run_method : Instance {
     Property<uint32> Level;
     Test_Base* Target;

@@ -38,6 +38,10 @@ AX_STATUS AX_GetVPDV2(AX_WWN wwn, uint32_t version, void* buffer, uint32_t* size
     return fake_vpd.status;
 }
 
+AX_STATUS AX_GetVPD(AX_WWN wwn, void* buffer, uint32_t* size) {
+    return AX_GetVPDV2(wwn, 0, buffer, size);
+}
+
 void* AX_GetNextVpdEntry(void* cursor, char* tag, uint32_t tagSize, char* value,
                          uint32_t valueSize) {
     ++fake_vpd.steps;
@@ -124,6 +128,24 @@ TEST_F(Vpd_Test, FailuresAnswerTheirStatus) {
     EXPECT_EQ(log_capture::count(lines, "5:str2HBAName failed"), 3);
     EXPECT_EQ(log_capture::count(lines, "5:ERROR: AX_GetVPDV2 call failed : 190"), 1);
     EXPECT_EQ(fake_vpd.steps, 0);
+}
+
+TEST_F(Vpd_Test, PCIKeywordsComeInOrder) {
+    fake_vpd.entry("PN", "VT-1");
+    fake_vpd.entry("V0", "first");
+    fake_vpd.entry("CP", "\x10\x01 \xC3");
+    fake_vpd.entry("V0", "");
+    std::vector<PCI_VPD_Entry> entries;
+    ASSERT_EQ(VLN_Vpd().GetPCIVPD("10000090FA000003", &entries), AX_STATUS_OK);
+    std::string all;
+    for (const PCI_VPD_Entry& entry : entries)
+        all += entry.keyword + "=" + entry.value + ";";
+    EXPECT_EQ(all, "PN=VT-1;V0=first;CP=?? ?;V0=;");
+    EXPECT_EQ(fake_vpd.version, 0u);
+    fake_vpd.status = 251;
+    EXPECT_EQ(VLN_Vpd().GetPCIVPD("10000090FA000003", &entries), 251u);
+    EXPECT_EQ(VLN_Vpd().GetPCIVPD("10000090FA000003", nullptr), 4u);
+    EXPECT_EQ(log_capture::count(log_capture::take(), "5:ERROR: AX_GetVPD call failed : 251"), 1);
 }
 
 // The walk ends whatever the library answers, and stays in the buffer.

@@ -71,6 +71,8 @@ TEST(Mpcactl, PrintsATable) {
                                                                   "a                     1\n"
                                                                   "b                     2\n"
                                                                   "c \"quoted\", and\\more  3\n");
+    EXPECT_EQ(run({"refs", A, "-p", "Note"}).out.substr(0, 15), "Test_Link.First")
+        << "the path at least";
     const std::string list = run({"get", A}).out;
     EXPECT_EQ(list.substr(0, list.find('\n')),
               "Name  Level  Big                   Offset  Ratio  Flag  When                       "

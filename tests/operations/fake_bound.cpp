@@ -39,3 +39,7 @@ AX_STATUS AX_GetHBAFeature(AX_WWN, uint32_t identifier, uint32_t* value) {
 AX_STATUS AX_GetHBAFeatureList(AX_WWN wwn, uint32_t size, uint8_t* list) {
     return size == AX_FEATURE_LIST_SIZE ? fake.featureList(wwn, list) : AX_STATUS_ERROR;
 }
+
+AX_STATUS AX_GetServerAttributes(AX_ServerAttributes* attributes) {
+    return fake.serverAttributes ? fake.serverAttributes(attributes) : AX_STATUS_ERROR;
+}

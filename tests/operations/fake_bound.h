@@ -18,6 +18,7 @@ struct Fake_Bound {
     std::map<uint32_t, AX_STATUS> featureFailures; // identifier to status
     std::vector<uint32_t> featureQueries;
     const char* statusText = "";
+    std::function<AX_STATUS(AX_ServerAttributes*)> serverAttributes;
 };
 
 extern Fake_Bound fake;

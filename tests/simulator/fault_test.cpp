@@ -1,7 +1,9 @@
 // The fault script, counts and records of calls, host root and clock.
 #include "tests/simulator/simulated.h"
 
+#include <atomic>
 #include <cstdio>
+#include <thread>
 
 namespace {
 
@@ -142,6 +144,41 @@ TEST_F(Fault, TheClockStandsStillUntilItIsMoved) {
     EXPECT_EQ(3605 * second + 7, vlnsim_now());
     vlnsim_use_system_clock();
     EXPECT_GT(vlnsim_now(), 1000000000 * second);
+}
+
+// Each thread leaves its pause for one reason only: the clock, a stop, another clock.
+TEST_F(Fault, APauseWaitsForTheClockOrAStop) {
+    vlnsim_use_virtual_clock(5 * second);
+    std::atomic<int> stop{0};
+    const auto stopped = [](const void* flag) {
+        return static_cast<const std::atomic<int>*>(flag)->load();
+    };
+    const auto pause = [&] { vlnsim_pause(6 * second, stopped, &stop); };
+    const auto await = [](std::size_t count) {
+        while (vlnsim_paused() != count)
+            std::this_thread::yield();
+    };
+    std::thread sleeper(pause);
+    await(1);
+    vlnsim_advance(6 * second - 1);
+    EXPECT_EQ(1u, vlnsim_paused());
+    vlnsim_advance(1);
+    EXPECT_EQ(0u, vlnsim_paused());
+    sleeper.join();
+    EXPECT_EQ(11 * second, vlnsim_now());
+
+    sleeper = std::thread(pause);
+    await(1);
+    stop = 1;
+    vlnsim_wake();
+    sleeper.join();
+    pause();
+    stop = 0;
+    sleeper = std::thread(pause);
+    await(1);
+    vlnsim_use_system_clock();
+    sleeper.join();
+    EXPECT_EQ(0u, vlnsim_paused());
 }
 
 TEST_F(Fault, TheHostRootStaysReadableAfterItChanged) {

@@ -34,22 +34,31 @@ std::string scalar_to_cell(const host::Value& value, const std::string& name_spa
     return cell;
 }
 
-// Columns in their order: those asked for, or keys and then what any instance has.
+bool any_has(const std::vector<const host::Instance*>& instances, const std::string& property) {
+    return std::any_of(instances.begin(), instances.end(), [&](const host::Instance* one) {
+        return one->property(property) != nullptr;
+    });
+}
+
+// Columns in their order: those asked for, or keys and then what any instance has. Where nothing
+// that was asked for is there, as in one class of several, the keys stand for the instances.
 std::vector<std::string> choose_columns(const Print_Context& context, const host::Class& known,
                                         const std::vector<const host::Instance*>& instances) {
     std::vector<std::string> columns;
-    if (!context.columns.empty()) {
-        for (const std::string& name : context.columns)
-            if (const host::Property* property = known.find_property(name))
-                columns.push_back(property->name);
-        return columns;
+    bool filled = false;
+    for (const std::string& name : context.columns) {
+        if (const host::Property* property = known.find_property(name)) {
+            columns.push_back(property->name);
+            filled |= any_has(instances, name);
+        }
     }
+    if (filled)
+        return columns;
+    columns.clear();
     for (const bool keys : {true, false})
         for (const host::Property& property : known.properties)
-            if (property.key == keys &&
-                std::any_of(instances.begin(), instances.end(), [&](const host::Instance* one) {
-                    return one->property(property.name) != nullptr;
-                }))
+            if (property.key == keys && (keys || context.columns.empty()) &&
+                any_has(instances, property.name))
                 columns.push_back(property.name);
     return columns;
 }
@@ -130,6 +139,12 @@ std::string to_table(const Print_Context& context, const host::Class& known,
     if (instances.empty())
         return "";
     const std::vector<std::string> columns = choose_columns(context, known, instances);
+    if (columns.empty()) { // not even keys: their paths are all there is
+        std::string text;
+        for (const host::Instance* instance : instances)
+            text += host::path_to_text(instance->path, context.name_space) + "\n";
+        return text;
+    }
     Rows rows = {columns};
     for (const host::Instance* instance : instances) {
         rows.emplace_back();

@@ -1,0 +1,178 @@
+// An enumeration whose receiver tells what it looks at, against one that delivers everything.
+#include "classes/VLNMPCA_Card.h"
+#include "classes/VLNMPCA_EthernetPort.h"
+#include "classes/VLNMPCA_PhysicalConnector.h"
+#include "classes/VLNMPCA_PortController.h"
+#include "classes/VLNMPCA_Realizes.h"
+#include "classes/VLNMPCA_RecordLog.h"
+#include "classes/VLNMPCA_StorageVolume.h"
+#include "derivedObjects/pattern.h"
+#include "tests/agent/agent_fixture.h"
+
+#include <random>
+
+namespace cimple {
+
+namespace {
+
+// Takes what arrives, and keeps what a receiver with the focus would.
+struct Receiver {
+    Enumeration_Focus focus;
+    std::vector<std::string> kept = {};
+    int delivered = 0;
+
+    static bool take(Instance* instance, sint32, void* self) {
+        auto& receiver = *static_cast<Receiver*>(self);
+        const Ref<Instance> owner(instance);
+        ++receiver.delivered;
+        const Instance* wanted = receiver.focus.instance;
+        const bool by_keys = receiver.focus.kind == Enumeration_Focus::KEYS;
+        if (by_keys ? !key_eq(wanted, instance) : !is_reference_to(instance, wanted, ""))
+            return true;
+        String path;
+        EXPECT_EQ(instance_to_model_path(instance, path), 0);
+        receiver.kept.push_back(path.c_str());
+        return !by_keys;
+    }
+};
+
+class Narrowing_Test : public Agent_Test {
+protected:
+    void SetUp() override {
+        Agent_Test::SetUp();
+        ASSERT_EQ(pattern_load(), 0);
+        agent = ProviderAgent::current();
+        ASSERT_EQ(refreshes_started(*agent), 1);
+    }
+    void TearDown() override {
+        agent->releaseRef();
+        Agent_Test::TearDown();
+    }
+
+    // Both enumerations; what they keep must agree. Answers the number that the narrowed one
+    // delivered.
+    int compare(Pattern_Id id, Enumeration_Focus::Kind kind, const Instance* source) {
+        Receiver whole = {{kind, source}};
+        Receiver narrowed = {{kind, source}};
+        const Pattern_Row& row = pattern_table[id];
+        pattern_enum_instances(row, {&Receiver::take, &whole});
+        pattern_enum_instances(row, {&Receiver::take, &narrowed, &narrowed.focus});
+        EXPECT_EQ(narrowed.kept, whole.kept);
+        return narrowed.delivered;
+    }
+
+    ProviderAgent* agent = nullptr;
+};
+
+template <class T>
+Ref<T> device(const char* id) {
+    Ref<T> made(create_null<T>());
+    made->SystemCreationClassName.set("CIM_ComputerSystem");
+    made->SystemName.set("host");
+    made->CreationClassName.set(made->__meta_class->name);
+    made->DeviceID.set(id);
+    return made;
+}
+
+template <class T>
+Ref<T> physical(const std::string& tag) {
+    Ref<T> made(create_null<T>());
+    made->CreationClassName.set(made->__meta_class->name);
+    made->Tag.set(tag.c_str());
+    return made;
+}
+
+Ref<VLNMPCA_Realizes> realizes(const Instance* antecedent, const Instance* dependent) {
+    Ref<VLNMPCA_Realizes> made(create_null<VLNMPCA_Realizes>());
+    reference(made.get(), find_reference(made->__meta_class, "Antecedent")) = clone(antecedent);
+    reference(made.get(), find_reference(made->__meta_class, "Dependent")) = clone(dependent);
+    return made;
+}
+
+} // namespace
+
+TEST_F(Narrowing_Test, RandomStoresGiveTheSameAnswers) {
+    std::minstd_rand random(1);
+    auto& store = agent->m_VLNMPCA_Realizes_map;
+    int delivered = 0;
+    for (int round = 0; round < 30; ++round) {
+        for (int i = 0; i < 8; ++i) {
+            const auto plug = physical<VLNMPCA_PhysicalConnector>(std::to_string(random() % 5));
+            const auto port = device<VLNMPCA_EthernetPort>(std::to_string(random() % 20).c_str());
+            auto made = realizes(plug.get(), port.get());
+            if (store.insert(made.get()) >= 0)
+                made.release();
+        }
+        const auto gone = static_cast<uint32>(random() % store.size());
+        const Ref<Instance> taken(store.at(gone));
+        store.remove(gone);
+        for (int i = 0; i < 5; ++i) {
+            const auto source = physical<VLNMPCA_PhysicalConnector>(std::to_string(random() % 7));
+            const auto port = device<VLNMPCA_EthernetPort>(std::to_string(random() % 22).c_str());
+            const auto other = device<VLNMPCA_PortController>("3");
+            for (const Instance* end : {static_cast<const Instance*>(source.get()),
+                                        static_cast<const Instance*>(port.get()),
+                                        static_cast<const Instance*>(other.get())})
+                delivered +=
+                    compare(PATTERN_VLNMPCA_Realizes, Enumeration_Focus::REFERENCES_TO, end);
+            EXPECT_EQ(compare(PATTERN_VLNMPCA_Realizes, Enumeration_Focus::KEYS, store.at(0)), 1);
+        }
+    }
+    EXPECT_GT(delivered, 0);
+    EXPECT_LT(delivered, 450 * 20) << "450 questions to a store of some 80";
+}
+
+// Gates, requests and log lines are those of any enumeration.
+TEST_F(Narrowing_Test, EverythingButTheCopyIsAsBefore) {
+    const Ref<Instance> volume(create<VLNMPCA_StorageVolume>());
+    const Enumeration_Focus focus = {Enumeration_Focus::KEYS, volume.get()};
+    Receiver receiver = {focus};
+    agent->m_bIsSANMapsReady = true; // a gate that is down would wait for a refresh
+    Log_Capture log;
+    pattern_enum_instances(pattern_table[PATTERN_VLNMPCA_StorageVolume],
+                           {&Receiver::take, &receiver, &focus});
+    EXPECT_EQ(log.count(VLN_DBG, "VLNMPCA_StorageVolume_Provider::enum_instances()"), 1);
+    EXPECT_EQ(receiver.delivered, 0);
+
+    const Instance_Proc refuse = [](Instance* instance, sint32, void*) -> bool {
+        unref(instance);
+        throw 1;
+    };
+    const auto wanted = physical<VLNMPCA_Card>("c");
+    agent->m_VLNMPCA_Card_map.insert(clone(wanted.get()));
+    const Enumeration_Focus card_focus = {Enumeration_Focus::KEYS, wanted.get()};
+    EXPECT_EQ(
+        pattern_enum_instances(pattern_table[PATTERN_VLNMPCA_Card], {refuse, nullptr, &card_focus}),
+        0);
+    EXPECT_EQ(log.count(VLN_CRIT, "Exception in Active CIM Provider Enumeration - do nothing"), 1);
+}
+
+// Keys that became equal by a fault empty every answer, the narrow ones too.
+TEST_F(Narrowing_Test, EqualKeysEmptyNarrowAnswersToo) {
+    auto& store = agent->m_VLNMPCA_Card_map;
+    for (const char* tag : {"a", "b", "c"})
+        store.insert(physical<VLNMPCA_Card>(tag).release());
+    store[1]->Tag.set("a");
+    const auto wanted = physical<VLNMPCA_Card>("c");
+    Log_Capture log;
+    EXPECT_EQ(compare(PATTERN_VLNMPCA_Card, Enumeration_Focus::KEYS, wanted.get()), 0);
+    EXPECT_EQ(log.count(VLN_CRIT, "Insert failed for 1"), 2) << "once for each enumeration";
+}
+
+// Nothing keeps keys distinct across the stores of one class, so those are copied whole.
+TEST_F(Narrowing_Test, ClassesOfSeveralStoresAreCopiedWhole) {
+    const auto log_of = [](const char* id) {
+        auto* log = create_null<VLNMPCA_RecordLog>();
+        log->InstanceID.set(id);
+        return log;
+    };
+    agent->m_VLNMPCA_RecordLog_map.clear();
+    agent->m_VLNMPCA_RecordLog_map.insert(log_of("one"));
+    agent->m_VLNMPCA_DriverRecordLog_map.insert(log_of("two"));
+    const Ref<Instance> two(log_of("two"));
+    EXPECT_EQ(compare(PATTERN_VLNMPCA_RecordLog, Enumeration_Focus::KEYS, two.get()), 2);
+    agent->m_VLNMPCA_ISCSIRecordLog_map.insert(log_of("one"));
+    EXPECT_EQ(compare(PATTERN_VLNMPCA_RecordLog, Enumeration_Focus::KEYS, two.get()), 0);
+}
+
+} // namespace cimple

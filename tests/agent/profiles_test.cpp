@@ -1,0 +1,125 @@
+// The registered profiles of simulated hosts, and what conforms to them.
+
+#include "agent/profile_maps.h"
+
+#include "agent/associations.h"
+#include "classes/CIM_ElementConformsToProfile.h"
+#include "classes/VLNMPCA_RegisteredProfile.h"
+#include "tests/agent/maps_fixture.h"
+
+#include <map>
+
+namespace cimple {
+
+namespace {
+
+using Profiles_Test = Maps_Test;
+
+// Conforming elements by the profile's name, over all conformance classes.
+std::map<std::string, int> conforming(ProviderAgent& agent) {
+    std::map<std::string, int> counts;
+    for (const Store_Row& row : store_table) {
+        const Instance_Map_Base& store = row.store(agent);
+        for (uint32 i = 0; i < store.size(); ++i)
+            if (auto* conforms = cast<CIM_ElementConformsToProfile>(store.at(i)))
+                ++counts[value_of(conforms->ConformantStandard, "RegisteredName")];
+    }
+    return counts;
+}
+
+// Profiles of a host whose port controllers, cards and so on are conforming as well as its system.
+const char* const NIC_PROFILES[] = {
+    "Profile Registration", "Ethernet Port",   "Host LAN Network Port",
+    "PCI Device",           "Physical Asset",  "Software",
+    "Software Inventory",   "Software Update", "Host Discovered Resources",
+    "Access Points"};
+
+} // namespace
+
+TEST_F(Profiles_Test, EachIsMadeOnceWithTheReferencesOfItsStandard) {
+    load(R"({"use": "nic"})");
+    Loaded_Agent agent;
+    EXPECT_EQ(refreshes_started(*agent), 1);
+    const auto& profiles = agent->m_VLNMPCA_RegisteredProfile_map;
+    const uint32 count = profiles.size();
+    const uint32 references = agent->m_VLNMPCA_ReferencedProfile_map.size();
+    EXPECT_EQ(value_of(profiles.at(4), "InstanceID"), "\"VLN:Physical Asset\"");
+    EXPECT_EQ(value_of(profiles.at(4), "Description"), "\"Vorlan Physical Asset\"");
+    EXPECT_EQ(value_of(profiles.at(4), "ElementName"), "\"Vorlan Registered Physical Asset\"");
+    EXPECT_EQ(value_of(profiles.at(4), "RegisteredOrganization"), "2");
+    EXPECT_EQ(value_of(profiles.at(4), "RegisteredVersion"), "\"1.0.2\"");
+    EXPECT_EQ(value_of(profiles.at(4), "AdvertiseTypes"), "{ 3 }");
+    EXPECT_EQ(value_of(profiles.at(4), "AdvertiseTypeDescriptions"), "{ \"SLP\" }");
+    EXPECT_STREQ(profiles.at(4)->__name_space.c_str(), "root/pg_interop");
+
+    // A second request answers the first one's instance, whatever the version.
+    Auto_Mutex lock(agent->m_DataMutex);
+    Profile_Maps maps(*agent);
+    auto* again = maps.createRegisteredProfile("Physical Asset", 2, "9.9");
+    EXPECT_EQ(again, profiles.at(4));
+    EXPECT_EQ(value_of(again, "RegisteredVersion"), "\"1.0.2\"");
+    EXPECT_EQ(profiles.size(), count);
+    // One that nothing refers to, then the two of iSCSI: Software and the ports, in either order.
+    maps.createRegisteredProfile("Fan", 2, "1.0.0");
+    EXPECT_EQ(agent->m_VLNMPCA_ReferencedProfile_map.size(), references);
+    maps.createRegisteredProfile(PROFILE_ISCSI_INITIATOR);
+    EXPECT_EQ(agent->m_VLNMPCA_ReferencedProfile_map.size(), references + 1);
+    maps.createRegisteredProfile(PROFILE_ISCSI_INITIATOR_PORTS);
+    EXPECT_EQ(agent->m_VLNMPCA_ReferencedProfile_map.size(), references + 2);
+}
+
+// The system and at least one element of the card conform to each.
+TEST_F(Profiles_Test, EveryProfileReachesItsElements) {
+    load(R"({"use": "nic"})");
+    Loaded_Agent agent;
+    EXPECT_EQ(refreshes_started(*agent), 1);
+    auto counts = conforming(*agent);
+    for (const char* name : NIC_PROFILES)
+        EXPECT_GE(counts["\"" + std::string(name) + "\""], 2) << name;
+    const auto& profiles = agent->m_VLNMPCA_RegisteredProfile_map;
+    for (uint32 i = 0; i < profiles.size(); ++i)
+        EXPECT_GE(counts[value_of(profiles.at(i), "RegisteredName")], 1)
+            << profiles[i]->RegisteredName.value.c_str();
+    // The system, two controllers and two logs.
+    EXPECT_EQ(counts["\"Profile Registration\""], 5);
+    EXPECT_EQ(counts["\"Host LAN Network Port\""], 3);
+    EXPECT_EQ(counts["\"FCoE Initiator Ports\""], 1);
+}
+
+TEST_F(Profiles_Test, APlatformsSystemIsNotOursToConform) {
+    load(R"({"use": "nic"})");
+    Loaded_Agent agent;
+    EXPECT_EQ(refreshes_started(*agent), 1);
+    Auto_Mutex lock(agent->m_DataMutex);
+    auto& conforms = agent->m_VLNMPCA_ComputerSystemConformsToProfile_map;
+    const uint32 before = conforms.size();
+    EXPECT_EQ(before, 13u);
+    Log_Capture log;
+    agent->m_bOwnComputerSystem = false;
+    Profile_Maps(*agent).registerForSystem(PROFILE_DIAGNOSTICS);
+    EXPECT_EQ(conforms.size(), before);
+    EXPECT_EQ(log.count(VLN_DBG, "This is IBM/VMWare comp Sys - do nothing"), 1);
+    agent->m_bOwnComputerSystem = true;
+    Profile_Maps(*agent).registerForSystem(PROFILE_DIAGNOSTICS);
+    EXPECT_EQ(conforms.size(), before + 1);
+    EXPECT_EQ(log.count(VLN_DBG, "Generating VLNMPCA_ComputerSystemConformsToProfile (Computer "
+                                 "System,VLN:Diagnostics)"),
+              1);
+}
+
+// Without a NIC the pass goes on to the records all the same.
+TEST_F(Profiles_Test, AHostWithoutANicHasTheProfilesOfItsStorage) {
+    load(R"({"use": "fcoe"})");
+    Loaded_Agent agent;
+    Log_Capture log;
+    EXPECT_EQ(refreshes_started(*agent), 1);
+    expect_counts(*agent, {{STORE_VLNMPCA_SoftwareIdentity, 0},
+                           {STORE_VLNMPCA_SoftwareInstallationService, 0},
+                           {STORE_VLNMPCA_RecordLog, 2},
+                           {STORE_VLNMPCA_ProviderUseOfLog, 0},
+                           {STORE_VLNMPCA_RegisteredProfile, 11}});
+    EXPECT_EQ(log.count(VLN_DBG, "Missing Provider Software Identity"), 1);
+    EXPECT_EQ(log.count(VLN_DBG, "PERF: updateAdapterMaps: cleanExit"), 1);
+}
+
+} // namespace cimple

@@ -1,0 +1,195 @@
+// Libraries, devices and files that tell nonsense: a clear log line, defaults kept, nothing lost.
+#include "tests/road/road.h"
+
+#include <fstream>
+#include <random>
+
+using road::Road;
+using road::text_of;
+
+namespace {
+
+namespace fs = std::filesystem;
+
+// One two-port card with NIC and FCoE functions; the text stands among the card's values.
+std::string card(const std::string& values) {
+    return R"({"include": ")" VLN_SCENARIOS
+           R"(/parts/cna.json", "cards": [{"use": "cna", "ports": 2,
+        "functions": [{"use": "nic"}, {"use": "fcoe", "targets": {"luns": 4,
+            "wwpn": "50:25:64:C{port}:00:00:00:{target:02X}"}}])" +
+           (values.empty() ? values : ", " + values) + "}]}";
+}
+
+void set_value(const char* wwn, const char* table, const char* name, const char* value) {
+    char error[256] = "";
+    ASSERT_EQ(vlnsim_set_value(wwn, table, name, value, error, sizeof error), 0) << error;
+}
+
+constexpr const char* FIRST_NIC = "100002564C000000";
+constexpr const char* SECOND_NIC = "100002564C000101";
+
+TEST(Bad_Data, AnEmptySerialNumberCostsNoPort) {
+    Road road({.scenario = card(R"("serial": "")")});
+    EXPECT_EQ(road.enumerate("VLNMPCA_EthernetPort").size(), 2u);
+    EXPECT_EQ(road.enumerate("VLNMPCA_Card").size(), 1u);
+}
+
+// A list of instances that fails when the adapters are made leaves a table of zeros: the first
+// function, again and again. It is shown once; the others do not take its place.
+TEST(Bad_Data, OfPortsWithOneNameTheFirstIsShown) {
+    Road road({.scenario = card("")});
+    constexpr unsigned CREATING_PASS = 3;
+    ASSERT_EQ(vlnsim_fault("AX_GetAllLocalHBAInstances", CREATING_PASS, VLNSIM_STATUS, 1), 0);
+    const auto ports = road.enumerate("VLNMPCA_EthernetPort");
+    ASSERT_EQ(ports.size(), 1u);
+    EXPECT_EQ(text_of(ports[0], "DeviceID"), FIRST_NIC);
+}
+
+#ifdef CIMPLE_CHECK_LOCKS
+TEST(Bad_Data_Death, AnAddressWithoutTwelveDigitsEndsADevelopmentBuild) {
+    GTEST_FLAG_SET(death_test_style, "threadsafe");
+    EXPECT_DEATH(
+        {
+            Road road({.scenario = card("")});
+            set_value(FIRST_NIC, "portAttributes", "CurrentMACAddress", "\"02-56-4C\"");
+            road.enumerate("VLNMPCA_EthernetPort");
+        },
+        "12 == strlen");
+}
+#else
+TEST(Bad_Data, AnAddressWithoutTwelveDigitsCostsItsPortAndNoOther) {
+    for (const char* address : {"\"\"", "\"02-56-4C\"", "\"02-56-4C-00-00-00-00\"", "null"}) {
+        SCOPED_TRACE(address);
+        Road road({.scenario = card(""), .log = true});
+        set_value(FIRST_NIC, "portAttributes", "CurrentMACAddress", address);
+        const auto ports = road.enumerate("VLNMPCA_EthernetPort");
+        ASSERT_EQ(ports.size(), 1u);
+        EXPECT_EQ(text_of(ports[0], "DeviceID"), SECOND_NIC);
+        EXPECT_EQ(road.enumerate("VLNMPCA_Card").size(), 1u);
+        road.close();
+        EXPECT_GE(road.count_in_log("is not a MAC address"), 1u);
+    }
+}
+#endif
+
+// The longest text that a reader keeps has 255 bytes; bytes that are no UTF-8 go as they came.
+TEST(Bad_Data, OverlongTextsAreCutAndWildBytesHarmNobody) {
+    Road road({.scenario = card("")});
+    const std::string longest(255, 'x');
+    set_value(FIRST_NIC, "portAttributes", "IfName", ("\"" + longest + "yyy\"").c_str());
+    set_value(SECOND_NIC, "portAttributes", "IfName", R"({"bytes": "41FF80C328F09F"})");
+    set_value(FIRST_NIC, "adapterAttributes", "HWVersion", R"("1.2")");
+    set_value(FIRST_NIC, "adapterAttributes", "FirmwareVersion", R"("....")");
+    set_value(SECOND_NIC, "adapterAttributes", "FirmwareVersion", R"("10.2.x.-4294967296")");
+    set_value(SECOND_NIC, "adapterAttributes", "DriverVersion", R"({"bytes": "00"})");
+    const auto ports = road.enumerate("VLNMPCA_EthernetPort");
+    ASSERT_EQ(ports.size(), 2u);
+    EXPECT_EQ(text_of(ports[0], "Name"), longest);
+    EXPECT_TRUE(text_of(ports[1], "Name").starts_with("A"));
+    road.census();
+}
+
+TEST(Bad_Data, AnAbsurdNumberOfInstancesIsRefused) {
+    for (const std::uint64_t count : {4097ull, 1ull << 31, (1ull << 32) - 1}) {
+        Road road({.scenario = card("")});
+        ASSERT_EQ(vlnsim_fault("AX_GetAllLocalHBAInstances", VLNSIM_EVERY, VLNSIM_TOO_SMALL, count),
+                  0);
+        EXPECT_TRUE(road.enumerate("VLNMPCA_Card").empty());
+        EXPECT_EQ(road.enumerate("VLNMPCA_ProviderConfigSetting").size(), 3u);
+        road.close();
+        EXPECT_GE(road.count_in_log("ERROR: AX_GetAllLocalHBAInstances reports "), 1u) << count;
+    }
+}
+
+TEST(Bad_Data, AnAbsurdNumberOfMappingsCostsTheTargetsOnly) {
+    for (const std::uint64_t count : {65537ull, 1ull << 31, (1ull << 32) - 1}) {
+        Road road({.scenario = card("")});
+        ASSERT_EQ(vlnsim_fault("HBA_GetFcpTargetMapping", VLNSIM_EVERY, VLNSIM_TOO_SMALL, count),
+                  0);
+        EXPECT_TRUE(road.enumerate("VLNMPCA_StorageVolume").empty());
+        EXPECT_EQ(road.enumerate("VLNMPCA_EthernetPort").size(), 2u);
+        EXPECT_EQ(vlnsim_calls("HBA_SendScsiInquiry"), 0u);
+    }
+}
+
+// Bytes without sense in the answers of all units, each of its own length, always the same ones.
+TEST(Bad_Data, ScsiResponsesOfRandomBytesEndTheScanOfNoUnit) {
+    std::mt19937 random(20101); // NOLINT: repeatable on purpose
+    std::string units;
+    constexpr unsigned UNITS = 64;
+    const auto bytes = [&] {
+        std::string digits = "\"";
+        char piece[3];
+        for (auto n = random() % 300; n > 0; --n) {
+            std::snprintf(piece, sizeof piece, "%02X", static_cast<unsigned>(random() & 0xFF));
+            digits += piece;
+        }
+        return digits + "\"";
+    };
+    for (unsigned lun = 0; lun < UNITS; ++lun)
+        units += std::string(lun ? "," : "") + R"({"responses": {"inquiry": )" + bytes() +
+                 R"(, "serialPage": )" + bytes() + R"(, "identityPage": )" + bytes() +
+                 R"(, "capacity": )" + bytes() + "}}";
+    Road road({.scenario = R"({"include": ")" VLN_SCENARIOS
+                           R"(/parts/cna.json", "cards": [{"use": "cna",
+        "functions": [{"use": "nic"}, {"use": "fcoe", "targets": {"luns": [)" +
+                           units + R"(], "wwpn": "50:25:64:C0:00:00:00:01"}}]}]})"});
+    road.enumerate("VLNMPCA_StorageVolume");
+    EXPECT_EQ(vlnsim_calls("HBA_SendScsiInquiry"), UNITS * 3ul);
+    EXPECT_EQ(vlnsim_calls("HBA_SendReadCapacity"), UNITS * 1ul);
+    EXPECT_EQ(vlnsim_calls("HBA_CloseAdapter"), UNITS + 1ul);
+    road.census();
+}
+
+// ---- The provider's own files ----
+
+constexpr const char* TUNING_FILE = "etc/vorlan_mpca_provider.conf";
+constexpr const char* LOG_SETTINGS = "etc/vorlan_mpca_provider.dmp";
+
+// A good file, cut at each of its bytes, and bytes that are no lines at all.
+TEST(Bad_Files, ATuningFileCutAnywhereLeavesTheProviderWorking) {
+    const std::string good = "# by hand\nVLN_PROVIDER_CACHE_TIMEOUT = 31\n"
+                             "VLN_PROVIDER_REFRESH_ADAPTERDATA = 0\n"
+                             "VLN_PROVIDER_REFRESH_SANDATA = 1\n";
+    std::vector<std::string> contents;
+    for (std::size_t length = 0; length < good.size(); length += 3)
+        contents.push_back(good.substr(0, length));
+    contents.push_back("=\n= =\nVLN_PROVIDER_CACHE_TIMEOUT\nVLN_PROVIDER_CACHE_TIMEOUT = x\n");
+    contents.push_back("VLN_PROVIDER_CACHE_TIMEOUT = 99999999999999999999999\n");
+    contents.push_back(std::string(100000, 'V') + "=" + std::string(100000, '1'));
+    contents.push_back(std::string("\0\xFF\xFE=\0\n", 6));
+    Road road;
+    for (const std::string& content : contents) {
+        std::ofstream(road.root() / TUNING_FILE) << content;
+        ASSERT_EQ(road.enumerate("VLNMPCA_ProviderConfigSetting").size(), 3u) << content;
+        ASSERT_EQ(road.enumerate("VLNMPCA_EthernetPort").size(), 2u) << content;
+        ASSERT_TRUE(road.manager().cleanup(true).ok());
+    }
+}
+
+TEST(Bad_Files, LogSettingsCutAnywhereLeaveTheProviderWorking) {
+    Road road;
+    const std::string good = "2,5,1\n" + (road.root() / "var/log/trace.log").string() + "\n";
+    std::vector<std::string> contents;
+    for (std::size_t length = 0; length < good.size(); length += 2)
+        contents.push_back(good.substr(0, length));
+    contents.push_back(",,\n\n");
+    contents.push_back("2,5,1");
+    contents.push_back("-1,99999999999,x\n/no/such/folder/at/all.log\n");
+    contents.push_back("2,5,1\n" + (road.root() / "etc").string() + "\n"); // a folder
+    contents.push_back("2,5,1\n" + std::string(20000, 'n') + "\n");
+    for (const std::string& content : contents) {
+        std::ofstream(road.root() / LOG_SETTINGS) << content;
+        ASSERT_EQ(road.enumerate("VLNMPCA_EthernetPort").size(), 2u) << content;
+        ASSERT_TRUE(road.manager().cleanup(true).ok());
+    }
+}
+
+TEST(Bad_Files, WithoutTheFolderOfItsLogTheProviderWorksInSilence) {
+    Road road;
+    fs::remove_all(road.root() / "opt");
+    std::ofstream(road.root() / "opt") << "a file where a folder is wanted";
+    EXPECT_EQ(road.enumerate("VLNMPCA_EthernetPort").size(), 2u);
+}
+
+} // namespace

@@ -205,8 +205,8 @@ HBA_STATUS answer_scsi(Call& call, HBA_HANDLE handle, HBA_WWN port, HBA_UINT64 l
     if (!response)
         return check_condition(*command == read_capacity ? invalid_command : invalid_field,
                                buffers.sense, buffers.sense_size);
-    std::memcpy(buffers.response, response->data(),
-                std::min<std::size_t>(buffers.response_size, response->size()));
+    std::copy_n(response->data(), std::min<std::size_t>(buffers.response_size, response->size()),
+                static_cast<std::uint8_t*>(buffers.response));
     return HBA_STATUS_OK;
 }
 

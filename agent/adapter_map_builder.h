@@ -129,11 +129,7 @@ private:
     void createLANEndpoint(NIC_Port& port);
     void joinLANEndpoint(const NIC_Port& port);
     void conformEthernetPort(const VLNMPCA_EthernetPort& port);
-
-    // pci_maps.cpp, vital_product_maps.cpp
-    uint32 CreatePCIDeviceInstance(const NIC_Port& port);
-    uint32 joinPCIDevice(const NIC_Port& port, const VLNMPCA_PCIDevice& device);
-    VLNMPCA_VitalProductData* CreateVPD(const NIC_Port& port);
+    uint32 createPCIDevice(const NIC_Port& port);
 
     // vlan_maps.cpp
     void createVLANObjects(const NIC_Port& port);

@@ -1,6 +1,8 @@
 // The order of the adapter pass.
 
 #include "agent/adapter_map_builder.h"
+#include "agent/fcoe_maps.h"
+#include "agent/iscsi_maps.h"
 #include "agent/profile_maps.h"
 #include "agent/vpd_maps.h"
 
@@ -28,6 +30,11 @@ uint32 Adapter_Map_Builder::run() {
         return status;
     if (const uint32 status = createRecordLogs())
         return status;
+    FCoE_Map_Builder(_agent, _system).run();
+    if (ISCSI_Map_Builder(_agent, _system).CreateISCSIClasses() != MAP_OK) {
+        VLN_LOG(VLN_ERR, "iSCSI discovery failed");
+        return END_PASS;
+    }
     updateSoftwareIdentities();
     VLN_LOG(VLN_DBG, "PERF: updateAdapterMaps: cleanExit");
     return MAP_OK;

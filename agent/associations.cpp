@@ -21,11 +21,15 @@ sint32 set_reference(Instance* association, uint32 feature, const Instance* end)
     return -1;
 }
 
-bool set_ends(Instance* association, const Instance* first, const Instance* second) {
-    if (!first || !second)
-        return false;
-    const sint32 next = set_reference(association, 0, first);
-    return next >= 0 && set_reference(association, static_cast<uint32>(next), second) >= 0;
+bool set_ends(Instance* association, std::span<const Instance* const> ends) {
+    sint32 feature = 0;
+    for (const Instance* end : ends) {
+        if (end)
+            feature = set_reference(association, static_cast<uint32>(feature), end);
+        if (!end || feature < 0)
+            return false;
+    }
+    return true;
 }
 
 } // namespace
@@ -53,12 +57,18 @@ Instance* insert_instance(Instance_Map_Base& store, Ref<Instance> instance,
 
 Instance* associate(Instance_Map_Base& store, const Instance* first, const Instance* second,
                     const Insert_Failure& failure) {
+    const Instance* const ends[] = {first, second};
+    return associate(store, ends, failure);
+}
+
+Instance* associate(Instance_Map_Base& store, std::span<const Instance* const> ends,
+                    const Insert_Failure& failure) {
     Ref<Instance> association(make_instance(store.meta_class()));
     if (!association) {
         VLN_LOG(VLN_CRIT, "Could not create the instance of the Association class");
         return nullptr;
     }
-    if (!set_ends(association.get(), first, second)) {
+    if (!set_ends(association.get(), ends)) {
         VLN_LOG(VLN_CRIT, "Wrong input for %s", store.meta_class()->name);
         return nullptr;
     }

@@ -8,6 +8,8 @@
 #include "cimple/instance_map.h"
 #include "foundation/logger.h"
 
+#include <span>
+
 namespace cimple {
 
 // A new instance in "root/vorlan" with every property null, as each map builder starts from.
@@ -47,7 +49,11 @@ T* insert_instance(Instance_Map<T>& store, Ref<T> instance, const Insert_Failure
 Instance* associate(Instance_Map_Base& store, const Instance* first, const Instance* second,
                     const Insert_Failure& failure = {});
 
-// The same after a line that tells the class and, in the text, who is joined.
+// The same for an association of any number of ends.
+Instance* associate(Instance_Map_Base& store, std::span<const Instance* const> ends,
+                    const Insert_Failure& failure = {});
+
+// The same for two ends after a line that tells the class and, in the text, who is joined.
 Instance* associate_as(Instance_Map_Base& store, const String& text, const Instance* first,
                        const Instance* second, const Insert_Failure& failure = {});
 

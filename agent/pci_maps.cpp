@@ -1,4 +1,4 @@
-// The PCI function of a NIC port, with its registers.
+#include "agent/pci_maps.h"
 
 #include "agent/adapter_map_builder.h"
 #include "agent/associations.h"
@@ -125,16 +125,16 @@ void set_registers(D& device, const R& registers) {
         device.VPDData.append(word);
 }
 
-Ref<D> pci_device_instance(int adapter_index, int port_index, const R& registers,
+Ref<D> pci_device_instance(const PCI_Function& function, const R& registers,
                            const CIM_ComputerSystem& system) {
     VLN_LOG(VLN_DBG, "Creating VLNMPCA_PCIDevice");
     auto device = make_instance<D>();
     device->SystemCreationClassName.set(system.CreationClassName.value);
     device->SystemName.set(system.Name.value);
     device->CreationClassName.set("VLNMPCA_PCIDevice");
-    device->DeviceID.set(format_text("%d:%d:0x%04X", adapter_index, port_index,
+    device->DeviceID.set(format_text("%s:0x%04X", function.device_id.c_str(),
                                      static_cast<unsigned>(registers.deviceID)));
-    device->ElementName.set(format_text("Vorlan:NICAdapter%d", adapter_index));
+    device->ElementName.set(function.element_name);
     device->EnabledState.set(NOT_APPLICABLE);
     device->RequestedState.set(NOT_APPLICABLE);
     device->PrimaryStatus.set(NOT_APPLICABLE);
@@ -158,10 +158,9 @@ bool pci_wwn(const String& port_name, AX_WWN& wwn) {
 
 } // namespace
 
-// SKIP_DEVICE for a function whose registers can't be read: everything else of the port stays.
-uint32 Adapter_Map_Builder::CreatePCIDeviceInstance(const NIC_Port& port) {
+uint32 PCI_Maps::CreatePCIDeviceInstance(const PCI_Function& function) {
     AX_WWN wwn{};
-    if (!pci_wwn(port.name, wwn))
+    if (!pci_wwn(function.port_name, wwn))
         return END_PASS;
     R registers{};
     const AX_STATUS status = AX_DiagReadPCIRegistersV2(wwn, &registers);
@@ -171,23 +170,21 @@ uint32 Adapter_Map_Builder::CreatePCIDeviceInstance(const NIC_Port& port) {
         return SKIP_DEVICE;
     }
     VLN_LOG(VLN_DBG, "AX_DiagReadPCIRegistersV2 call passed");
-    VLN_LOG(VLN_DBG, "Creating VLNMPCA_PCIDevice for MPCA NIC adapters ");
-    const auto* device = insert_instance(
-        _agent.m_VLNMPCA_PCIDevice_map,
-        pci_device_instance(static_cast<int>(port.function.adapter->getAdapterNumber()),
-                            static_cast<int>(port.index), registers, *_system));
-    return device ? joinPCIDevice(port, *device) : static_cast<uint32>(END_PASS);
+    VLN_LOG(VLN_DBG, "Creating VLNMPCA_PCIDevice for MPCA %s adapters ", function.kind);
+    const auto* device = insert_instance(_agent.m_VLNMPCA_PCIDevice_map,
+                                         pci_device_instance(function, registers, *_system));
+    return device ? join(function, *device) : static_cast<uint32>(END_PASS);
 }
 
-uint32 Adapter_Map_Builder::joinPCIDevice(const NIC_Port& port, const VLNMPCA_PCIDevice& device) {
+uint32 PCI_Maps::join(const PCI_Function& function, const VLNMPCA_PCIDevice& device) {
     if (const auto* profile = Profile_Maps(_agent).find(PROFILE_PCI_DEVICE))
         associate(_agent.m_VLNMPCA_PCIElementConformsToProfile_map, profile, &device);
     if (!associate(_agent.m_VLNMPCA_SystemDevice_map, _system, &device) ||
-        !associate(_agent.m_VLNMPCA_ConcreteIdentity_map, port.ethernet_port, &device))
+        !associate(function.identities, function.port, &device))
         return END_PASS;
-    const auto* data = CreateVPD(port);
+    const auto* data = CreateVPD(function);
     if (!data) {
-        VLN_LOG(VLN_DBG, "NIC port %s CreateVPD failed", port.name.c_str());
+        VLN_LOG(VLN_DBG, "%s port %s CreateVPD failed", function.kind, function.port_name.c_str());
         return MAP_OK;
     }
     associate(_agent.m_VLNMPCA_ElementVPD_map, &device, data);

@@ -19,14 +19,6 @@ constexpr uint16 PROTOCOL_SUPPORTED_OTHER = 1; // CIM_Controller.ProtocolSupport
 constexpr uint16 AVAILABILITY_RUNNING = 3;     // CIM_LogicalDevice.Availability
 constexpr uint16 STATE_NOT_APPLICABLE = 5;     // EnabledState and RequestedState of a controller
 constexpr uint16 ENABLED_DEFAULT_ENABLED = 2;
-constexpr uint16 ACCESS_STATE_ACTIVE = 1; // CIM_ControlledBy.AccessState
-constexpr uint16 ACCESS_STATE_INACTIVE = 2;
-
-// 1 and 2 of the functional states are as good as in use.
-constexpr uint16 access_state(uint32 functional_state) {
-    return functional_state == 1 || functional_state == 2 ? ACCESS_STATE_ACTIVE
-                                                          : ACCESS_STATE_INACTIVE;
-}
 
 Ref<VLNMPCA_PortController> port_controller_instance(const NICAdapterAttributes& adapter,
                                                      const NICPortAttributes& attributes,

@@ -4,6 +4,7 @@
 #include "agent/associations.h"
 #include "agent/beacon.h"
 #include "agent/mac_text.h"
+#include "agent/pci_maps.h"
 #include "agent/port_name.h"
 #include "agent/profile_maps.h"
 #include "agent/state_tables.h"
@@ -99,7 +100,7 @@ uint32 Adapter_Map_Builder::createNICPort(NIC_Function& function, Port& nic_port
         insert_instance(_agent.m_VLNMPCA_EthernetPort_map, CreateEthernetPort(port));
     if (!port.ethernet_port)
         return MAP_OK;
-    const uint32 status = CreatePCIDeviceInstance(port);
+    const uint32 status = createPCIDevice(port);
     if (status != MAP_OK && status != SKIP_DEVICE) {
         VLN_LOG(VLN_CRIT, "CreatePCIDeviceInstance failed");
         return END_PASS;
@@ -117,6 +118,15 @@ uint32 Adapter_Map_Builder::createNICPort(NIC_Function& function, Port& nic_port
     VLN_LOG(VLN_DBG, "Creating controlledby");
     joinControlledBy(port);
     return MAP_OK;
+}
+
+uint32 Adapter_Map_Builder::createPCIDevice(const NIC_Port& port) {
+    const auto adapter = static_cast<int>(port.function.adapter->getAdapterNumber());
+    return PCI_Maps(_agent, _system)
+        .CreatePCIDeviceInstance({port.name, "NIC",
+                                  format_text("%d:%d", adapter, static_cast<int>(port.index)),
+                                  format_text("Vorlan:NICAdapter%d", adapter),
+                                  _agent.m_VLNMPCA_ConcreteIdentity_map, port.ethernet_port});
 }
 
 // Null for a port whose address is no MAC address.

@@ -1,5 +1,7 @@
 #include "agent/software_identity.h"
 
+#include "agent/associations.h"
+#include "agent/text.h"
 #include "classes/CIM_ElementSoftwareIdentity.h"
 #include "foundation/log.h"
 #include "operations/method_wrapper.h"
@@ -78,6 +80,23 @@ void append_flavour(CIM_SoftwareIdentity& software, const String& system,
 void append_identity(CIM_SoftwareIdentity& software, const char* type, const String& value) {
     software.IdentityInfoType.append(String(type));
     software.IdentityInfoValue.append(value);
+}
+
+Ref<VLNMPCA_SoftwareIdentity> driver_identity_instance(const Driver& driver) {
+    auto identity = make_instance<VLNMPCA_SoftwareIdentity>();
+    const String name = format_text("%s v%s", driver.name.c_str(), driver.version.c_str());
+    identity->Description.set(driver.description);
+    identity->ElementName.set(name);
+    identity->Name.set(name);
+    identity->InstanceID.set(format_text("%s: Driver %s", driver.id_head, name.c_str()));
+    identity->VersionString.set(driver.version);
+    identity->Manufacturer.set(driver.manufacturer);
+    identity->Classifications.append(SOFTWARE_DRIVER);
+    identity->ClassificationDescriptions.append(String(driver.kind));
+    identity->IsEntity.set(true);
+    append_identity(*identity, "VORLAN:DRIVER_NAME", driver.name);
+    append_identity(*identity, "VORLAN:DRIVER_VERSION", driver.version);
+    return identity;
 }
 
 void set_software_status(Instance* association, std::initializer_list<uint16> statuses) {

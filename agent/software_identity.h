@@ -2,7 +2,7 @@
 #ifndef VLN_AGENT_SOFTWARE_IDENTITY_H
 #define VLN_AGENT_SOFTWARE_IDENTITY_H
 
-#include "classes/CIM_SoftwareIdentity.h"
+#include "classes/VLNMPCA_SoftwareIdentity.h"
 
 #include <array>
 #include <initializer_list>
@@ -24,6 +24,17 @@ enum Software_Status : uint16 { // CIM_ElementSoftwareIdentity.ElementSoftwareSt
 
 // Who a software is besides its key: one pair of type and value.
 void append_identity(CIM_SoftwareIdentity& software, const char* type, const String& value);
+
+struct Driver {
+    const char* kind;        // "CNA Driver"
+    const char* description; // "Vorlan CNA Driver"
+    const char* id_head;     // of the key, before name and version: "VLN CNA"
+    String name;
+    String version;
+    String manufacturer;
+};
+
+Ref<VLNMPCA_SoftwareIdentity> driver_identity_instance(const Driver& driver);
 
 // Sets the statuses of the software on the element. The association may be null.
 void set_software_status(Instance* association, std::initializer_list<uint16> statuses);

@@ -78,27 +78,6 @@ Ref<VLNMPCA_SoftwareIdentity> provider_identity_instance() {
     return identity;
 }
 
-Ref<VLNMPCA_SoftwareIdentity> driver_identity_instance(const NICAdapterAttributes& adapter,
-                                                       uint32 driver_type) {
-    auto identity = make_instance<VLNMPCA_SoftwareIdentity>();
-    const String name =
-        format_text("%s v%s", adapter.DriverName.c_str(), adapter.DriverVersion.c_str());
-    identity->Description.set("Vorlan CNA Driver");
-    identity->ElementName.set(name);
-    identity->Name.set(name);
-    identity->InstanceID.set(format_text("VLN CNA: Driver %s", name.c_str()));
-    identity->VersionString.set(text(adapter.DriverVersion));
-    identity->Manufacturer.set(text(adapter.Manufacturer));
-    identity->Classifications.append(SOFTWARE_DRIVER);
-    identity->ClassificationDescriptions.append(String("CNA Driver"));
-    identity->IsEntity.set(true);
-    append_identity(*identity, "VORLAN:DRIVER_NAME", text(adapter.DriverName));
-    append_identity(*identity, "VORLAN:DRIVER_VERSION", text(adapter.DriverVersion));
-    append_identity(*identity, "VORLAN:VNICD_DRIVER_TYPE",
-                    format_text("%d", static_cast<int>(driver_type)));
-    return identity;
-}
-
 } // namespace
 
 void Adapter_Map_Builder::createProviderIdentity() {
@@ -133,9 +112,12 @@ uint32 Adapter_Map_Builder::createDriverIdentity() {
 uint32 Adapter_Map_Builder::CreateDriverIdentity(NICAdapter& adapter) {
     const auto& attributes =
         static_cast<const NICAdapterAttributes&>(*adapter.getAdapterAttributes());
-    const auto* identity =
-        insert_instance(_agent.m_VLNMPCA_SoftwareIdentity_map,
-                        driver_identity_instance(attributes, adapter.getDriverType()));
+    auto driver = driver_identity_instance(
+        {"CNA Driver", "Vorlan CNA Driver", "VLN CNA", text(attributes.DriverName),
+         text(attributes.DriverVersion), text(attributes.Manufacturer)});
+    append_identity(*driver, "VORLAN:VNICD_DRIVER_TYPE",
+                    format_text("%d", static_cast<int>(adapter.getDriverType())));
+    const auto* identity = insert_instance(_agent.m_VLNMPCA_SoftwareIdentity_map, driver);
     if (!identity)
         return END_PASS;
     Profile_Maps(_agent).createSoftwareConforms("Driver, Software Inventory",

@@ -108,6 +108,15 @@ constexpr uint16 enabled_state(uint32 state) {
     return OTHER_ENABLED_STATE;
 }
 
+inline constexpr uint16 ACCESS_STATE_ACTIVE = 1; // CIM_ControlledBy.AccessState
+inline constexpr uint16 ACCESS_STATE_INACTIVE = 2;
+
+// 1 and 2 of the functional states are as good as in use.
+constexpr uint16 access_state(uint32 functional_state) {
+    return functional_state == 1 || functional_state == 2 ? ACCESS_STATE_ACTIVE
+                                                          : ACCESS_STATE_INACTIVE;
+}
+
 // Bits per second of one speed code, 0 for a code outside the table.
 constexpr uint64 speed_of_code(uint32 code) {
     for (const Speed_Code& row : speedCodes)

@@ -1,7 +1,7 @@
 // The vital product data of a port's PCI function.
 
-#include "agent/adapter_map_builder.h"
 #include "agent/associations.h"
+#include "agent/pci_maps.h"
 #include "agent/text.h"
 #include "classes/VLNMPCA_VitalProductData.h"
 #include "device/vpd.h"
@@ -53,12 +53,12 @@ Ref<V> vital_product_data_instance(const String& port_name,
 } // namespace
 
 // Null for a port without such data.
-VLNMPCA_VitalProductData* Adapter_Map_Builder::CreateVPD(const NIC_Port& port) {
+VLNMPCA_VitalProductData* PCI_Maps::CreateVPD(const PCI_Function& function) {
     std::vector<PCI_VPD_Entry> entries;
-    if (VLN_Vpd().GetPCIVPD(port.name.c_str(), &entries) != AX_STATUS_OK)
+    if (VLN_Vpd().GetPCIVPD(function.port_name.c_str(), &entries) != AX_STATUS_OK)
         return nullptr;
     return insert_instance(_agent.m_VLNMPCA_VitalProductData_map,
-                           vital_product_data_instance(port.name, entries));
+                           vital_product_data_instance(function.port_name, entries));
 }
 
 } // namespace cimple

@@ -1,0 +1,59 @@
+// The logical units of the SAN as CIM shows them, whichever kind of port sees them.
+//
+// The peripheral device type of a unit (SPC-3, 6.4.2) decides its class, and with that the store
+// it goes to, the association with the computer system and the one with the path to it. Runs in the
+// SAN pass, with the SAN maps' ready mutex and m_DataMutex held.
+#ifndef VLN_AGENT_LOGICAL_UNIT_MAPS_H
+#define VLN_AGENT_LOGICAL_UNIT_MAPS_H
+
+#include "agent/provider_agent.h"
+#include "classes/CIM_LogicalDevice.h"
+
+#include <optional>
+
+namespace cimple {
+
+// What a port's discovery knows of a unit. Texts are valid UTF-8 already.
+struct Logical_Unit {
+    uint32 peripheral_type;
+    uint64 number;
+    String device_id; // the key
+    String name;
+    String description;
+    String os_device_name; // empty for none
+    String inquiry;        // what the unit told of itself, as one text
+    uint64 capacity = 0;   // bytes
+    uint64 block_size = 0; // bytes; 0 for a unit without blocks
+    uint64 number_of_blocks = 0;
+    // The type of the first descriptor of its device identification page (SPC-3, 7.6.3.1).
+    std::optional<uint32> identifier_type = {};
+};
+
+// Name of a unit after its type: "Tape Drive 5".
+String logical_unit_name(uint32 peripheral_type, uint64 number);
+
+enum class Unit_Transport : uint8 { FC, ISCSI };
+
+class Logical_Unit_Maps {
+public:
+    Logical_Unit_Maps(ProviderAgent& agent, const CIM_ComputerSystem* system)
+        : _agent(agent), _system(system) {}
+
+    // The unit in the store of its class, tied to the computer system. The one that stands there
+    // already, after the line of a failed insertion, for a unit that two ports see under one key.
+    const CIM_LogicalDevice* findOrMake(const Logical_Unit& unit);
+
+    // The path from an initiator to a unit that findOrMake answered. False, with a line in the log,
+    // if an end is null or the path stands already.
+    bool joinPath(Unit_Transport transport, const Logical_Unit& unit,
+                  const CIM_LogicalDevice* device, const Instance* initiator,
+                  const Instance* target);
+
+private:
+    ProviderAgent& _agent;
+    const CIM_ComputerSystem* _system;
+};
+
+} // namespace cimple
+
+#endif // VLN_AGENT_LOGICAL_UNIT_MAPS_H

@@ -20,7 +20,7 @@ bool port_name_to_wwn(const String& port_name, HBA_WWN& wwn) {
     return true;
 }
 
-String asic_name(const NICAdapterAttributes& adapter) {
+String asic_name(const AdapterAttributes& adapter) {
     String name = text(adapter.SerialNumber);
     if (!adapter.Subadapter_number.empty())
         name.append((":" + adapter.Subadapter_number).c_str());

@@ -13,7 +13,7 @@ bool port_name_to_wwn(const String& port_name, HBA_WWN& wwn);
 
 // The ASIC of a function: the card's serial number, and the number of the sub-adapter behind a
 // colon if it has one.
-String asic_name(const NICAdapterAttributes& adapter);
+String asic_name(const AdapterAttributes& adapter);
 
 } // namespace cimple
 

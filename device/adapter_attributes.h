@@ -20,44 +20,55 @@ class AdapterAttributes {
 public:
     virtual ~AdapterAttributes() noexcept(false) = default;
 
-protected:
-    AdapterAttributes() = default;
-};
-
-class NICAdapterAttributes : public AdapterAttributes {
-public:
-    NICAdapterAttributes(const HBAIdentifier& hbaIdentifier, const LocalHBAInfoV4& localHBAInfo);
-
     uint32 numberOfPorts = 1;
-    std::string PortWWN; // 16 upper-case digits, as all names below
+    std::string PortWWN; // 16 upper-case digits, as all names below; of the adapter's port 0
     std::string NodeWWN;
 
+    // What every kind of adapter tells.
     std::string Manufacturer;
     std::string SerialNumber;
     std::string Model;
     std::string ModelDescription;
-    std::string HWVersion;
     std::string OptionROMVersion;
-    std::string FirmwareVersion;
-    uint32 VendorSpecificID = 0;
-    std::string DriverName;
     uint32 DeviceID = 0;
     uint32 ModelID = 0;
     std::string OpertionalFirmwareVersion;
-    bool BootCodeEnabled = false;
-    std::string DriverVersion;
     std::string BootVersion;
+    uint32 PCIBusNumber = 0;
+    uint32 PortNumber = 0;
+    uint32 PCIFunctionNumber = 0;
+    std::string Subadapter_number;
+
+protected:
+    AdapterAttributes() = default;
+};
+
+// Of a function of a converged card, as the management library lists it.
+class CNAAdapterAttributes : public AdapterAttributes {
+public:
+    std::string HWVersion;
+    std::string FirmwareVersion;
+    std::string DriverName;
+    std::string DriverVersion;
+    uint32 FirmwareStatus = 0;
+
+protected:
+    explicit CNAAdapterAttributes(const LocalHBAInfoV4& localHBAInfo);
+};
+
+class NICAdapterAttributes : public CNAAdapterAttributes {
+public:
+    NICAdapterAttributes(const HBAIdentifier& hbaIdentifier, const LocalHBAInfoV4& localHBAInfo);
+
+    uint32 VendorSpecificID = 0;
+    bool BootCodeEnabled = false;
     uint32 DiagVersionNumber = 0;
     uint8 BoardTemperature = 0;      // degrees Celsius: bits 0 to 7 of the attribute
     uint8 ThresholdCriticalTemp = 0; // bits 16 to 23
     uint8 ThresholdWarningTemp = 0;  // bits 8 to 15
-    uint32 PCIBusNumber = 0;
     uint32 FunctionType = 0;
     uint32 SubDeviceID = 0;
-    uint32 PortNumber = 0;
-    uint32 PCIFunctionNumber = 0;
     uint32 SubVendorID = 0;
-    uint32 FirmwareStatus = 0;
     std::string IPLFilename;
     std::string NCSIVersion;
     std::string FCOEUniversalVersion;
@@ -71,77 +82,32 @@ public:
     std::string PCIBusSpeed;
     std::string PCIBusWidth;
     uint32 PortConnectionType = 0;
-    std::string Subadapter_number;
     std::string FirmwareOnFlash;
 };
 
-class iSCSIAdapterAttributes : public AdapterAttributes {
+class iSCSIAdapterAttributes : public CNAAdapterAttributes {
 public:
     iSCSIAdapterAttributes(const HBAIdentifier& hbaIdentifier, const LocalHBAInfoV4& localHBAInfo);
 
-    uint32 numberOfPorts = 1;
-    std::string PortWWN;
-    std::string NodeWWN;
-
-    std::string Manufacturer;
-    std::string SerialNumber;
-    std::string Model;
-    std::string ModelDescription;
-    std::string HWVersion;
-    std::string OptionROMVersion;
-    std::string FirmwareVersion;
-    std::string DriverName;
-    uint32 DeviceID = 0;
-    uint32 ModelID = 0;
-    std::string OpertionalFirmwareVersion;
     std::string OpertionalFirmwareVersion2; // the same attribute, read a second time
-    std::string DriverVersion;
-    std::string BootVersion;
-    uint32 PCIBusNumber = 0;
-    uint32 PortNumber = 0;
-    uint32 PCIFunctionNumber = 0;
-    uint32 FirmwareStatus = 0;
-    std::string Subadapter_number;
 };
 
-class FCoEAdapterAttributes : public AdapterAttributes {
+class FCoEAdapterAttributes : public CNAAdapterAttributes {
 public:
     FCoEAdapterAttributes(const HBAIdentifier& hbaIdentifier, const LocalHBAInfoV4& localHBAInfo);
 
-    uint32 numberOfPorts = 1;
-    std::string PortWWN;
-    std::string NodeWWN;
     uint32 DriverType = 0;
-
-    std::string Manufacturer;
-    std::string SerialNumber;
-    std::string Model;
-    std::string ModelDescription;
     std::string NodeSymbolicName;
-    std::string HWVersion;
-    std::string OptionROMVersion;
-    std::string FirmwareVersion;
     uint32 VendorSpecificID = 0;
-    std::string DriverName;
-    uint32 DeviceID = 0;
-    uint32 ModelID = 0;
-    std::string OpertionalFirmwareVersion;
     std::string IEEEAddress; // "xx:xx:xx:xx:xx:xx"
-    std::string DriverVersion;
-    std::string BootVersion;
     std::string FunctionalFirmwareVersion;
     std::string KernelFirmwareVersion;
     uint32 SLIMode = 0;
     uint32 BoardTemperature = 0;
-    uint32 PCIBusNumber = 0;
-    uint32 PortNumber = 0;
-    uint32 PCIFunctionNumber = 0;
-    uint32 FirmwareStatus = 0;
     std::string SPFirmwareVersion;
     std::string SPFirmwareName;
     std::string ULPFirmwareVersion;
     std::string ULPFirmwareName;
-    std::string Subadapter_number;
 };
 
 // Reads the published record of the HBA API first, then the management library.
@@ -149,40 +115,23 @@ class FCAdapterAttributes : public AdapterAttributes {
 public:
     explicit FCAdapterAttributes(Adapter& adapter);
 
-    uint32 numberOfPorts = 0;
-    std::string PortWWN; // of the adapter's port 0
-    std::string NodeWWN;
     uint32 DriverType = 0;
-
-    std::string Manufacturer;
-    std::string SerialNumber;
-    std::string Model;
-    std::string ModelDescription;
     std::string NodeSymbolicName;
-    std::string OptionROMVersion;
-    uint32 DeviceID = 0;
-    uint32 ModelID = 0;
-    std::string OpertionalFirmwareVersion;
     std::string SLI1FirmwareName;
     std::string SLI2FirmwareName;
     std::string IEEEAddress;
     bool BootCodeEnabled = false;
-    std::string BootVersion;
     uint32 DiagVersionNumber = 0;
     std::string FunctionalFirmwareVersion;
     std::string KernelFirmwareVersion;
     std::string SLI3FirmwareName;
     uint32 SLIMode = 0;
     uint32 BoardTemperature = 0;
-    uint32 PortNumber = 0;
-    uint32 PCIBusNumber = 0;
     uint32 FunctionType = 0;
-    uint32 PCIFunctionNumber = 0;
     std::string SPFirmwareVersion;
     std::string SPFirmwareName;
     std::string ULPFirmwareVersion;
     std::string ULPFirmwareName;
-    std::string Subadapter_number;
     std::string FCUniversalVersion;
     std::string FC_X86_BIOSVersion;
     std::string FC_EFIVersion;

@@ -45,8 +45,7 @@ constexpr Attribute_Row<A> TABLE[] = {
 
 FCoEAdapterAttributes::FCoEAdapterAttributes(const HBAIdentifier&,
                                              const LocalHBAInfoV4& localHBAInfo)
-    : PortWWN(VLN_Common::wwnText(localHBAInfo.portWWN)),
-      NodeWWN(VLN_Common::wwnText(localHBAInfo.nodeWWN)) {
+    : CNAAdapterAttributes(localHBAInfo) {
     VLN_LOG(VLN_DBG, "Port 0's WWPN: %s", PortWWN.c_str());
     const AX_WWN wwn = wwnOfPort(PortWWN);
     Attribute_Buffer buffer = fetchAdapterAttributes(wwn);

@@ -35,8 +35,7 @@ constexpr Attribute_Row<A> TABLE[] = {
 
 iSCSIAdapterAttributes::iSCSIAdapterAttributes(const HBAIdentifier&,
                                                const LocalHBAInfoV4& localHBAInfo)
-    : PortWWN(VLN_Common::wwnText(localHBAInfo.portWWN)),
-      NodeWWN(VLN_Common::wwnText(localHBAInfo.nodeWWN)) {
+    : CNAAdapterAttributes(localHBAInfo) {
     VLN_LOG(VLN_DBG, "Port 0's WWPN: %s", PortWWN.c_str());
     Attribute_Buffer buffer = fetchAdapterAttributes(wwnOfPort(PortWWN));
     VLN_LOG(VLN_DBG, "CALLING iSCSIAdapterAttributes AX CALLS");

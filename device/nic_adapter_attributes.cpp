@@ -61,8 +61,7 @@ constexpr Attribute_Row<A> TABLE[] = {
 } // namespace
 
 NICAdapterAttributes::NICAdapterAttributes(const HBAIdentifier&, const LocalHBAInfoV4& localHBAInfo)
-    : PortWWN(VLN_Common::wwnText(localHBAInfo.portWWN)),
-      NodeWWN(VLN_Common::wwnText(localHBAInfo.nodeWWN)) {
+    : CNAAdapterAttributes(localHBAInfo) {
     VLN_LOG(VLN_DBG, "Port 0's WWPN: %s", PortWWN.c_str());
     Attribute_Buffer buffer = fetchAdapterAttributes(wwnOfPort(PortWWN));
     readTable(ADAPTER_FAMILY, buffer, *this, TABLE);

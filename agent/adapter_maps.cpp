@@ -30,7 +30,8 @@ uint32 Adapter_Map_Builder::run() {
         return status;
     if (const uint32 status = createRecordLogs())
         return status;
-    FCoE_Map_Builder(_agent, _system).run();
+    if (const uint32 status = FCoE_Map_Builder(_agent, _system).run())
+        return status;
     if (ISCSI_Map_Builder(_agent, _system).CreateISCSIClasses() != MAP_OK) {
         VLN_LOG(VLN_ERR, "iSCSI discovery failed");
         return END_PASS;

@@ -5,6 +5,7 @@
 
 #include "agent/adapter_map_builder.h"
 #include "agent/associations.h"
+#include "agent/physical_port.h"
 #include "agent/port_name.h"
 #include "agent/profile_maps.h"
 #include "agent/software_identity.h"
@@ -111,9 +112,9 @@ uint32 Adapter_Map_Builder::createNICCard(NICAdapter& adapter) {
 
     const auto& cards = _agent.m_VLNMPCA_Card_map;
     VLN_LOG(VLN_DBG, "inside icard %zu", static_cast<std::size_t>(cards.size()));
-    function.card = find_last(cards, [&](const VLNMPCA_Card& card) {
-        return card.VLNSerialNumber.value == attributes.SerialNumber.c_str();
-    });
+    const String serial = text(attributes.SerialNumber);
+    function.card = find_last(
+        cards, [&](const VLNMPCA_Card& card) { return card.VLNSerialNumber.value == serial; });
     if (!function.card) {
         VLN_LOG(VLN_DBG, "create icard instance %zu", static_cast<std::size_t>(cards.size()));
         function.card = CreateMPCACardInstance(attributes);
@@ -137,8 +138,9 @@ uint32 Adapter_Map_Builder::createNICCard(NICAdapter& adapter) {
 
 VLNMPCA_Product* Adapter_Map_Builder::findOrMakeProduct(const NICAdapterAttributes& attributes) {
     auto& products = _agent.m_VLNMPCA_Product_map;
+    const String serial = text(attributes.SerialNumber);
     auto* product = find_first(products, [&](const VLNMPCA_Product& candidate) {
-        return candidate.IdentifyingNumber.value == attributes.SerialNumber.c_str();
+        return candidate.IdentifyingNumber.value == serial;
     });
     return product ? product : insert_instance(products, product_instance(attributes));
 }
@@ -191,9 +193,7 @@ void Adapter_Map_Builder::findOrMakeConnector(NIC_Port& port) {
     auto& connectors = _agent.m_VLNMPCA_PhysicalConnector_map;
     VLN_LOG(VLN_DBG, "inside Product %zu",
             static_cast<std::size_t>(_agent.m_VLNMPCA_Product_map.size()));
-    port.connector = find_last(connectors, [&](const VLNMPCA_PhysicalConnector& candidate) {
-        return candidate.InstanceID.value == port.serial_and_number;
-    });
+    port.connector = find_connector(_agent, port.serial_and_number);
     if (!port.connector)
         port.connector =
             insert_instance(connectors, connector_instance(*port.function.attributes, port.name,

@@ -13,8 +13,8 @@ namespace cimple {
 namespace {
 
 struct Update_Rule {
-    const char* entry;
-    const char* not_yet; // logged within the limit
+    const char* entry;   // or null
+    const char* not_yet; // logged within the limit; or null
     uint64 limit;        // microseconds; the cache time-out of the refresh has no part in it
 };
 
@@ -28,6 +28,7 @@ constexpr Update_Rule UPDATE_RULES[] = {
     {"Entering GetFCoEPortStats()", "GetFCoEPortStats() :Refresh Not yet required", SLOW},
     {"UpdatePhyLinkDownReason(): Entry", "UpdatePhyLinkDownReason:Refresh Not yet required", FAST},
     {"UpdateBoardTemp(): Entry", "UpdateBoardTemp refresh Not yet required", SLOW},
+    {nullptr, nullptr, FAST}, // what it calls tells enough
 };
 static_assert(std::size(UPDATE_RULES) == NUM_DYNAMIC_UPDATES);
 
@@ -36,11 +37,13 @@ static_assert(std::size(UPDATE_RULES) == NUM_DYNAMIC_UPDATES);
 // A clock that was set back gives a difference beyond every limit, so nothing waits for it.
 bool update_due(ProviderAgent& agent, Dynamic_Update update) {
     const Update_Rule& rule = UPDATE_RULES[update];
-    VLN_LOG(VLN_DBG, "%s", rule.entry);
+    if (rule.entry)
+        VLN_LOG(VLN_DBG, "%s", rule.entry);
     const Datetime now = Datetime::now();
     Datetime& last = agent.m_LastUpdates[update];
     if (now.usec() - last.usec() < rule.limit) {
-        VLN_LOG(VLN_DBG, "%s", rule.not_yet);
+        if (rule.not_yet)
+            VLN_LOG(VLN_DBG, "%s", rule.not_yet);
         return false;
     }
     last = now;

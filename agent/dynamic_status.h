@@ -13,7 +13,9 @@
 
 namespace cimple {
 
+class Port;
 class ProviderAgent;
+struct VLNMPCA_FCPortStatistics;
 
 enum Dynamic_Update : uint8 {
     UPDATE_ETHERNET_PORT,
@@ -21,11 +23,12 @@ enum Dynamic_Update : uint8 {
     UPDATE_FC_PORT_STATISTICS,
     UPDATE_PHY_LINK_DOWN_REASON,
     UPDATE_BOARD_TEMPERATURE,
+    UPDATE_DRIVER_PARAMETERS,
     NUM_DYNAMIC_UPDATES
 };
 
-// The common beginning of every routine: logs its entry and, when its last run is at least its
-// limit ago, notes the present as its last run and answers true.
+// The common beginning of every routine: logs its entry, if it has one, and, when its last run is
+// at least its limit ago, notes the present as its last run and answers true.
 bool update_due(ProviderAgent& agent, Dynamic_Update update);
 
 void UpdateEthernetPortStatus(ProviderAgent& agent);
@@ -33,6 +36,11 @@ void UpdateFCoEPortStatus(ProviderAgent& agent);
 void GetFCoEPortStats(ProviderAgent& agent);
 void UpdatePhyLinkDownReason(ProviderAgent& agent);
 void UpdateBoardTemp(ProviderAgent& agent);
+void UpdateDriverParameters(ProviderAgent& agent); // driver_parameter_maps.cpp
+
+// The counters of an FCoE port as the library has them now. A failure is told in the log and leaves
+// the statistics as they are.
+void readFCoEPortStatistics(Port& port, VLNMPCA_FCPortStatistics& statistics);
 
 // What UpdateEthernetPortStatus does when it is due. The first call that finds an Ethernet port
 // makes the table and starts the thread; the later ones show what the table holds.

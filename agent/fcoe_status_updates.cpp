@@ -5,6 +5,7 @@
 #include "agent/provider_agent.h"
 #include "agent/state_tables.h"
 #include "agent/store_search.h"
+#include "agent/text.h"
 #include "classes/VLNMPCA_FCPort.h"
 #include "classes/VLNMPCA_FCPortStatistics.h"
 
@@ -74,7 +75,7 @@ void read_port(Attribute_Buffer& buffer, VLNMPCA_FCPort& port) {
     Attribute_Text speed;
     if (getAttributeText(PORT_FAMILY, speed, buffer, FUNCTIONAL_PORT_SPEED,
                          "FunctionalPortSpeed") == AX_STATUS_OK)
-        port.FunctionalPortSpeed.set(speed);
+        port.FunctionalPortSpeed.set(text(speed));
 }
 
 void update_port(const ProviderAgent& agent, const std::string& name) {
@@ -149,14 +150,22 @@ void update_statistics(const ProviderAgent& agent, Port& port) {
                                   });
     if (!statistics)
         return;
-    const PortStatistics* counters = port.getPortStatistics();
-    if (!counters)
-        return;
-    statistics->StatisticTime.set(Datetime::now());
-    copy_counters(*counters, *statistics);
+    readFCoEPortStatistics(port, *statistics);
 }
 
 } // namespace
+
+void readFCoEPortStatistics(Port& port, VLNMPCA_FCPortStatistics& statistics) {
+    try {
+        if (const PortStatistics* counters = port.getPortStatistics()) {
+            statistics.StatisticTime.set(Datetime::now());
+            copy_counters(*counters, statistics);
+        }
+    } catch (...) {
+        VLN_LOG(VLN_ERR, "Error occurred while retrieving FCoEPort Statistics");
+        VLN_LOG(VLN_ERR, "Error getting FCoE Port statistics");
+    }
+}
 
 void UpdateFCoEPortStatus(ProviderAgent& agent) {
     if (!update_due(agent, UPDATE_FC_PORT))
@@ -176,14 +185,7 @@ void GetFCoEPortStats(ProviderAgent& agent) {
     if (!update_due(agent, UPDATE_FC_PORT_STATISTICS))
         return;
     VLN_LOG(VLN_DBG, "GetFCoEPortStats(): Update");
-    for_each_fcoe_port(agent, [&agent](Port& port) {
-        try {
-            update_statistics(agent, port);
-        } catch (...) {
-            VLN_LOG(VLN_ERR, "Error occurred while retrieving FCoEPort Statistics");
-            VLN_LOG(VLN_ERR, "Error getting FCoE Port statistics");
-        }
-    });
+    for_each_fcoe_port(agent, [&agent](Port& port) { update_statistics(agent, port); });
     VLN_LOG(VLN_DBG, "PERF: GetFCoEPortStats: cleanExit");
 }
 

@@ -2,6 +2,7 @@
 
 #include "agent/adapter_map_builder.h"
 #include "agent/associations.h"
+#include "agent/port_identity.h"
 #include "agent/port_name.h"
 #include "agent/profile_maps.h"
 #include "agent/software_identity.h"
@@ -15,9 +16,6 @@
 namespace cimple {
 
 namespace {
-
-// Later look-ups find the firmware of an adapter by this pair.
-constexpr char ADAPTER_KEY_TYPE[] = "SerialNumber + Sub-AdapterID";
 
 // The parts of a version of the form d.ddXd. Others stand in VersionString alone.
 void set_firmware_numbers(VLNMPCA_SoftwareIdentity& firmware, const std::string& version) {
@@ -53,7 +51,7 @@ Ref<VLNMPCA_SoftwareIdentity> firmware_instance(const NICAdapterAttributes& adap
     firmware->IsEntity.set(true);
     firmware->FirmwareOnFlash.set(text(adapter.FirmwareOnFlash));
     firmware->OptROMVersion.set(text(adapter.OptionROMVersion));
-    append_identity(*firmware, ADAPTER_KEY_TYPE, key);
+    append_identity(*firmware, IDENTITY_ASIC, key);
     setTargetOSTypes(*firmware);
     return firmware;
 }
@@ -62,7 +60,7 @@ bool is_firmware_of(const VLNMPCA_SoftwareIdentity& software, const String& vers
                     const String& key) {
     return software.VersionString.value == version &&
            software.Classifications.value.find(SOFTWARE_FIRMWARE) == 0 &&
-           software.IdentityInfoType.value.find(ADAPTER_KEY_TYPE) == 0 &&
+           software.IdentityInfoType.value.find(IDENTITY_ASIC) == 0 &&
            software.IdentityInfoValue.value[0] == key;
 }
 
@@ -111,14 +109,18 @@ Ref<Flash> flash_instance(const NICAdapterAttributes& adapter, const String& key
 
 } // namespace
 
-void Adapter_Map_Builder::findOrMakeFirmware(NIC_Port& port) {
-    const NICAdapterAttributes& adapter = *port.function.attributes;
+VLNMPCA_SoftwareIdentity* find_firmware(const Instance_Map<VLNMPCA_SoftwareIdentity>& store,
+                                        const AdapterAttributes& adapter) {
     const String version = text(adapter.OpertionalFirmwareVersion);
     const String key = asic_name(adapter);
-    port.firmware =
-        find_last(_agent.m_VLNMPCA_SoftwareIdentity_map, [&](const VLNMPCA_SoftwareIdentity& each) {
-            return is_firmware_of(each, version, key);
-        });
+    return find_last(store, [&](const VLNMPCA_SoftwareIdentity& each) {
+        return is_firmware_of(each, version, key);
+    });
+}
+
+void Adapter_Map_Builder::findOrMakeFirmware(NIC_Port& port) {
+    const NICAdapterAttributes& adapter = *port.function.attributes;
+    port.firmware = find_firmware(_agent.m_VLNMPCA_SoftwareIdentity_map, adapter);
     if (port.firmware)
         return;
     port.firmware = CreateFirmwareIdentityInstance(adapter);

@@ -3,6 +3,7 @@
 #include "agent/adapter_map_builder.h"
 #include "agent/associations.h"
 #include "agent/profile_maps.h"
+#include "agent/state_tables.h"
 #include "agent/store_search.h"
 #include "agent/text.h"
 #include "classes/VLNMPCA_EnabledLogicalIPProtocolEndpointCapabilities.h"
@@ -17,12 +18,12 @@ namespace cimple {
 
 namespace {
 
-constexpr uint16 ENABLED = 2; // CIM_EnabledLogicalElement.EnabledState
-constexpr uint16 REQUESTED_STATE_NOT_APPLICABLE = 12;
+constexpr uint16 ENABLED = 2;                       // CIM_EnabledLogicalElement.EnabledState
 constexpr uint16 ADDRESS_ORIGIN_NOT_APPLICABLE = 2; // CIM_IPAssignmentSettingData.AddressOrigin
 constexpr uint16 ADDRESS_ORIGIN_STATIC = 3;
 constexpr uint16 ACCESS_CONTEXT_DEFAULT_GATEWAY = 2; // CIM_RemoteServiceAccessPoint
 constexpr uint16 INFO_FORMAT_IPV4_ADDRESS = 3;
+constexpr uint16 INFO_FORMAT_IPV6_ADDRESS = 4;
 
 Ref<VLNMPCA_IPConfigurationService> service_instance(const CIM_ComputerSystem& system) {
     auto service = make_instance<VLNMPCA_IPConfigurationService>();
@@ -65,9 +66,15 @@ Ref<VLNMPCA_StaticIPAssignmentSettingData> static_setting_instance(const IP_Inte
     setting->InstanceID.set(name);
     setting->ElementName.set(name);
     setting->AddressOrigin.set(ADDRESS_ORIGIN_STATIC);
-    setting->IPv4Address.set(interface.address);
+    (is_ipv6(interface.address) ? setting->IPv6Address : setting->IPv4Address)
+        .set(interface.address);
     setting->SubnetMask.set(interface.subnet_mask);
-    setting->GatewayIPv4Address.set(interface.gateway);
+    (is_ipv6(interface.gateway) ? setting->GatewayIPv6Address : setting->GatewayIPv4Address)
+        .set(interface.gateway);
+    // Null where the host's kernel keeps them.
+    setting->VLANEnabled = interface.endpoint->VLANEnabled;
+    setting->VLANID = interface.endpoint->VLANID;
+    setting->Priority = interface.endpoint->Priority;
     return setting;
 }
 
@@ -81,7 +88,7 @@ Ref<VLNMPCA_RemoteServiceAccessPoint> gateway_instance(const String& address,
     gateway->Name.set(address);
     gateway->ElementName.set("Default Gateway Address");
     gateway->AccessInfo.set(address);
-    gateway->InfoFormat.set(INFO_FORMAT_IPV4_ADDRESS);
+    gateway->InfoFormat.set(is_ipv6(address) ? INFO_FORMAT_IPV6_ADDRESS : INFO_FORMAT_IPV4_ADDRESS);
     gateway->AccessContext.set(ACCESS_CONTEXT_DEFAULT_GATEWAY);
     return gateway;
 }

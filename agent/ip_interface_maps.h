@@ -9,6 +9,13 @@
 
 namespace cimple {
 
+inline constexpr uint16 IF_TYPE_IPV4 = 4096; // CIM_IPProtocolEndpoint.ProtocolIFType
+inline constexpr uint16 IF_TYPE_IPV6 = 4097;
+
+inline bool is_ipv6(const String& address) {
+    return address.find(':') != -1;
+}
+
 struct IP_Interface {
     const VLNMPCA_IPProtocolEndpoint* endpoint; // in its store
     String serial;                              // of the card

@@ -16,9 +16,7 @@ namespace {
 
 constexpr uint16 STATE_ENABLED = 2; // CIM_EnabledLogicalElement.EnabledState
 constexpr uint16 STATE_DISABLED = 3;
-constexpr uint16 IF_TYPE_IPV4 = 4096; // CIM_IPProtocolEndpoint.ProtocolIFType
-constexpr uint16 IF_TYPE_IPV6 = 4097;
-constexpr uint16 IF_TYPE_OTHER = 1;
+constexpr uint16 IF_TYPE_OTHER = 1;          // CIM_IPProtocolEndpoint.ProtocolIFType
 constexpr uint16 ADDRESS_ORIGIN_UNKNOWN = 0; // CIM_IPProtocolEndpoint.AddressOrigin
 constexpr uint16 ADDRESS_ORIGIN_STATIC = 3;
 constexpr uint16 ADDRESS_ORIGIN_DHCP = 4;

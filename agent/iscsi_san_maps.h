@@ -7,9 +7,32 @@
 
 #include "agent/provider_agent.h"
 
+#include <string>
+#include <vector>
+
 namespace cimple {
 
 class Port;
+
+// The port that looks, with the instances that what it sees is tied to. Those of the adapter pass
+// are null where that made none.
+struct ISCSI_View {
+    Port& port;
+    String port_name; // 16 digits
+    HBA_WWN wwn;
+    const CIM_ComputerSystem* system;
+    const VLNMPCA_EthernetPort* ethernet_port;
+    const VLNMPCA_TCPProtocolEndpoint* tcp_endpoint;
+    const VLNMPCA_SCSIProtocolController* controller;
+};
+
+struct ISCSI_Target {
+    std::size_t index;    // in the library's table
+    std::string raw_name; // as the library wants it back
+    String name;          // the same as a text
+    String portal_group;  // of its sessions, empty without one
+    std::vector<const VLNMPCA_iSCSIProtocolEndpoint*> initiators; // of its usable sessions
+};
 
 class ISCSI_SAN_Maps {
 public:
@@ -20,6 +43,15 @@ public:
     uint32 GetiSCSITargets(Port& port);
 
 private:
+    uint32 walkTargets(const ISCSI_View& view);
+    uint32 createSessions(const ISCSI_View& view, ISCSI_Target& target);
+    void findEnds(ISCSI_View& view) const;
+
+    // iscsi_unit_maps.cpp
+    uint32 createTarget(const ISCSI_View& view, const ISCSI_Target& target);
+    void createUnits(const ISCSI_View& view, const ISCSI_Target& target,
+                     const AX_iSCSI_LunList& luns, const Instance* target_endpoint);
+
     ProviderAgent& _agent;
 };
 

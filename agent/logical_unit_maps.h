@@ -36,6 +36,7 @@ enum class Unit_Transport : uint8 { FC, ISCSI };
 
 class Logical_Unit_Maps {
 public:
+    // The system stands in its store: no unit can be named without it.
     Logical_Unit_Maps(ProviderAgent& agent, const CIM_ComputerSystem* system)
         : _agent(agent), _system(system) {}
 

@@ -2,10 +2,10 @@
 
 #include "agent/adapter_map_builder.h"
 #include "agent/associations.h"
+#include "agent/physical_port.h"
 #include "agent/port_name.h"
 #include "agent/profile_maps.h"
 #include "agent/state_tables.h"
-#include "agent/store_search.h"
 #include "agent/text.h"
 #include "classes/VLNMPCA_ControlledBy.h"
 #include "classes/VLNMPCA_RegisteredProfile.h"
@@ -57,9 +57,9 @@ void read_port_speed(VLNMPCA_PortController& controller, const String& port_name
         VLN_MethodWrapper::GetPhyPortSpeedAttributesValues(&wwn, &settings) != AX_STATUS_OK)
         return;
     controller.InterfaceType.set(settings.interfaceType);
-    controller.AutoNegSupportedSpeeds.set(settings.autoNegSupportedSpeeds);
-    controller.ForceSupportedSpeeds.set(settings.forceSupportedSpeeds);
-    controller.ConfiguredPortSpeed.set(settings.configuredPortSpeed);
+    controller.AutoNegSupportedSpeeds.set(text(settings.autoNegSupportedSpeeds));
+    controller.ForceSupportedSpeeds.set(text(settings.forceSupportedSpeeds));
+    controller.ConfiguredPortSpeed.set(text(settings.configuredPortSpeed));
     controller.PortSpeedMode.set(static_cast<uint16>(settings.portSpeedMode));
     controller.DACCableLength.set(settings.dacCableLength);
 }
@@ -71,9 +71,7 @@ void Adapter_Map_Builder::findOrMakePortController(NIC_Port& port) {
     auto& controllers = _agent.m_VLNMPCA_PortController_map;
     const auto count = static_cast<std::size_t>(controllers.size());
     VLN_LOG(VLN_DBG, "inside Port controller %zu", count);
-    port.port_controller = find_last(controllers, [&](const VLNMPCA_PortController& candidate) {
-        return candidate.DeviceID.value == port.serial_and_number;
-    });
+    port.port_controller = find_port_controller(_agent, port.serial_and_number);
     if (port.port_controller)
         return;
     VLN_LOG(VLN_DBG, "create Port controller instance %zu", count);

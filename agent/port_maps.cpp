@@ -3,6 +3,7 @@
 #include "agent/adapter_map_builder.h"
 #include "agent/associations.h"
 #include "agent/beacon.h"
+#include "agent/ethernet_port.h"
 #include "agent/mac_text.h"
 #include "agent/pci_maps.h"
 #include "agent/port_name.h"
@@ -16,8 +17,7 @@ namespace cimple {
 
 namespace {
 
-constexpr uint16 REQUESTED_STATE_NOT_APPLICABLE = 12; // CIM_EnabledLogicalElement.RequestedState
-constexpr uint16 REQUESTED_STATE_ENABLED = 2;
+constexpr uint16 REQUESTED_STATE_ENABLED = 2;  // CIM_EnabledLogicalElement.RequestedState
 constexpr uint16 LINK_TECHNOLOGY_ETHERNET = 2; // CIM_NetworkPort.LinkTechnology
 constexpr uint16 LINK_TECHNOLOGY_UNKNOWN = 0;
 constexpr uint16 IF_TYPE_ETHERNET_CSMACD = 6; // IANAifType
@@ -38,17 +38,6 @@ void append_capabilities(Property<Array<uint16>>& capabilities, const std::strin
     for (const Capability_Word& row : CAPABILITY_WORDS)
         if (words.find(row.word) != std::string::npos)
             capabilities.append(row.value);
-}
-
-// Who the port is besides its key. Later look-ups match the texts by their position.
-void append_identities(VLNMPCA_EthernetPort& port, const NICAdapterAttributes& adapter,
-                       const String& serial_and_number) {
-    port.OtherIdentifyingInfo.append(asic_name(adapter));
-    port.IdentifyingDescriptions.append(String("SerialNumber + Sub-AdapterID"));
-    port.OtherIdentifyingInfo.append(serial_and_number);
-    port.IdentifyingDescriptions.append(String("SerialNumber:PhysicalPortNumber"));
-    port.OtherIdentifyingInfo.append(text(adapter.SerialNumber));
-    port.IdentifyingDescriptions.append(String("SerialNumber"));
 }
 
 Ref<VLNMPCA_LANEndpoint> lan_endpoint_instance(const NICAdapterAttributes& adapter,
@@ -89,8 +78,7 @@ uint32 Adapter_Map_Builder::createNICPort(NIC_Function& function, Port& nic_port
             static_cast<int>(nic_port.getPortIndex()));
     const auto& attributes = static_cast<const NICPortAttributes&>(*nic_port.getPortAttributes());
     NIC_Port port{function, &attributes, nic_port.getPortIndex(), text(nic_port.getPortName()),
-                  format_text("%s:%d", function.attributes->SerialNumber.c_str(),
-                              static_cast<int>(function.attributes->PortNumber))};
+                  physical_port_name(*function.attributes)};
     tieNewCard(function);
     findOrMakeChip(function);
     findOrMakeConnector(port);
@@ -129,47 +117,25 @@ uint32 Adapter_Map_Builder::createPCIDevice(const NIC_Port& port) {
                                   _agent.m_VLNMPCA_ConcreteIdentity_map, port.ethernet_port});
 }
 
-// Null for a port whose address is no MAC address.
+// Null for a port with an address that is no MAC address.
 Ref<VLNMPCA_EthernetPort> Adapter_Map_Builder::CreateEthernetPort(const NIC_Port& nic_port) const {
     const NICAdapterAttributes& adapter = *nic_port.function.attributes;
     const NICPortAttributes& attributes = *nic_port.attributes;
     const String& port_name = nic_port.name;
-    String permanent_address;
+    auto port = ethernet_port_instance(adapter, attributes, port_name, *_system);
     String current_address;
-    if (!removeSeptr(attributes.PermanentMACAddress, permanent_address) ||
-        !removeSeptr(attributes.CurrentMACAddress, current_address))
+    if (!port || !removeSeptr(attributes.CurrentMACAddress, current_address))
         return {};
-
-    auto port = make_instance<VLNMPCA_EthernetPort>();
     port->PortNumber.set(static_cast<uint16>(adapter.PortNumber));
     port->InstanceID.set(format_text("%s:%s", adapter.Model.c_str(), port_name.c_str()));
-    port->Description.set(text(adapter.ModelDescription));
-    port->SystemCreationClassName.set(_system->CreationClassName.value);
-    port->SystemName.set(_system->Name.value);
     port->ElementName.set(text(attributes.IfName));
     port->Name.set(text(attributes.IfName));
-    port->CreationClassName.set("VLNMPCA_EthernetPort");
-    port->DeviceID.set(port_name);
-    append_port_state(port.get(), find_port_state(portStateMap, attributes.FunctionalPortState));
-    port->PermanentAddress.set(permanent_address);
     port->NetworkAddresses.append(current_address.substr(0, MAC_DIGITS));
     port->LinkTechnology.set(attributes.LinkTechnology == "Ethernet" ? LINK_TECHNOLOGY_ETHERNET
                                                                      : LINK_TECHNOLOGY_UNKNOWN);
     append_capabilities(port->Capabilities, attributes.Capabilities);
     append_capabilities(port->EnabledCapabilities, attributes.EnabledCapabilities);
-    port->RequestedState.set(REQUESTED_STATE_NOT_APPLICABLE);
-    port->EnabledState.set(enabled_state(attributes.FunctionalPortState));
-    port->Speed.set(speed_of_code(attributes.PortSpeed));
-    port->MaxSpeed.set(max_speed_of_mask(attributes.PortSupportedSpeed));
-    port->FunctionalPortSpeed.set(text(attributes.FuncPortSpeed));
     port->PortType.set(0);
-    port->SupportedMaximumTransmissionUnit.set(attributes.MaximumMTU);
-    port->ActiveMaximumTransmissionUnit.set(attributes.CurrentMTU);
-    port->Generation.set(adapter.PCIFunctionNumber);
-    append_identities(*port, adapter, nic_port.serial_and_number);
-    port->FunctionalQosBandwidth.set(text(attributes.FuncQosBandwidth));
-    port->FunctionalQosMinBandwidth.set(text(attributes.FuncQosMinBandwidth));
-    port->PCIBusNumber.set(adapter.PCIBusNumber);
     read_beacon(*port);
     return port;
 }

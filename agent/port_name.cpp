@@ -21,10 +21,13 @@ bool port_name_to_wwn(const String& port_name, HBA_WWN& wwn) {
 }
 
 String asic_name(const AdapterAttributes& adapter) {
-    String name = text(adapter.SerialNumber);
-    if (!adapter.Subadapter_number.empty())
-        name.append((":" + adapter.Subadapter_number).c_str());
-    return name;
+    if (adapter.Subadapter_number.empty())
+        return text(adapter.SerialNumber);
+    return text(adapter.SerialNumber + ":" + adapter.Subadapter_number);
+}
+
+String physical_port_name(const AdapterAttributes& adapter) {
+    return format_text("%s:%d", adapter.SerialNumber.c_str(), static_cast<int>(adapter.PortNumber));
 }
 
 } // namespace cimple

@@ -1,4 +1,4 @@
-// Names by which ports and ASICs are known.
+// Names by which ports, their connectors and ASICs are known.
 #ifndef VLN_AGENT_PORT_NAME_H
 #define VLN_AGENT_PORT_NAME_H
 
@@ -14,6 +14,9 @@ bool port_name_to_wwn(const String& port_name, HBA_WWN& wwn);
 // The ASIC of a function: the card's serial number, and the number of the sub-adapter behind a
 // colon if it has one.
 String asic_name(const AdapterAttributes& adapter);
+
+// The physical port of a function, which functions of all kinds on it share: "serial:port number".
+String physical_port_name(const AdapterAttributes& adapter);
 
 } // namespace cimple
 

@@ -2,6 +2,7 @@
 
 #include "agent/dynamic_reading.h"
 #include "agent/dynamic_status.h"
+#include "agent/port_identity.h"
 #include "agent/provider_agent.h"
 #include "agent/state_tables.h"
 #include "agent/store_search.h"
@@ -15,17 +16,12 @@ namespace cimple {
 
 namespace {
 
-// The Ethernet port that bears the identity, a text of OtherIdentifyingInfo in the place where
-// IdentifyingDescriptions has the description.
+// The first Ethernet port that bears the identity.
 const VLNMPCA_EthernetPort* find_port(const ProviderAgent& agent, const char* description,
                                       const String& identity) {
     return find_first(agent.m_VLNMPCA_EthernetPort_map, [&](const VLNMPCA_EthernetPort& port) {
-        const Array<String>& descriptions = port.IdentifyingDescriptions.value;
-        const Array<String>& identities = port.OtherIdentifyingInfo.value;
-        for (uint32 i = 0; i < descriptions.size() && i < identities.size(); ++i)
-            if (descriptions[i] == description && identities[i] == identity)
-                return true;
-        return false;
+        const String* found = port_identity(port, description);
+        return found && *found == identity;
     });
 }
 
@@ -115,8 +111,7 @@ void show_port_status(ProviderAgent& agent) {
 
 void update_phy_link_down_reason(const ProviderAgent& agent, VLNMPCA_PortController& controller,
                                  Attribute_Buffer& buffer) {
-    const auto* port =
-        find_port(agent, "SerialNumber:PhysicalPortNumber", controller.DeviceID.value);
+    const auto* port = find_port(agent, IDENTITY_PHYSICAL_PORT, controller.DeviceID.value);
     AX_WWN wwn{};
     uint32 reason = 0;
     if (port && wwn_of_name(port->DeviceID.value.c_str(), wwn) &&
@@ -129,7 +124,7 @@ void update_phy_link_down_reason(const ProviderAgent& agent, VLNMPCA_PortControl
 // The serial number by which functions know their card: what the card's own data say of it may be
 // another one. Throws std::exception if the library refuses.
 void update_board_temperature(const ProviderAgent& agent, VLNMPCA_Card& card) {
-    const auto* port = find_port(agent, "SerialNumber", card.VLNSerialNumber.value);
+    const auto* port = find_port(agent, IDENTITY_SERIAL, card.VLNSerialNumber.value);
     AX_WWN wwn{};
     if (!port || !wwn_of_name(port->DeviceID.value.c_str(), wwn))
         return;

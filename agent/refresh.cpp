@@ -181,11 +181,6 @@ void ProviderAgent::rebuildSANMaps() {
     m_SANMapsReadyCond.broadcast();
 }
 
-uint32 ProviderAgent::updateSANMaps() {
-    clearSANMaps();
-    return 0;
-}
-
 // The time-out counts from here: from the end of a refresh, not from its start.
 void ProviderAgent::finishRefresh() {
     Auto_Mutex lock(m_DataFetchMutex);

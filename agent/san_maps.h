@@ -1,7 +1,7 @@
 // The SAN pass: turns what the ports see into targets, logical units and the paths to them.
 //
 // One builder lives for one pass, on the refresh thread, with the gates of adapter data, adapter
-// maps and SAN maps and m_DataMutex held. A failed port or unit is logged and passed over.
+// maps and SAN maps and m_DataMutex held.
 #ifndef VLN_AGENT_SAN_MAPS_H
 #define VLN_AGENT_SAN_MAPS_H
 
@@ -13,10 +13,14 @@ class SAN_Map_Builder {
 public:
     explicit SAN_Map_Builder(ProviderAgent& agent) : _agent(agent) {}
 
-    // 0, or 32769 after an exception outside the FC part.
+    // 0, or 32769 after an exception outside the FC part. What was made before it stays.
     uint32 run();
 
 private:
+    void clearMaps();
+    void createISCSIClasses();
+    void createFCClasses();
+
     ProviderAgent& _agent;
 };
 

@@ -2,7 +2,9 @@
 #ifndef VLN_AGENT_SOFTWARE_IDENTITY_H
 #define VLN_AGENT_SOFTWARE_IDENTITY_H
 
+#include "cimple/instance_map.h"
 #include "classes/VLNMPCA_SoftwareIdentity.h"
+#include "device/adapter_attributes.h"
 
 #include <array>
 #include <initializer_list>
@@ -35,6 +37,11 @@ struct Driver {
 };
 
 Ref<VLNMPCA_SoftwareIdentity> driver_identity_instance(const Driver& driver);
+
+// The firmware of the adapter's ASIC, or null: the functions of an ASIC share it
+// (firmware_maps.cpp).
+VLNMPCA_SoftwareIdentity* find_firmware(const Instance_Map<VLNMPCA_SoftwareIdentity>& store,
+                                        const AdapterAttributes& adapter);
 
 // Sets the statuses of the software on the element. The association may be null.
 void set_software_status(Instance* association, std::initializer_list<uint16> statuses);

@@ -41,7 +41,8 @@ struct Enabled_State {
 };
 
 inline constexpr uint16 OTHER_ENABLED_STATE = 1;
-inline constexpr uint32 PHYSICAL_STATE_UP = 2; // any other is a port without a speed
+inline constexpr uint16 REQUESTED_STATE_NOT_APPLICABLE = 12; // nobody asks for another state
+inline constexpr uint32 PHYSICAL_STATE_UP = 2;               // any other is a port without a speed
 
 inline constexpr Enabled_State enabledStateMap[] = {
     {2, 2}, {5, 7}, {1, 0}, {3, 3}, {6, 3}, {21, 3}, {22, 3},

@@ -1,18 +1,17 @@
-// Texts of map builders.
+// Texts of map builders. What goes into one may come from a device, as any bytes; what comes out is
+// valid UTF-8, since object managers refuse or mangle anything else.
 #ifndef VLN_AGENT_TEXT_H
 #define VLN_AGENT_TEXT_H
 
 #include "cimple/string.h"
 
-#include <string>
+#include <string_view>
 
 namespace cimple {
 
-inline String text(const std::string& characters) {
-    return String(characters.data(), characters.size());
-}
+String text(std::string_view bytes);
 
-// As printf, of any length.
+// As printf, of any length. A precision counts bytes.
 __attribute__((format(printf, 1, 2))) String format_text(const char* format, ...);
 
 } // namespace cimple

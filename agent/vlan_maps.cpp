@@ -12,7 +12,6 @@ namespace cimple {
 namespace {
 
 constexpr uint16 PROTOCOL_TYPE_OTHER = 1; // CIM_ProtocolEndpoint.ProtocolType
-constexpr uint16 REQUESTED_STATE_NOT_APPLICABLE = 12;
 
 Ref<VLNMPCA_VLANEndpoint> vlan_endpoint_instance(const NICAdapterAttributes& adapter,
                                                  const NICPortAttributes& attributes,

@@ -21,7 +21,7 @@ constexpr uint16 FIRMWARE = 10; // CIM_SoftwareIdentity.Classifications
 
 template <std::size_t N>
 String field(const char (&characters)[N]) {
-    return String(characters, strnlen(characters, N));
+    return text({characters, strnlen(characters, N)});
 }
 
 void set_unless_empty(Property<String>& property, const String& value) {

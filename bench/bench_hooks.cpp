@@ -62,20 +62,31 @@ bool refresh_running(ProviderAgent& agent) {
     return agent.m_bDataFetchRunning;
 }
 
+void wait_for_refresh(ProviderAgent& agent) {
+    while (refresh_running(agent))
+        sched_yield();
+}
+
 } // namespace
 
 bool vln_bench_refresh() {
     constexpr uint64 HOUR = 3600ull * 1000000; // more than the data may be old
     ProviderAgent* agent = ProviderAgent::current();
-    while (refresh_running(*agent))
-        sched_yield();
+    wait_for_refresh(*agent);
     agent->m_bRefreshSANData = false;
     const Datetime last = agent->m_LoadedTime;
     vlnsim_advance(HOUR);
     agent->BuildCimpleInfo();
-    while (refresh_running(*agent))
-        sched_yield();
+    wait_for_refresh(*agent);
     return !(agent->m_LoadedTime == last);
+}
+
+void vln_bench_san_refresh() {
+    ProviderAgent* agent = ProviderAgent::current();
+    wait_for_refresh(*agent);
+    agent->m_bSANRefreshRequested = true;
+    agent->BuildCimpleInfo();
+    wait_for_refresh(*agent);
 }
 
 unsigned vln_bench_instances() {

@@ -22,6 +22,9 @@ VLN_BENCH_HOOK void vln_bench_direct_calls();
 // an hour of the virtual clock after the last. False when none was made.
 VLN_BENCH_HOOK bool vln_bench_refresh();
 
+// One SAN pass, without a scan of the adapters.
+VLN_BENCH_HOOK void vln_bench_san_refresh();
+
 // Instances in all stores.
 VLN_BENCH_HOOK unsigned vln_bench_instances();
 

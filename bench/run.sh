@@ -72,6 +72,28 @@ printf 'An enumeration of VLNMPCA_EthernetPort while refreshes run: median %d us
     "$median" "$most" "$longest"
 printf 'memory: %d bytes per instance, the model of the devices included\n' "$("$host" memory 1)"
 
+san="$build/bin/bench_san"
+pass="--toggle-collect=cimple::ProviderAgent::runSANPass()
+      --toggle-collect=${library}::HBA_*"
+passes=2
+echo
+echo "A SAN pass over san-4096-luns and over parts of it, the library not counted"
+printf '%9s %14s %10s %30s\n' units instructions 'per unit' 'to half the units, at most 2.3'
+former=
+for units in 512 1024 2048 4096; do
+    own=$(($(count "$pass" "$san" pass $units) / passes))
+    printf '%9d %14d %10d %30s\n' $units $own $((own / units)) \
+        "$([ -z "$former" ] || awk "BEGIN { printf \"%.2f\", $own / $former }")"
+    former=$own
+done
+few=$(($(count --toggle-collect=vln_measured "$san" volumes 40) / 40))
+many=$(($(count --toggle-collect=vln_measured "$san" volumes 4000) / 4000))
+printf 'Enumerating VLNMPCA_StorageVolume: %d instructions per instance of 40, %d of 4000, ratio %s (at most 1.15)\n' \
+    $few $many "$(awk "BEGIN { printf \"%.3f\", $many / $few }")"
+read -r before after made <<<"$("$san" resident 4096)"
+printf 'resident memory with 4,096 units, every class enumerated once: %d KiB for %d instances, at most 65536; %d KiB of it since the module was loaded\n' \
+    "$after" "$made" $((after - before))
+
 module="$build/lib/libvorlan_mpca_provider.so"
 strip -o "$work/stripped.so" "$module"
 echo

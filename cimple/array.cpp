@@ -123,7 +123,10 @@ const Array_Traits* array_traits(uint32 type) {
 
 Array_Base::Array_Base(const Array_Traits* traits) noexcept : _rep(empty_rep(traits)) {}
 
+// Copies are kept by the thousand and hardly ever grow: they get no room to spare.
 Array_Base::Array_Base(const Array_Base& other) : Array_Base(other.traits()) {
+    if (other.size() != 0)
+        _rep = allocate(other.traits(), other.size());
     append(other.data(), other.size());
 }
 

@@ -31,7 +31,7 @@ constexpr Active_Row ACTIVE_ROWS[] = {
     {PATTERN_VLNMPCA_Card, UpdateBoardTemp, update_mutex<PATTERN_VLNMPCA_Card>},
     {PATTERN_VLNMPCA_FCPortStatistics, GetFCoEPortStats,
      update_mutex<PATTERN_VLNMPCA_FCPortStatistics>},
-    {PATTERN_VLNMPCA_DriverParameterSettingData, nullptr,
+    {PATTERN_VLNMPCA_DriverParameterSettingData, UpdateDriverParameters,
      update_mutex<PATTERN_VLNMPCA_DriverParameterSettingData>},
     {PATTERN_VLNMPCA_FCPort, UpdateFCoEPortStatus, update_mutex<PATTERN_VLNMPCA_FCPort>},
 };

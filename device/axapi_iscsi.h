@@ -127,7 +127,7 @@ typedef struct AX_iSCSI_Session {
     uint32_t isidQualifier;
     uint16_t tsih;
     uint16_t closed; /* non-zero: a session that has ended */
-    uint32_t sessionId;
+    uint32_t sessionId; /* of the port; none is given twice while the library lists it */
     uint8_t reserved[12];
 } AX_iSCSI_Session;
 AX_CHECK_SIZE(AX_iSCSI_Session, 32);
@@ -139,17 +139,21 @@ typedef struct AX_iSCSI_SessionList {
 } AX_iSCSI_SessionList;
 AX_CHECK_SIZE(AX_iSCSI_SessionList, 40);
 
+enum { AX_ISCSI_SESSION_NORMAL, AX_ISCSI_SESSION_DISCOVERY }; /* SessionType of RFC 7143 */
+enum { AX_ISCSI_CONNECTION_CONNECTED, AX_ISCSI_CONNECTION_CLOSED };
+
+/* The caller hands it over zeroed. An address of zeros is none. */
 typedef struct AX_iSCSI_SessionInfo {
     AX_UINT64 isid;
     uint32_t isidQualifier;
-    uint16_t tsih;
+    uint16_t tsih; /* 0 until the target has given one */
     uint16_t closed;
     uint32_t state;           /* AX_ISCSI_SESSION_ */
-    uint32_t connectionState; /* 0 connected, 1 closed */
+    uint32_t connectionState; /* AX_ISCSI_CONNECTION_ */
     uint32_t connectionId;
     uint32_t targetPortalGroup;
     uint32_t bootSession;
-    uint32_t authenticationMethod;
+    uint32_t authenticationMethod; /* AX_ISCSI_AUTH_ */
     uint32_t tcpMSS;
     uint32_t durationSeconds;
     AX_IPAddress initiatorAddress;
@@ -163,7 +167,10 @@ typedef struct AX_iSCSI_SessionInfo {
     AX_UINT64 responsePDUs;
     uint32_t digestErrors;
     uint32_t connectionTimeoutErrors;
-    uint8_t reserved[236];
+    uint32_t sessionType; /* AX_ISCSI_SESSION_NORMAL or AX_ISCSI_SESSION_DISCOVERY */
+    uint32_t connectionCount;
+    uint32_t maxSendDataSegmentLength; /* what the target declared; ours is among the negotiated */
+    uint8_t reserved[224];
 } AX_iSCSI_SessionInfo;
 AX_CHECK_SIZE(AX_iSCSI_SessionInfo, 668);
 

@@ -85,6 +85,7 @@ void iSCSIPortAttributes::readNetworkProperties(AX_WWN wwn) {
     LinkUp = properties.linkUp;
     VLANEnabled = properties.vlanEnabled;
     VLANPriority = properties.priority;
+    VLANID = properties.vlanID;
 }
 
 } // namespace cimple

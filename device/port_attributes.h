@@ -113,6 +113,7 @@ public:
     uint8 LinkUp = 0;
     uint8 VLANEnabled = 0;
     uint8 VLANPriority = 0;
+    uint16 VLANID = 0;
 
 private:
     void readInitiatorProperties(AX_WWN wwn);

@@ -14,6 +14,8 @@ const char* to_string(FaultKind kind) {
         return "type mismatch";
     case FaultKind::bad_path:
         return "bad object path";
+    case FaultKind::bad_text:
+        return "text that is no UTF-8";
     case FaultKind::bad_argument:
         return "bad argument";
     case FaultKind::wrong_result:

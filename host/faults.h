@@ -17,6 +17,7 @@ enum class FaultKind {
     unknown_property, // a property or key that the class does not have
     type_mismatch,    // a value of another type than declared, or a reference to another class
     bad_path,         // an object path with a missing or unknown key where a complete one is needed
+    bad_text,         // bytes that are no UTF-8
     bad_argument,     // a null, a size or a code that no caller may give
     wrong_result,     // a result of the wrong kind or class, or after returnDone
     bad_output,       // an output that the method does not have, or of another type

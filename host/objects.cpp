@@ -1,6 +1,7 @@
 #include "host/objects.h"
 
 #include "host/core.h"
+#include "host/text.h"
 
 #include <cstring>
 
@@ -262,6 +263,13 @@ std::optional<Value> read_object(const CMPIValue& value, CMPIType type, const ch
     }
 }
 
+// A text goes on to clients that take nothing but UTF-8.
+std::optional<Value> checked_text(Core& core, std::optional<Value> value, const char* use) {
+    if (value && value->type == CMPI_string && !value->is_null() && !is_utf8(value->as_text()))
+        report(&core, FaultKind::bad_text, use);
+    return value;
+}
+
 bool is_chars(CMPIType type) {
     return type == CMPI_chars || type == CMPI_charsptr;
 }
@@ -285,14 +293,14 @@ std::optional<Value> from_cmpi(Core& core, const CMPIValue* value, CMPIType type
     case CMPI_real64:
         return Value::real(type, value->real64);
     case CMPI_chars:
-        return read_text(reinterpret_cast<const char*>(value));
+        return checked_text(core, read_text(reinterpret_cast<const char*>(value)), use);
     case CMPI_charsptr:
-        return read_text(value->chars);
+        return checked_text(core, read_text(value->chars), use);
     case CMPI_string:
     case CMPI_dateTime:
     case CMPI_ref:
     case CMPI_instance:
-        return read_object(*value, type, use);
+        return checked_text(core, read_object(*value, type, use), use);
     default:
         break;
     }

@@ -107,6 +107,26 @@ void append_utf8(std::string& text, std::uint32_t c) {
     }
 }
 
+bool is_utf8(std::string_view text) {
+    for (std::size_t at = 0; at < text.size();) {
+        const auto lead = static_cast<unsigned char>(text[at++]);
+        if (lead < 0x80)
+            continue;
+        const int tail = lead >= 0xf0 ? 3 : lead >= 0xe0 ? 2 : 1;
+        std::uint32_t code = lead & (0x3fu >> tail);
+        for (int i = 0; i < tail; ++i, ++at) {
+            if (at == text.size() || (static_cast<unsigned char>(text[at]) & 0xc0) != 0x80)
+                return false;
+            code = code << 6 | (static_cast<unsigned char>(text[at]) & 0x3fu);
+        }
+        constexpr std::uint32_t smallest[] = {0, 0x80, 0x800, 0x10000};
+        const bool surrogate = code >= 0xd800 && code < 0xe000;
+        if (lead < 0xc0 || lead > 0xf7 || code < smallest[tail] || code > 0x10ffff || surrogate)
+            return false;
+    }
+    return true;
+}
+
 std::size_t utf8_length(std::string_view text) {
     std::size_t length = 0;
     for (char c : text)

@@ -35,6 +35,8 @@ std::vector<std::string> nearest_names(std::string_view name, const std::vector<
 std::string did_you_mean(std::string_view name, const std::vector<std::string>& known);
 
 void append_utf8(std::string& text, std::uint32_t code_point);
+// RFC 3629.
+bool is_utf8(std::string_view text);
 // Characters, counting each byte that belongs to none as one.
 std::size_t utf8_length(std::string_view text);
 

@@ -16,6 +16,7 @@
 #include "device/axapi.h"
 
 #include <string>
+#include <vector>
 
 namespace cimple {
 
@@ -76,11 +77,28 @@ public:
     // list: AX_FEATURE_LIST_SIZE bytes, one per feature.
     static AX_STATUS GetHBAFeatureList(const HBA_WWN* name, uint8* list);
 
+    // ---- iSCSI discovery (iscsi_discovery.cpp) ----
+    //
+    // The library's lists of what an iSCSI port sees. On success the caller frees the list with
+    // free(); its count is never beyond its entries.
+
+    static AX_STATUS ListiSCSITargets(const HBA_WWN* name, AX_iSCSI_TargetList** targets);
+    static AX_STATUS ListiSCSISessions(const HBA_WWN* name, const char* target,
+                                       AX_iSCSI_SessionList** sessions);
+    static AX_STATUS GetiSCSILuns(const HBA_WWN* name, const char* target, AX_iSCSI_LunList** luns);
+
     // ---- Port speed (port_speed.cpp) ----
 
     // How the speed of the physical port is set. What the adapter does not tell is 0 or empty.
     static AX_STATUS GetPhyPortSpeedAttributesValues(const HBA_WWN* name,
                                                      AX_PhyPortSpeed* settings);
+
+    // ---- Driver parameters (driver_parameters.cpp) ----
+
+    // What the driver is set to: for the port with that device identifier or, global, for all of
+    // its ports. 1 for a bad identifier, 8 when out of memory.
+    static AX_STATUS FCoEGetDriverParam(const char* port, bool global,
+                                        std::vector<AX_DriverParam>* parameters);
 
     // Logs a status of the library with its text for it, if it has one, at level 5.
     static void logStatus(AX_STATUS status);

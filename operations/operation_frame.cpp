@@ -72,7 +72,8 @@ bool Reply::allocate(const Reply_Shape& shape, uint64 count, const No_Memory& no
     const std::size_t size = shape.head + static_cast<std::size_t>(count) * shape.entry;
     m_data.reset(std::calloc(size ? size : 1, 1));
     if (!m_data) {
-        logAt(place, VLN_ERR, noMemory.line);
+        if (noMemory.line)
+            logAt(place, VLN_ERR, noMemory.line);
         m_failure = noMemory.status;
         return false;
     }

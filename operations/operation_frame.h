@@ -97,7 +97,7 @@ struct Reply_Shape {
 
 // What an operation says and answers when there is no memory for the reply, at level 3.
 struct No_Memory {
-    const char* line; // "Unable to allocate ..."
+    const char* line; // "Unable to allocate ..."; null for an operation that has its own words
     AX_STATUS status = AX_STATUS_ERROR;
 };
 

@@ -61,12 +61,13 @@ Ref<PG_RegisteredProfile> base_server_profile() {
 }
 
 // Shares the platform's profile instead of cloning it, since a clone would not count its class.
-Ref<Instance> reference_to(const Ref<PG_RegisteredProfile>& base_server,
-                           const Ref<VLNMPCA_RegisteredProfile>& profile) {
+Ref<VLNMPCA_BaseServerReferencedProfile>
+reference_to(const Ref<PG_RegisteredProfile>& base_server,
+             const Ref<VLNMPCA_RegisteredProfile>& profile) {
     auto association = make_instance<VLNMPCA_BaseServerReferencedProfile>();
     association->Antecedent = Ref<PG_RegisteredProfile>(base_server).release();
     association->Dependent = Ref<VLNMPCA_RegisteredProfile>(profile).release();
-    return association.release();
+    return association;
 }
 
 void enumerate(ProviderAgent& agent, const Enum_Instances_Handler& handler) {
@@ -79,7 +80,35 @@ void enumerate(ProviderAgent& agent, const Enum_Instances_Handler& handler) {
             return;
 }
 
+// The antecedent's class is unknown to the engine, which drops it from the path of a get. The
+// platform has one such profile: ours tells which reference is meant.
+Ref<VLNMPCA_BaseServerReferencedProfile> find(ProviderAgent& agent,
+                                              const VLNMPCA_BaseServerReferencedProfile& model) {
+    if (!model.Dependent)
+        return {};
+    for (const auto& profile : registered_profiles(agent)) {
+        if (!key_eq(profile.get(), model.Dependent))
+            continue;
+        const auto base_server = base_server_profile();
+        if (base_server && (!model.Antecedent || key_eq(base_server.get(), model.Antecedent)))
+            return reference_to(base_server, profile);
+    }
+    return {};
+}
+
 } // namespace
+
+sint32 Base_Server_Profile_Provider::get_instance(const VLNMPCA_BaseServerReferencedProfile* model,
+                                                  VLNMPCA_BaseServerReferencedProfile*& instance) {
+    ProviderAgent* agent = ProviderAgent::current();
+    try {
+        if (agent)
+            instance = find(*agent, *model).release();
+    } catch (...) {
+        VLN_LOG(VLN_CRIT, "Exception in CIM Provider Enumeration - do nothing");
+    }
+    return instance ? GET_INSTANCE_OK : GET_INSTANCE_NOT_FOUND;
+}
 
 sint32 Base_Server_Profile_Provider::enum_instances(const VLNMPCA_BaseServerReferencedProfile*,
                                                     const Enum_Instances_Handler& handler) {

@@ -10,6 +10,8 @@ namespace cimple {
 struct Base_Server_Profile_Provider : Pattern_Provider<VLNMPCA_BaseServerReferencedProfile> {
     // Asks the object manager for the platform's profile at each call. Delivers nothing, and
     // answers 0, when the platform has none.
+    sint32 get_instance(const VLNMPCA_BaseServerReferencedProfile* model,
+                        VLNMPCA_BaseServerReferencedProfile*& instance);
     sint32 enum_instances(const VLNMPCA_BaseServerReferencedProfile* model,
                           const Enum_Instances_Handler& handler);
 };

@@ -71,9 +71,14 @@ void set_value(Function& function, const std::string& table, const char* name, c
             function.features.erase(id);
         else
             function.features[id] = read_feature(value);
+    } else if (table == "driverParameters") {
+        set_driver_parameter(function.driver_parameters, name, value);
+    } else if (table == "globalDriverParameters") {
+        set_driver_parameter(function.global_driver_parameters, name, value);
     } else {
         value.fail("unknown table \"" + table +
-                   "\"; known are: adapterAttributes, portAttributes, statistics, features");
+                   "\"; known are: adapterAttributes, portAttributes, statistics, features, "
+                   "driverParameters, globalDriverParameters");
     }
 }
 

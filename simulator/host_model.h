@@ -45,6 +45,7 @@ struct Unit {
     std::optional<Bytes> capacity;      // READ CAPACITY(10), SBC
     std::uint32_t check_conditions = 0; // so many answers to each command come first
     bool silent = false;                // every command fails
+    std::uint32_t from_call = 1;        // of the target mapping: before it the unit is not listed
     std::array<std::uint32_t, 4> checks_given{};
 };
 
@@ -56,6 +57,26 @@ struct Target {
     std::uint32_t number = 0;
     std::vector<Unit> units;
 };
+
+// What an iSCSI function sees. Bytes of a record that the library leaves as they are are not zero.
+struct iSCSI_Unit {
+    AX_iSCSI_Lun entry{};
+    AX_iSCSI_LunProperties properties{};
+    bool silent = false; // its properties can't be had
+};
+
+struct iSCSI_Session {
+    AX_iSCSI_Session entry{};
+    AX_iSCSI_SessionInfo info{};
+};
+
+struct iSCSI_Target {
+    AX_iSCSI_Target entry{};
+    std::vector<iSCSI_Unit> units;
+    std::vector<iSCSI_Session> sessions;
+};
+
+using Driver_Parameters = std::vector<AX_DriverParam>;
 
 // A feature's answer: a value, or a status alone.
 struct Feature {
@@ -89,11 +110,16 @@ struct Function {
     std::optional<AX_PCIRegisters> pci;
     std::optional<AX_SffData> sff;
     std::optional<std::uint32_t> beacon;
+    std::optional<Driver_Parameters> driver_parameters;
+    std::optional<Driver_Parameters> global_driver_parameters;
 
     std::optional<std::string> hba_name; // the adapter's name in the HBA API, which then knows it
     std::uint32_t hba_ports = 1;
     std::uint32_t stale = 0; // refreshes that the target mapping waits for
+    std::uint32_t mapping_calls = 0;
+    bool mapping_by_unit = false; // all targets' first units first, or target by target
     std::vector<Target> targets;
+    std::vector<iSCSI_Target> iscsi_targets;
 };
 
 // What a library file of the host exports beside or without what it would by itself.
@@ -117,6 +143,7 @@ struct Host {
     std::string axapi_version = "10.2.261.13";
     std::string nima_version = "10.2.261.13";
     AX_ServerAttributes server{};
+    std::string address = "192.0.2.10"; // of the host's name; empty: cannot be resolved
     std::vector<Function> functions;
     std::vector<Fault> faults;
 };

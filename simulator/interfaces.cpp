@@ -1,4 +1,4 @@
-// The network interfaces of the simulated host, as its kernel would tell them.
+// The name and the network interfaces of the simulated host, as its kernel would tell them.
 #include "simulator/call.h"
 #include "simulator/identifiers.h"
 #include "simulator/simulator.h"
@@ -34,6 +34,28 @@ void describe(const Function& function, vlnsim_interface& interface) {
 }
 
 } // namespace
+
+int vlnsim_host_name(char* name, size_t size) {
+    Simulator& simulator = Simulator::instance();
+    std::lock_guard lock(simulator.mutex);
+    simulator.choose_scenario();
+    const std::string own = simulator.host.server.hostName;
+    if (!name || own.empty() || own.size() >= size)
+        return -1;
+    copy_text(own, name, size);
+    return 0;
+}
+
+int vlnsim_resolve_host(const char* name, char* address, size_t size) {
+    Simulator& simulator = Simulator::instance();
+    std::lock_guard lock(simulator.mutex);
+    simulator.choose_scenario();
+    const Host& host = simulator.host;
+    if (!name || !address || host.server.hostName != std::string(name) || host.address.empty())
+        return 1;
+    copy_text(host.address, address, size);
+    return 0;
+}
 
 int vlnsim_find_interface(const char* name, struct vlnsim_interface* found) {
     if (!name || !*name || !found)

@@ -115,21 +115,29 @@ void fill_entry(const Target& target, const Unit& unit, HBA_FCPSCSIENTRY& entry)
     entry.FcpId.FcpLun = static_cast<HBA_UINT64>(unit.fcp_lun);
 }
 
+// What the mapping lists at the call with that number, in its order.
+std::vector<HBA_FCPSCSIENTRY> mapping_entries(const Function& function, std::uint32_t call_number) {
+    std::vector<HBA_FCPSCSIENTRY> entries;
+    for (const Target& target : function.targets)
+        for (const Unit& unit : target.units)
+            if (unit.from_call <= call_number)
+                fill_entry(target, unit, entries.emplace_back());
+    if (function.mapping_by_unit)
+        std::stable_sort(entries.begin(), entries.end(), [](const auto& a, const auto& b) {
+            return a.ScsiId.ScsiOSLun < b.ScsiId.ScsiOSLun;
+        });
+    return entries;
+}
+
 HBA_STATUS answer_mapping(Call& call, Function& function, HBA_FCPTARGETMAPPING& mapping) {
     if (function.stale)
         return HBA_STATUS_ERROR_STALE_DATA;
     const std::uint32_t room = mapping.NumberOfEntries;
-    std::size_t total = 0;
-    for (const Target& target : function.targets)
-        total += target.units.size();
-    auto needed = static_cast<std::uint32_t>(total);
+    const auto entries = mapping_entries(function, ++function.mapping_calls);
+    auto needed = static_cast<std::uint32_t>(entries.size());
     const bool too_small = call.too_small(room, needed);
     call.out("room", room);
-    std::uint32_t written = 0;
-    for (const Target& target : function.targets)
-        for (const Unit& unit : target.units)
-            if (written < room)
-                fill_entry(target, unit, mapping.entry[written++]);
+    std::copy_n(entries.begin(), std::min<std::size_t>(room, entries.size()), mapping.entry);
     mapping.NumberOfEntries = needed;
     call.out("entries", needed);
     return too_small ? HBA_STATUS_ERROR_MORE_DATA : HBA_STATUS_OK;

@@ -4,6 +4,8 @@
 #include "simulator/entry_points.h"
 #include "simulator/vlnsim.h"
 
+#include <arpa/inet.h>
+
 #include <algorithm>
 #include <array>
 #include <cstdio>
@@ -206,7 +208,7 @@ void read_libraries(const Node& values, Host& host) {
 }
 
 void read_server(const Node& values, Host& host) {
-    values.expect_object({"hostName", "targetOS"});
+    values.expect_object({"hostName", "targetOS", "address"});
     const auto copy = [&](std::string_view key, char* field, std::size_t size) {
         const auto node = values.member(key);
         if (!node)
@@ -217,6 +219,12 @@ void read_server(const Node& values, Host& host) {
     };
     copy("hostName", host.server.hostName, sizeof host.server.hostName);
     copy("targetOS", host.server.targetOS, sizeof host.server.targetOS);
+    if (const auto address = values.member("address")) {
+        host.address = address->text();
+        in_addr parsed{};
+        if (!host.address.empty() && inet_pton(AF_INET, host.address.c_str(), &parsed) != 1)
+            address->fail("\"" + host.address + "\" is not an IPv4 address");
+    }
 }
 
 std::uint64_t fault_identifier(const Node& node) {

@@ -6,6 +6,7 @@
 #include "simulator/identifiers.h"
 #include "simulator/source_reader.h"
 
+#include <functional>
 #include <string>
 
 namespace vlnsim {
@@ -34,11 +35,36 @@ std::uint32_t read_identifier(const Node& value, std::string_view key,
 
 std::vector<std::pair<std::string, Bytes>> read_vpd(const Node& values);
 AX_iSCSI_InitiatorProperties read_initiator(const Node& values);
+// Options that are not given stay as they are.
+void read_login_options(const Node& values, AX_iSCSI_LoginOptions& options);
+std::uint32_t read_authentication(const Node& values); // AX_ISCSI_AUTH_
+// False for a text that is neither an IPv4 nor an IPv6 address.
+bool parse_address(const std::string& text, AX_IPAddress& address);
 AX_Ini_NetworkProperties read_network(const Node& values);
 AX_PCIRegisters read_pci(const Node& values);
 AX_SffData read_sff(const Node& values);
 
 std::vector<Target> read_targets(const Node& values);
+
+// A peripheral device type by number or name, of "type" or of the place in "types"; else a disk.
+std::uint8_t read_device_type(const Node& values, std::uint64_t lun);
+bool has_capacity(std::uint8_t type);
+// Keys of a unit, which at a target hold for all its units, and those of the object alone.
+std::vector<std::string_view> joined_keys(std::span<const std::string_view> unit_keys,
+                                          std::initializer_list<std::string_view> own);
+// Calls add for each logical unit of a target. "luns" is a count, a unit, or a list of units, each
+// of which may stand for several; values are those of the row over the target's.
+using Add_Unit = std::function<void(const Node& row, const Node& values, std::uint64_t lun)>;
+void read_unit_rows(const Node& target_values, std::span<const std::string_view> unit_keys,
+                    const Add_Unit& add);
+
+Driver_Parameters read_driver_parameters(const Node& values);
+// Changes the current value of a parameter; a name that there is none of is an error at value.
+void set_driver_parameter(std::optional<Driver_Parameters>& parameters, const std::string& name,
+                          const Node& value);
+
+// The targets that an iSCSI function sees; its initiator and network records have been read.
+std::vector<iSCSI_Target> read_iscsi_targets(const Node& values, const Function& function);
 
 Fault read_fault(const Node& values);
 

@@ -158,12 +158,23 @@ void read_records(const Node& values, Function& function) {
         function.network = read_network(*node);
     if (const auto node = values.member("sff"))
         function.sff = read_sff(*node);
+    if (const auto node = values.member("driverParameters"))
+        function.driver_parameters = read_driver_parameters(*node);
+    if (const auto node = values.member("globalDriverParameters"))
+        function.global_driver_parameters = read_driver_parameters(*node);
     if (const auto node = values.member("pci")) {
         function.pci = read_pci(*node);
         if (!node->member("functionNumber"))
             function.pci->functionNumber =
                 function.adapter_attributes[adapter_pci_function].number();
     }
+}
+
+bool read_mapping_by_unit(const Node& hba) {
+    const std::string order = hba.text("order", "targets");
+    if (order != "targets" && order != "units")
+        hba.member("order")->fail("unknown order \"" + order + "\"; known are: targets, units");
+    return order == "units";
 }
 
 void read_san(const Node& values, bool in_hba_api, Function& function) {
@@ -174,12 +185,13 @@ void read_san(const Node& values, bool in_hba_api, Function& function) {
         return;
     function.hba_name = "Vorlan-" + function.model + "-" + std::to_string(function.instance);
     if (hba && !hba->is(Value::Kind::boolean)) {
-        hba->expect_object({"name", "ports", "stale"});
+        hba->expect_object({"name", "ports", "stale", "order"});
         function.hba_name = hba->text("name", *function.hba_name);
         if (function.hba_name->size() > 255)
             hba->member("name")->fail("longer than 255 bytes");
         function.hba_ports = hba->number32("ports", 1);
         function.stale = hba->number32("stale", 0);
+        function.mapping_by_unit = read_mapping_by_unit(*hba);
     }
     if (const auto targets = values.member("targets"))
         function.targets = read_targets(*targets);
@@ -204,6 +216,8 @@ std::span<const std::string_view> function_keys() {
                                                 "features",
                                                 "driverType",
                                                 "beacon",
+                                                "driverParameters",
+                                                "globalDriverParameters",
                                                 "adapterAttributes",
                                                 "portAttributes",
                                                 "statistics",
@@ -214,7 +228,8 @@ std::span<const std::string_view> function_keys() {
                                                 "initiator",
                                                 "network",
                                                 "hba",
-                                                "targets"};
+                                                "targets",
+                                                "iscsiTargets"};
     return keys;
 }
 
@@ -276,6 +291,8 @@ Function read_function(const Node& values) {
     read_features(values, function);
     read_records(values, function);
     read_san(values, type.in_hba_api, function);
+    if (const auto targets = values.member("iscsiTargets"))
+        function.iscsi_targets = read_iscsi_targets(*targets, function);
     return function;
 }
 

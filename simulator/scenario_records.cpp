@@ -154,29 +154,6 @@ void read_text(const Node& values, std::string_view key, char (&field)[size]) {
     copy_text(node->text(), field, size);
 }
 
-void read_address(const Node& values, std::string_view key, AX_IPAddress& address) {
-    const auto node = values.member(key);
-    if (!node)
-        return;
-    const std::string text = node->text();
-    if (inet_pton(AF_INET6, text.c_str(), address.address) == 1)
-        address.flags = AX_IP_FLAG_V6;
-    else if (inet_pton(AF_INET, text.c_str(), address.address) != 1)
-        node->fail("\"" + text + "\" is not an IPv4 or IPv6 address");
-}
-
-std::uint32_t read_authentication(const Node& values) {
-    constexpr std::string_view names[] = {"none", "oneWayCHAP", "mutualCHAP"};
-    const auto node = values.member("authentication");
-    if (!node)
-        return AX_ISCSI_AUTH_NONE;
-    const std::string name = node->text();
-    const auto it = std::find(std::begin(names), std::end(names), name);
-    if (it == std::end(names))
-        node->fail("unknown method \"" + name + "\"; " + known_list(names));
-    return static_cast<std::uint32_t>(it - std::begin(names));
-}
-
 // A page of a transceiver's memory: all its bytes, or pieces of it by their offset, bytes or text.
 void read_page(const Node& values, std::uint8_t (&page)[256]) {
     const auto put = [&](const Node& value, std::size_t offset, const Bytes& bytes) {
@@ -203,7 +180,37 @@ void read_page(const Node& values, std::uint8_t (&page)[256]) {
     }
 }
 
+void read_address(const Node& values, std::string_view key, AX_IPAddress& address) {
+    const auto node = values.member(key);
+    if (node && !parse_address(node->text(), address))
+        node->fail("\"" + node->text() + "\" is not an IPv4 or IPv6 address");
+}
+
 } // namespace
+
+bool parse_address(const std::string& text, AX_IPAddress& address) {
+    if (inet_pton(AF_INET6, text.c_str(), address.address) == 1)
+        address.flags = AX_IP_FLAG_V6;
+    else if (inet_pton(AF_INET, text.c_str(), address.address) != 1)
+        return false;
+    return true;
+}
+
+std::uint32_t read_authentication(const Node& values) {
+    constexpr std::string_view names[] = {"none", "oneWayCHAP", "mutualCHAP"};
+    const auto node = values.member("authentication");
+    if (!node)
+        return AX_ISCSI_AUTH_NONE;
+    const std::string name = node->text();
+    const auto it = std::find(std::begin(names), std::end(names), name);
+    if (it == std::end(names))
+        node->fail("unknown method \"" + name + "\"; " + known_list(names));
+    return static_cast<std::uint32_t>(it - std::begin(names));
+}
+
+void read_login_options(const Node& values, AX_iSCSI_LoginOptions& options) {
+    read_fields(values, login_fields, &options);
+}
 
 std::vector<std::pair<std::string, Bytes>> read_vpd(const Node& values) {
     values.expect_any_object();
@@ -249,7 +256,7 @@ AX_iSCSI_InitiatorProperties read_initiator(const Node& values) {
     read_text(values, "initiatorCHAPName", authentication.initiatorCHAPName);
     read_text(values, "initiatorSecret", authentication.initiatorSecret);
     if (const auto options = values.member("loginOptions"))
-        read_fields(*options, login_fields, &initiator.loginOptions);
+        read_login_options(*options, initiator.loginOptions);
     return initiator;
 }
 

@@ -10,67 +10,15 @@ namespace vlnsim {
 namespace {
 
 constexpr std::uint64_t max_targets = 1024;
-constexpr std::uint64_t max_luns = 16384; // what two bytes of a LUN address
 constexpr std::uint8_t page_serial = 0x80;
 constexpr std::uint8_t page_identity = 0x83;
 constexpr std::size_t max_identifier = 247; // of a descriptor, within a response of 255 bytes
 
-struct Device_Type {
-    std::string_view name;
-    std::uint8_t number;
-    bool has_capacity;
-};
-constexpr Device_Type device_types[] = {
-    {"disk", 0, true},       {"tape", 1, false},       {"printer", 2, false},
-    {"processor", 3, false}, {"worm", 4, true},        {"cd", 5, true},
-    {"scanner", 6, false},   {"optical", 7, true},     {"changer", 8, false},
-    {"array", 12, false},    {"enclosure", 13, false}, {"simpleDisk", 14, true},
-    {"unknown", 31, false},
-};
-
 // Keys of a unit; at a target they hold for all its units.
 constexpr std::string_view unit_keys[] = {
-    "type",      "types",      "vendor",         "product", "revision",
-    "serial",    "identifier", "osDeviceName",   "lastLBA", "blockLength",
-    "responses", "silent",     "checkConditions"};
-
-Node keys_checked(const Node& values, std::initializer_list<std::string_view> own) {
-    std::vector<std::string_view> known(own);
-    known.insert(known.end(), std::begin(unit_keys), std::end(unit_keys));
-    values.expect_object(known);
-    return values;
-}
-
-std::uint8_t read_type_value(const Node& node) {
-    if (node.is(Value::Kind::number))
-        return static_cast<std::uint8_t>(node.number(31));
-    const std::string name = node.text();
-    std::vector<std::string_view> names;
-    for (const Device_Type& type : device_types) {
-        if (type.name == name)
-            return type.number;
-        names.push_back(type.name);
-    }
-    node.fail("unknown device type \"" + name + "\"; a number below 32 is known, and " +
-              known_list(names));
-}
-
-std::uint8_t read_device_type(const Node& values, std::uint64_t lun) {
-    if (const auto type = values.member("type"))
-        return read_type_value(*type);
-    const auto types = values.member("types");
-    if (!types)
-        return 0;
-    const std::vector<Node> list = types->items();
-    if (list.empty())
-        types->fail("a list with at least one type is wanted");
-    return read_type_value(list[static_cast<std::size_t>(lun % list.size())]);
-}
-
-bool has_capacity(std::uint8_t type) {
-    return std::any_of(std::begin(device_types), std::end(device_types),
-                       [&](const auto& row) { return row.number == type && row.has_capacity; });
-}
+    "type",      "types",      "vendor",          "product", "revision",
+    "serial",    "identifier", "osDeviceName",    "lastLBA", "blockLength",
+    "responses", "silent",     "checkConditions", "fromCall"};
 
 // A field of an inquiry: cut or filled with blanks.
 void put_padded(const std::string& text, std::size_t width, Bytes& bytes) {
@@ -94,15 +42,15 @@ Bytes inquiry_data(const Node& values, std::uint8_t type) {
     constexpr std::uint8_t response_format = 2;
     constexpr std::uint8_t additional_length = 31;
     Bytes bytes{type, 0, version_spc3, response_format, additional_length, 0, 0, 0};
-    put_padded(values.text("vendor", "VORLAN"), 8, bytes);
-    put_padded(values.text("product", "SIMULATED UNIT"), 16, bytes);
-    put_padded(values.text("revision", "1.00"), 4, bytes);
+    put_padded(values.wild_text("vendor", "VORLAN"), 8, bytes);
+    put_padded(values.wild_text("product", "SIMULATED UNIT"), 16, bytes);
+    put_padded(values.wild_text("revision", "1.00"), 4, bytes);
     return bytes;
 }
 
 Bytes serial_data(const Node& values, std::uint8_t type, std::uint64_t target, std::uint64_t lun) {
     const std::string serial =
-        values.text("serial", "T" + std::to_string(target) + "L" + std::to_string(lun));
+        values.wild_text("serial", "T" + std::to_string(target) + "L" + std::to_string(lun));
     if (serial.size() > 251)
         values.member("serial")->fail("longer than 251 bytes");
     Bytes bytes{type, page_serial, 0, static_cast<std::uint8_t>(serial.size())};
@@ -182,7 +130,7 @@ Unit read_unit(const Node& values, std::uint64_t target, std::uint64_t lun) {
     const std::uint8_t type = read_device_type(values, lun);
     unit.fcp_lun = encoded_lun(lun);
     unit.os_lun = static_cast<std::uint32_t>(lun);
-    unit.os_device_name = values.text("osDeviceName", "");
+    unit.os_device_name = values.wild_text("osDeviceName", "");
     if (unit.os_device_name.size() > 255)
         values.member("osDeviceName")->fail("longer than 255 bytes");
     unit.inquiry = inquiry_data(values, type);
@@ -192,6 +140,7 @@ Unit read_unit(const Node& values, std::uint64_t target, std::uint64_t lun) {
         unit.capacity = capacity_data(values);
     unit.check_conditions = values.number32("checkConditions", 0);
     unit.silent = values.boolean("silent", false);
+    unit.from_call = values.number32("fromCall", 1);
     override_responses(values, unit);
     return unit;
 }
@@ -201,38 +150,6 @@ void add_unit(const Node& source, Unit unit, Target& target) {
         if (other.os_lun == unit.os_lun)
             source.fail("logical unit " + std::to_string(unit.os_lun) + " is there already");
     target.units.push_back(std::move(unit));
-}
-
-// "luns" is a count, a unit, or a list of units, each of which may stand for several.
-void read_units(const Node& target_values, std::uint64_t number, Target& target) {
-    Value base = target_values.value();
-    std::erase_if(base.members, [](const Member& member) {
-        return std::find(std::begin(unit_keys), std::end(unit_keys), member.first) ==
-               std::end(unit_keys);
-    });
-    const auto luns = target_values.member("luns");
-    Value one;
-    one.kind = Value::Kind::object;
-    std::vector<Node> rows;
-    const bool is_count = luns && !luns->is(Value::Kind::list) && !luns->is(Value::Kind::object);
-    if (luns && !is_count)
-        rows = luns->items_or_self();
-    else
-        rows.emplace_back(one, target_values.scope());
-    std::uint64_t next = 0;
-    for (const Node& row : rows) {
-        keys_checked(row, {"count", "number"});
-        const std::uint64_t count =
-            is_count ? luns->number(max_luns) : row.number("count", 1, max_luns);
-        next = row.number("number", next, max_luns - 1);
-        if (next + count > max_luns)
-            row.fail("logical unit numbers end at " + std::to_string(max_luns - 1));
-        const Value values = merged(base, row.value());
-        for (std::uint64_t i = 0; i < count; ++i, ++next) {
-            const Scope scope = target_values.scope().with("lun", next);
-            add_unit(row, read_unit(Node(values, scope), number, next), target);
-        }
-    }
 }
 
 Target read_target(const Node& values, std::uint64_t number) {
@@ -246,7 +163,9 @@ Target read_target(const Node& values, std::uint64_t number) {
         values.number32("fcId", 0x010000 + (static_cast<std::uint32_t>(number + 1) << 8));
     target.bus = values.number32("bus", 0);
     target.number = values.number32("number", static_cast<std::uint32_t>(number));
-    read_units(values, number, target);
+    read_unit_rows(values, unit_keys, [&](const Node& row, const Node& unit, std::uint64_t lun) {
+        add_unit(row, read_unit(unit, number, lun), target);
+    });
     return target;
 }
 
@@ -256,7 +175,8 @@ std::vector<Target> read_targets(const Node& values) {
     std::vector<Target> targets;
     std::uint64_t number = 0;
     for (const Node& row : values.items_or_self()) {
-        keys_checked(row, {"count", "luns", "wwpn", "wwnn", "fcId", "bus", "number"});
+        row.expect_object(
+            joined_keys(unit_keys, {"count", "luns", "wwpn", "wwnn", "fcId", "bus", "number"}));
         const std::uint64_t count = row.number("count", 1, max_targets);
         for (std::uint64_t i = 0; i < count; ++i, ++number) {
             const Scope scope = row.scope().with("target", number);

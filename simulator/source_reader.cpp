@@ -242,6 +242,18 @@ std::string Node::text(std::string_view name, const std::string& otherwise) cons
     return node ? node->text() : otherwise;
 }
 
+std::string Node::wild_text(std::string_view name, const std::string& otherwise) const {
+    const auto node = member(name);
+    if (!node || !node->is(Value::Kind::object))
+        return node ? node->text() : otherwise;
+    node->expect_object({"bytes"});
+    const auto bytes = node->member("bytes");
+    if (!bytes)
+        node->fail("\"bytes\" is wanted");
+    const auto values = bytes->bytes();
+    return std::string(values.begin(), values.end());
+}
+
 std::uint64_t Node::number(std::string_view name, std::uint64_t otherwise,
                            std::uint64_t maximum) const {
     const auto node = member(name);

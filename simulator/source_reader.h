@@ -53,6 +53,8 @@ public:
     // Values with a default for a member that is not there.
     bool boolean(std::string_view name, bool otherwise) const;
     std::string text(std::string_view name, const std::string& otherwise) const;
+    // The same, where {"bytes": "hexadecimal digits"} stands for a text of any bytes.
+    std::string wild_text(std::string_view name, const std::string& otherwise) const;
     std::uint64_t number(std::string_view name, std::uint64_t otherwise,
                          std::uint64_t maximum = std::numeric_limits<std::uint64_t>::max()) const;
     std::uint32_t number32(std::string_view name, std::uint32_t otherwise) const;

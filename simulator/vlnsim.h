@@ -50,7 +50,8 @@ VLNSIM_API void vlnsim_reset(void);
 /* Changes one value of the running host, as hardware would. wwn is the port WWN of the function as
  * 16 hexadecimal digits; table is "adapterAttributes", "portAttributes", "statistics" or
  * "features"; name as in a scenario, by name or number; value is a JSON text, null to make the
- * value missing. Returns 0, or 1 with a text in error. */
+ * value missing. The table may also be "driverParameters" or "globalDriverParameters", for the
+ * current value of the parameter of that name. Returns 0, or 1 with a text in error. */
 VLNSIM_API int vlnsim_set_value(const char* wwn, const char* table, const char* name,
                                 const char* value, char* error, size_t size);
 
@@ -103,6 +104,13 @@ VLNSIM_API size_t vlnsim_paused(void);
 /* ---- Network interfaces
  * --------------------------------------------------------------------------
  */
+
+/* The simulated host's name, as gethostname(2): 0, or -1 for a host without one. */
+VLNSIM_API int vlnsim_host_name(char* name, size_t size);
+
+/* The IPv4 address of the host of that name, which is the simulated one alone. Returns 0, or 1 if
+ * the name cannot be resolved. */
+VLNSIM_API int vlnsim_resolve_host(const char* name, char* address, size_t size);
 
 /* What the simulated host's kernel knows of an interface. */
 struct vlnsim_interface {

@@ -22,9 +22,9 @@ TEST_F(Maps_Test, TwoPortsOfOneCard) {
                            {STORE_VLNMPCA_PhysicalConnector, 2},
                            {STORE_VLNMPCA_ProductPhysicalConnector, 2},
                            {STORE_VLNMPCA_Container, 2},
-                           {STORE_VLNMPCA_EthernetPort, 2},
-                           {STORE_VLNMPCA_EthernetPortSystemDevice, 2},
-                           {STORE_VLNMPCA_Realizes, 2},
+                           {STORE_VLNMPCA_EthernetPort, 4},
+                           {STORE_VLNMPCA_EthernetPortSystemDevice, 4},
+                           {STORE_VLNMPCA_Realizes, 4},
                            {STORE_VLNMPCA_LANEndpoint, 2},
                            {STORE_VLNMPCA_EnabledLogicalElementCapabilities, 2},
                            {STORE_VLNMPCA_NICCapabilities, 2},
@@ -36,7 +36,7 @@ TEST_F(Maps_Test, TwoPortsOfOneCard) {
                            {STORE_VLNMPCA_CardRealizesPortController, 2},
                            {STORE_VLNMPCA_PortControllerSystemDevice, 2},
                            {STORE_VLNMPCA_PortControllerRealizes, 2},
-                           {STORE_VLNMPCA_ControlledBy, 2}});
+                           {STORE_VLNMPCA_ControlledBy, 4}});
     EXPECT_EQ(log.count(VLN_DBG, "PERF: updateAdapterMaps: cleanExit"), 1);
 }
 

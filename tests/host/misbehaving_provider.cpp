@@ -39,6 +39,10 @@ CMPIrc wrong_type(const Wrong&) {
     return set("Test_Bad", "Level", {.string = new_string("1")}, CMPI_string);
 }
 
+CMPIrc wild_text(const Wrong&) {
+    return set("Test_Bad", "Name", {.string = new_string("a\xC3(")}, CMPI_string);
+}
+
 CMPIrc wrong_width(const Wrong&) {
     return set("Test_Bad", "Level", {.uint64 = 1}, CMPI_uint32);
 }
@@ -218,6 +222,7 @@ struct Row {
 constexpr Row ROWS[] = {
     {"unknown property", unknown_property},
     {"wrong type", wrong_type},
+    {"wild text", wild_text},
     {"wrong width", wrong_width},
     {"scalar for array", scalar_for_array},
     {"wrong reference", wrong_reference},

@@ -36,6 +36,7 @@ struct Case {
 constexpr Case CASES[] = {
     {"unknown property", FaultKind::unknown_property, CMPI_RC_ERR_NO_SUCH_PROPERTY},
     {"wrong type", FaultKind::type_mismatch, CMPI_RC_ERR_TYPE_MISMATCH},
+    {"wild text", FaultKind::bad_text, CMPI_RC_OK},
     {"wrong width", FaultKind::type_mismatch, CMPI_RC_ERR_TYPE_MISMATCH},
     {"scalar for array", FaultKind::type_mismatch, CMPI_RC_ERR_TYPE_MISMATCH},
     {"wrong reference", FaultKind::type_mismatch, CMPI_RC_ERR_TYPE_MISMATCH},

@@ -3,6 +3,7 @@
 
 #include <fstream>
 #include <random>
+#include <sstream>
 
 using road::Road;
 using road::text_of;
@@ -72,7 +73,7 @@ TEST(Bad_Data, AnAddressWithoutTwelveDigitsCostsItsPortAndNoOther) {
 }
 #endif
 
-// The longest text that a reader keeps has 255 bytes; bytes that are no UTF-8 go as they came.
+// The longest text that a reader keeps has 255 bytes; each byte that is no UTF-8 is replaced.
 TEST(Bad_Data, OverlongTextsAreCutAndWildBytesHarmNobody) {
     Road road({.scenario = card("")});
     const std::string longest(255, 'x');
@@ -85,8 +86,40 @@ TEST(Bad_Data, OverlongTextsAreCutAndWildBytesHarmNobody) {
     const auto ports = road.enumerate("VLNMPCA_EthernetPort");
     ASSERT_EQ(ports.size(), 2u);
     EXPECT_EQ(text_of(ports[0], "Name"), longest);
-    EXPECT_TRUE(text_of(ports[1], "Name").starts_with("A"));
+    EXPECT_EQ(text_of(ports[1], "Name"),
+              "A\xEF\xBF\xBD\xEF\xBF\xBD\xEF\xBF\xBD(\xEF\xBF\xBD\xEF\xBF\xBD");
     road.census();
+}
+
+// The texts that adapters and ports tell, of bytes that are none: the object manager looks at all
+// that becomes of them. Without a firmware version of numbers there would be no NIC classes at all.
+TEST(Bad_Data, NoWildByteReachesAClient) {
+    constexpr const char* ADAPTER_TEXTS =
+        "Manufacturer SerialNumber Model ModelDescription NodeSymbolicName HWVersion DriverName "
+        "OptionROMVersion DriverVersion BootVersion OperationalFirmwareVersion FirmwareOnFlash "
+        "IPLFilename FunctionalFirmwareVersion Subadapter_number ULPFirmwareName "
+        "ULPFirmwareVersion "
+        "KernelFirmwareVersion PCIBusSpeed FCUniversalVersion";
+    constexpr const char* PORT_TEXTS =
+        "PortSymbolicName OSDeviceName IfName ProtocolIFType LinkTechnology Capabilities "
+        "IPv4Address SubnetMask IPProtocolEndpointName AddressOrigin FuncPortSpeed VNICName "
+        "FuncQosBandwidth FuncQosMinBandwidth GatewayAddress AutoNegSupportedSpeeds "
+        "ConfiguredPortSpeed ForceSupportedSpeeds";
+    const auto wild = [](const char* names) {
+        std::istringstream words(names);
+        std::string values;
+        for (std::string name; words >> name;)
+            values += (values.empty() ? "\"" : ", \"") + name + R"(": {"bytes": "41FF80C328F09F"})";
+        return "{" + values + "}";
+    };
+    Road road({.scenario = card(R"("adapterAttributes": )" + wild(ADAPTER_TEXTS) +
+                                R"(, "portAttributes": )" + wild(PORT_TEXTS))});
+    auto counts = road.census();
+    EXPECT_EQ(counts["VLNMPCA_EthernetPort"], 2u);
+    EXPECT_EQ(counts["VLNMPCA_Card"], 1u);
+    EXPECT_EQ(counts["VLNMPCA_FCPort"], 2u);
+    EXPECT_EQ(text_of(road.enumerate("VLNMPCA_PortController").at(0), "ConfiguredPortSpeed"),
+              "A\xEF\xBF\xBD\xEF\xBF\xBD\xEF\xBF\xBD(\xEF\xBF\xBD\xEF\xBF\xBD");
 }
 
 TEST(Bad_Data, AnAbsurdNumberOfInstancesIsRefused) {
@@ -162,7 +195,7 @@ TEST(Bad_Files, ATuningFileCutAnywhereLeavesTheProviderWorking) {
     for (const std::string& content : contents) {
         std::ofstream(road.root() / TUNING_FILE) << content;
         ASSERT_EQ(road.enumerate("VLNMPCA_ProviderConfigSetting").size(), 3u) << content;
-        ASSERT_EQ(road.enumerate("VLNMPCA_EthernetPort").size(), 2u) << content;
+        ASSERT_EQ(road.enumerate("VLNMPCA_EthernetPort").size(), 4u) << content;
         ASSERT_TRUE(road.manager().cleanup(true).ok());
     }
 }
@@ -184,7 +217,7 @@ TEST(Bad_Files, LogSettingsCutAnywhereLeaveTheProviderWorking) {
     contents.push_back("2,5,1\n" + std::string(20000, 'n') + "\n");
     for (const std::string& content : contents) {
         std::ofstream(road.root() / LOG_SETTINGS) << content;
-        ASSERT_EQ(road.enumerate("VLNMPCA_EthernetPort").size(), 2u) << content;
+        ASSERT_EQ(road.enumerate("VLNMPCA_EthernetPort").size(), 4u) << content;
         ASSERT_TRUE(road.manager().cleanup(true).ok());
     }
 }
@@ -193,7 +226,7 @@ TEST(Bad_Files, WithoutTheFolderOfItsLogTheProviderWorksInSilence) {
     Road road;
     fs::remove_all(road.root() / "opt");
     std::ofstream(road.root() / "opt") << "a file where a folder is wanted";
-    EXPECT_EQ(road.enumerate("VLNMPCA_EthernetPort").size(), 2u);
+    EXPECT_EQ(road.enumerate("VLNMPCA_EthernetPort").size(), 4u);
 }
 
 } // namespace

@@ -15,19 +15,41 @@ using road::Road;
 
 namespace {
 
-// The two-port card with two units behind each FCoE port.
+// The two-port card with two units behind each FCoE and each iSCSI port.
 const std::string SCENARIO = R"({"include": ")" VLN_SCENARIOS R"(/parts/cna.json",
-    "cards": [{"use": "cna", "ports": 2, "functions": [{"use": "nic"}, {"use": "iscsi"},
+    "cards": [{"use": "cna", "ports": 2, "functions": [{"use": "nic"},
+        {"use": "iscsi", "iscsiTargets": {"name": "iqn.2010-04.com.example:t-{port}", "luns": 2,
+            "sessions": {"targetPortal": "198.51.100.20{port}"}}},
         {"use": "fcoe", "targets": {"luns": 2, "wwpn": "50:25:64:C{port}:00:00:00:{target:02X}"}}]}]})";
 
 // What the paths of adapters' objects contain: WWNs of the card and of its targets, its serial
-// number, and so on. The first of a port's texts is the beginning of all its WWNs.
-constexpr const char* ADAPTER_TEXTS[] = {"100002564C", "502564C", "VR1042", "VMC-2210",
-                                         "02564c",     "vln0p",   ":0x2210"};
-constexpr const char* PORT_TEXTS[2][4] = {
-    {"100002564C0000", "VR10420117:0", "vln0p0", "0:0:0x2210"},
-    {"100002564C0001", "VR10420117:1", "vln0p1", "1:0:0x2210"},
+// number, its drivers, what iSCSI and FCoE functions have in common, and so on.
+constexpr const char* ADAPTER_TEXTS[] = {"100002564C",
+                                         "502564C",
+                                         "VR1042",
+                                         "VMC-2210",
+                                         "02564c",
+                                         "vln0p",
+                                         ":0x2210",
+                                         "198.51.100.",
+                                         "com.example:t-",
+                                         "vlniscsi",
+                                         "vlnfcoe",
+                                         "VLNMPCA_SCSIProtocolController",
+                                         "VLNMPCA_DriverParameter",
+                                         "VLNMPCA_FCWWNService"};
+// The first of a port's texts is the beginning of all its WWNs. The driver's global parameters are
+// read through the first FCoE function.
+const std::vector<const char*> PORT_TEXTS[2] = {
+    {"100002564C0000", "VR10420117:0", "vln0p0", "0:0:0x2210", "198.51.100.12", "502564C0",
+     "example:t-0", "Global Driver Parameter"},
+    {"100002564C0001", "VR10420117:1", "vln0p1", "1:0:0x2210", "198.51.100.13", "502564C1",
+     "example:t-1"},
 };
+
+// Ethernet ports by the kind of their function.
+constexpr std::size_t NIC_PORTS = 2;
+constexpr std::size_t ISCSI_PORTS = 2;
 
 using Paths = std::set<std::string>;
 
@@ -213,7 +235,7 @@ bool depends(const std::string& path, const std::string& function,
 }
 
 TEST_F(Sweep, EachCallFailsWithEachStatus) {
-    ASSERT_EQ(ports(healthy), 2u);
+    ASSERT_EQ(ports(healthy), NIC_PORTS + ISCSI_PORTS);
     ASSERT_GT(lines.size(), 100u);
     std::map<std::string, unsigned> calls;
     for (const std::string& line : lines) {
@@ -235,9 +257,12 @@ TEST_F(Sweep, EachCallFailsWithEachStatus) {
 
 TEST_F(Sweep, EachValueIsMissing) {
     constexpr unsigned PERMANENT_ADDRESS = 804;
-    constexpr unsigned CURRENT_ADDRESS = 817;
+    constexpr unsigned CURRENT_ADDRESS = 817; // shown of NICs alone
     // The flash image's version is parsed late, and one without dots ends the row of cards there.
     constexpr unsigned FIRMWARE_VERSION = 522;
+    const std::map<unsigned, std::size_t> fewer_ports = {{PERMANENT_ADDRESS, 0},
+                                                         {CURRENT_ADDRESS, ISCSI_PORTS},
+                                                         {FIRMWARE_VERSION, 1 + ISCSI_PORTS}};
     std::set<unsigned> identifiers;
     for (const std::string& line : lines)
         if (line.starts_with("AX_GetAttributeValue("))
@@ -245,15 +270,14 @@ TEST_F(Sweep, EachValueIsMissing) {
                 static_cast<unsigned>(std::stoul(line.substr(line.find_first_of("(") + 1))));
     ASSERT_GT(identifiers.size(), 60u);
     for (const unsigned identifier : identifiers) {
-        const bool address = identifier == PERMANENT_ADDRESS || identifier == CURRENT_ADDRESS;
 #ifdef CIMPLE_CHECK_LOCKS
-        if (address) // ends such a build: see the test of bad addresses
-            continue;
+        if (identifier == PERMANENT_ADDRESS || identifier == CURRENT_ADDRESS)
+            continue; // ends such a build: see the test of bad addresses
 #endif
         const Fault fault{"AX_GetAttributeValue", VLNSIM_EVERY, VLNSIM_MISSING, identifier};
-        EXPECT_EQ(ports(refresh(&fault)), address                          ? 0u
-                                          : identifier == FIRMWARE_VERSION ? 1u
-                                                                           : 2u)
+        const auto row = fewer_ports.find(identifier);
+        EXPECT_EQ(ports(refresh(&fault)),
+                  row == fewer_ports.end() ? NIC_PORTS + ISCSI_PORTS : row->second)
             << fault.text();
     }
 }
@@ -262,16 +286,24 @@ TEST_F(Sweep, EachSymbolIsAbsent) {
     std::set<std::string> functions;
     for (const std::string& line : lines)
         functions.insert(function_of(line));
-    const std::set<std::string> needed = {"AX_InitLib", "AX_GetAllLocalHBAInstances",
-                                          "AX_GetHBAAttributes", "AX_GetPortAttributes"};
+    const std::map<std::string, std::size_t> fewer_ports = {
+        {"AX_InitLib", 0},
+        {"AX_GetAllLocalHBAInstances", 0},
+        {"AX_GetHBAAttributes", 0},
+        {"AX_GetPortAttributes", 0},
+        {"AX_GetAttributeValue", 0},
+        {"AX_iSCSI_GetInitiatorProperties", NIC_PORTS},
+        {"AX_Ini_GetNetworkProperties", NIC_PORTS}};
     for (const std::string& function : functions) {
         const Fault fault{function, VLNSIM_EVERY, VLNSIM_ABSENT};
 #ifdef CIMPLE_CHECK_LOCKS
         if (function == "AX_GetAttributeValue") // no address either
             continue;
 #endif
-        const bool no_ports = needed.contains(function) || function == "AX_GetAttributeValue";
-        EXPECT_EQ(ports(refresh(&fault)), no_ports ? 0u : 2u) << fault.text();
+        const auto row = fewer_ports.find(function);
+        EXPECT_EQ(ports(refresh(&fault)),
+                  row == fewer_ports.end() ? NIC_PORTS + ISCSI_PORTS : row->second)
+            << fault.text();
     }
 }
 

@@ -1,4 +1,4 @@
-// What a client sees of the host's IP interfaces on the adapters.
+// What a client sees of the host's IP interfaces on the NIC ports.
 #include "tests/road/properties.h"
 
 using road::expect_properties;
@@ -15,8 +15,12 @@ void set_port(const char* wwn, const char* name, const char* value) {
 
 constexpr char FIRST[] = "100002564C000000";
 
+// The card without its iSCSI functions, whose stacks are their own.
+constexpr char TWO_NICS[] = R"({"include": ")" VLN_SCENARIOS R"(/parts/cna.json",
+    "cards": [{"use": "cna", "ports": 2, "functions": [{"use": "nic"}]}]})";
+
 TEST(IP, AnEndpointForEachInterfaceWithAnAddress) {
-    Road road;
+    Road road({.scenario = TWO_NICS});
     const auto endpoints = road.enumerate("VLNMPCA_IPProtocolEndpoint");
     ASSERT_EQ(endpoints.size(), 2u);
     expect_properties(
@@ -60,7 +64,7 @@ TEST(IP, AnEndpointForEachInterfaceWithAnAddress) {
 }
 
 TEST(IP, PortsOfOneNetworkShareTheirGateway) {
-    Road road;
+    Road road({.scenario = TWO_NICS});
     const auto gateways = road.enumerate("VLNMPCA_RemoteServiceAccessPoint");
     ASSERT_EQ(gateways.size(), 1u);
     expect_properties(gateways[0], {{"Name", "192.0.2.1"},
@@ -73,7 +77,7 @@ TEST(IP, PortsOfOneNetworkShareTheirGateway) {
 }
 
 TEST(IP, WhatTheKernelSaysDecides) {
-    Road road({.log = true});
+    Road road({.scenario = TWO_NICS, .log = true});
     set_port(FIRST, "FunctionalPortState", "6"); // the interface is down
     set_port(FIRST, "AddressOrigin", R"("DHCP")");
     set_port(FIRST, "SubnetMask", nullptr);
@@ -103,7 +107,7 @@ TEST(IP, InterfacesWithoutAnIPv4AddressAreLeftOut) {
         {"IPProtocolIFType", R"("IPv6")", "Failed to retrieve IP Address for interface: [vln0p0]"},
     };
     for (const Row& row : rows) {
-        Road road({.log = true});
+        Road road({.scenario = TWO_NICS, .log = true});
         set_port(FIRST, row.name, row.value);
         const auto endpoints = road.enumerate("VLNMPCA_IPProtocolEndpoint");
         ASSERT_EQ(endpoints.size(), 1u) << row.name;

@@ -25,14 +25,14 @@ TEST(Libraries, WithoutAnyEveryEnumerationIsEmptyAtOnceAndTheLogSaysWhy) {
 
 TEST(Libraries, TheFallbackServesAsWell) {
     Road road({.scenario = scenario_with(R"({"local": {"present": false}})"), .log = true});
-    EXPECT_EQ(road.enumerate("VLNMPCA_EthernetPort").size(), 2u);
+    EXPECT_EQ(road.enumerate("VLNMPCA_EthernetPort").size(), 4u);
     road.close();
     EXPECT_EQ(road.count_in_log("Error : In Loading Library "), 1u);
 }
 
 TEST(Libraries, WithoutTheHbaApiThePortsAreThere) {
     Road road({.scenario = scenario_with(R"({"hba": {"present": false}})")});
-    EXPECT_EQ(road.enumerate("VLNMPCA_EthernetPort").size(), 2u);
+    EXPECT_EQ(road.enumerate("VLNMPCA_EthernetPort").size(), 4u);
 }
 
 TEST(Libraries, AFailingInitialisationIsReportedAndAnsweredWithNothing) {

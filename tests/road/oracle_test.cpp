@@ -83,16 +83,13 @@ struct Model {
 
 // An end is the source of a query if its place accepts the source's class and it has all of the
 // source's keys.
-bool is_source(const Model& model, const host::ObjectPath& source, const host::Class& association,
-               const host::Named_Value& end) {
-    const host::Property* place = association.find_property(end.name);
-    if (!place || (place->target && !model.classes.find(source.class_name)->is_a(place->target)))
-        return false;
-    const host::ObjectPath& path = *end.value.as_reference();
-    return std::all_of(source.keys.begin(), source.keys.end(), [&](const host::Named_Value& key) {
-        const host::Value* value = path.key(key.name);
-        return value && *value == key.value;
-    });
+bool is_source(const host::ObjectPath& source, const host::Class* source_class,
+               const host::Property& place, const host::ObjectPath& end) {
+    return (!place.target || source_class->is_a(place.target)) &&
+           std::all_of(source.keys.begin(), source.keys.end(), [&](const host::Named_Value& key) {
+               const host::Value* value = end.key(key.name);
+               return value && *value == key.value;
+           });
 }
 
 // What the enumerations say about one source: its associations and the ends opposite.
@@ -102,25 +99,29 @@ struct Expected {
 };
 
 Expected expect_of(const Model& model, const host::ObjectPath& source) {
+    const host::Class* source_class = model.classes.find(source.class_name);
     Expected expected;
     for (const Model::Class_Row& row : model.rows) {
         if (!row.known->is_association)
             continue;
         for (const host::Instance& association : row.instances) {
-            Paths others;
+            std::vector<const host::ObjectPath*> others;
             bool found = false;
             for (const host::Named_Value& property : association.properties) {
-                if (!property.value.as_reference())
+                const host::ObjectPath* end = property.value.as_reference();
+                if (!end)
                     continue;
-                if (is_source(model, source, *row.known, property))
+                const host::Property* place = row.known->find_property(property.name);
+                if (place && is_source(source, source_class, *place, *end))
                     found = true;
                 else
-                    others.push_back(*property.value.as_reference());
+                    others.push_back(end);
             }
             if (!found)
                 continue;
             expected.references.push_back(association.path);
-            expected.ends.insert(expected.ends.end(), others.begin(), others.end());
+            for (const host::ObjectPath* end : others)
+                expected.ends.push_back(*end);
         }
     }
     return expected;
@@ -177,11 +178,29 @@ constexpr const char* PLATFORM = R"([
    "properties": {"CreationClassName": "IBMSD_Chassis", "Tag": "chassis 12"}}
 ])";
 
-class Oracle : public testing::TestWithParam<const char*> {};
+// Units of every kind behind two ports, one of them seen by both.
+constexpr const char* SMALL_SAN = R"({"include": ")" VLN_SCENARIOS R"(/parts/cna.json", "cards": [
+    {"use": "cna", "ports": 2, "functions": [{"use": "nic"}, {"use": "fcoe", "targets": [
+      {"wwpn": "50:25:64:C0:3B:20:00:0{port}", "luns": 5,
+       "types": ["disk", "tape", "processor", 17, "cd"], "serial": "P{port}L{lun}"},
+      {"wwpn": "50:25:64:C0:3B:20:00:0F", "luns": 1, "serial": "SHARED"}]}]}]})";
+
+struct Scenario {
+    const char* name;
+    const char* text; // as Setup wants it
+};
+
+constexpr Scenario SCENARIOS[] = {
+    {"TwoPorts", "two-port-cna.json"}, {"Blade", "blade-16-functions.json"},
+    {"FCoE", "fcoe-pair.json"},        {"ISCSI", "iscsi-sessions.json"},
+    {"SmallSAN", SMALL_SAN},
+};
+
+class Oracle : public testing::TestWithParam<Scenario> {};
 
 TEST_P(Oracle, TheModelTellsOneStory) {
     for (const char* platform : {"", PLATFORM}) {
-        Road road({.scenario = GetParam(), .platform = platform});
+        Road road({.scenario = GetParam().text, .platform = platform});
         const Model model(road);
         ASSERT_FALSE(model.by_name.empty());
         check_instances(road, model);
@@ -190,11 +209,46 @@ TEST_P(Oracle, TheModelTellsOneStory) {
     }
 }
 
-INSTANTIATE_TEST_SUITE_P(Scenarios, Oracle,
-                         testing::Values("two-port-cna.json", "blade-16-functions.json"),
-                         [](const auto& info) {
-                             const std::string file = info.param;
-                             return file.starts_with("two") ? "TwoPorts" : "Blade";
-                         });
+// Elements that conform to a profile, by any association of that kind.
+std::set<std::string> conforming_to(Road& road, const host::ObjectPath& profile) {
+    std::set<std::string> elements;
+    for (const host::Class* known : road.manager().provider_classes())
+        if (known->is_a(road.manager().classes().find("CIM_ElementConformsToProfile")))
+            for (const auto& path :
+                 road.manager()
+                     .associator_names(profile, {known->name, "", "", "ManagedElement"})
+                     .value)
+                elements.insert(text(path));
+    return elements;
+}
+
+// Where the system is the provider's own, every profile leads to something. A platform's system
+// conforms to what the platform says: these profiles are left with nothing then, since nothing else
+// of the host conforms to them.
+TEST_P(Oracle, EveryProfileLeadsToAnElement) {
+    const std::set<std::string> of_the_system = {"Record Log", "Storage HBA", "iSCSI Initiator"};
+    const std::map<std::string, const char*> of_a_class = {
+        {"FCoE Initiator Ports", "VLNMPCA_FCPort"},
+        {"iSCSI Initiator Ports", "VLNMPCA_SCSIProtocolController"}};
+    for (const char* platform : {"", PLATFORM}) {
+        Road road({.scenario = GetParam().text, .platform = platform});
+        const auto profiles =
+            road.manager().enumerate("VLNMPCA_RegisteredProfile", std::nullopt, "root/pg_interop");
+        ASSERT_GE(profiles.value.size(), 13u);
+        for (const host::Instance& profile : profiles.value) {
+            const std::string registered = road::text_of(profile, "RegisteredName");
+            const auto only = of_a_class.find(registered);
+            const bool has_elements =
+                *platform == '\0' ||
+                (!of_the_system.count(registered) &&
+                 (only == of_a_class.end() || !road.enumerate(only->second).empty()));
+            EXPECT_EQ(!conforming_to(road, profile.path).empty(), has_elements)
+                << registered << (*platform ? " on a platform" : "");
+        }
+    }
+}
+
+INSTANTIATE_TEST_SUITE_P(Scenarios, Oracle, testing::ValuesIn(SCENARIOS),
+                         [](const auto& info) { return std::string(info.param.name); });
 
 } // namespace

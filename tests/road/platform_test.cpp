@@ -70,4 +70,39 @@ TEST(Platform, WithoutOneTheProviderMakesItsOwn) {
     EXPECT_GE(road.count_in_log("up-call method failed"), 1u);
 }
 
+// Keys are made of the host's name, or of "unknown" where it has none: they lead back to their
+// instances all the same.
+TEST(Platform, AHostThatCannotBeResolvedHasUsableKeys) {
+    const struct {
+        const char* server;
+        const char* name;
+        const char* line;
+    } rows[] = {
+        {R"({"hostName": "box-9", "address": ""})", "box-9",
+         "Error! gethostbyname() failed, using 'unknown' for IP address."},
+        {R"({"hostName": ""})", "unknown", "Error! gethostname() failed err : "},
+        {R"({"hostName": "box-9"})", "box-9", "Host ipAddress : 192.0.2.10"},
+    };
+    for (const auto& row : rows) {
+        Road road({.scenario = R"({"include": ")" VLN_SCENARIOS R"(/parts/cna.json", "server": )" +
+                               std::string(row.server) +
+                               R"(, "cards": [{"use": "cna", "functions": [{"use": "nic"}]}]})",
+                   .log = true});
+        const auto names = system_names(road);
+        EXPECT_GT(names.size(), 10u);
+        for (const std::string& name : names)
+            EXPECT_EQ(name, row.name);
+        const auto hosted = road.enumerate("VLNMPCA_EthernetPortSystemDevice");
+        ASSERT_EQ(hosted.size(), 1u);
+        EXPECT_TRUE(road.manager().get(hosted[0].path).ok());
+        const auto ports =
+            road.manager().associators(*hosted[0].property("GroupComponent")->as_reference(),
+                                       {"VLNMPCA_EthernetPortSystemDevice", "", "", ""});
+        ASSERT_EQ(ports.value.size(), 1u);
+        EXPECT_TRUE(road.manager().get(ports.value[0].path).ok());
+        road.close();
+        EXPECT_EQ(road.count_in_log(row.line), 1u) << row.line;
+    }
+}
+
 } // namespace

@@ -17,6 +17,29 @@ inline void expect_properties(const host::Instance& instance,
         EXPECT_EQ(text_of(instance, row.property), row.value) << row.property;
 }
 
+// The instance of a class whose property has the value; the test fails if there is none.
+inline host::Instance find(Road& road, const std::string& class_name, const char* property,
+                           const std::string& value) {
+    for (host::Instance& instance : road.enumerate(class_name))
+        if (text_of(instance, property) == value)
+            return std::move(instance);
+    ADD_FAILURE() << "no " << class_name << " with " << property << " " << value;
+    return {};
+}
+
+// Changes a value of the running host, as vlnsim_set_value.
+inline void set_value(const char* wwn, const char* table, const char* name, const char* value) {
+    char error[256] = "";
+    EXPECT_EQ(vlnsim_set_value(wwn, table, name, value, error, sizeof error), 0) << error;
+}
+
+// What a walk from an instance along an association finds.
+inline std::vector<host::Instance> walk(Road& road, const host::Instance& from, const char* via) {
+    auto reply = road.manager().associators(from.path, {via, "", "", ""});
+    EXPECT_TRUE(reply.ok()) << via;
+    return std::move(reply.value);
+}
+
 // A key of an end of an association; "-" if there is none.
 inline std::string end_of(const host::Instance& association, const char* role, const char* key) {
     const host::Value* value = association.property(role);

@@ -220,4 +220,29 @@ TEST_F(Simulated, HardwareChangesUnderARunningHost) {
     EXPECT_EQ(1, vlnsim_set_value("12", "features", "35", "1", error, sizeof error));
 }
 
+TEST_F(Simulated, DriverParametersComeInATableThatIsLargeEnough) {
+    start("fcoe-pair.json");
+    const AX_WWN wwn = wwn_of(1);
+    std::vector<AX_DriverParam> table(64);
+    std::uint32_t count = 59;
+    EXPECT_EQ(191u, LOCAL(AX_GetDriverParams)(wwn, table.data(), &count));
+    EXPECT_EQ(60u, count);
+    EXPECT_EQ(0, table[0].name[0]) << "nothing is written";
+    count = 61;
+    EXPECT_EQ(0u, LOCAL(AX_GetDriverParams)(wwn, table.data(), &count));
+    EXPECT_EQ(60u, count);
+    EXPECT_STREQ("nodev_tmo", table[0].name);
+    EXPECT_EQ(45u, table[0].current);
+    EXPECT_STREQ("tune_59", table[59].name);
+    EXPECT_EQ(0xA5, static_cast<std::uint8_t>(table[60].name[0])) << "room that is left is soiled";
+    EXPECT_EQ(0, table[61].name[0]) << "written beyond the stated room";
+    count = 64;
+    EXPECT_EQ(0u, LOCAL(AX_GetDriverParamsGlobal)(wwn, table.data(), &count));
+    EXPECT_EQ(2u, count);
+    EXPECT_EQ(251u, LOCAL(AX_GetDriverParams)(wwn_of(0), table.data(), &count)) << "a NIC";
+    EXPECT_TRUE(violations().empty());
+    EXPECT_EQ(4u, LOCAL(AX_GetDriverParams)(wwn, nullptr, &count));
+    EXPECT_EQ(1u, violations().size());
+}
+
 } // namespace

@@ -52,11 +52,19 @@ TEST_F(Simulated, EveryKeyIsDocumented) {
         R"({"initiator": {"loginOptions": {"?": 0}}})",
         R"({"network": {"?": 0}})",
         R"({"hba": {"?": 0}})",
+        R"({"driverParameters": [{"?": 0}]})",
         R"({"targets": {"?": 0}})",
         R"({"targets": {"type": "?"}})",
         R"({"targets": {"luns": {"?": 0}}})",
         R"({"targets": {"luns": {"identifier": {"?": 0}}}})",
         R"({"targets": {"luns": {"responses": {"?": 0}}}})",
+        R"({"iscsiTargets": {"?": 0}})",
+        R"({"iscsiTargets": {"luns": {"?": 0}}})",
+        R"({"iscsiTargets": {"sessions": {"?": 0}}})",
+        R"({"iscsiTargets": {"sessions": {"state": "?"}}})",
+        R"({"iscsiTargets": {"sessions": {"type": "?"}}})",
+        R"({"iscsiTargets": {"sessions": {"connectionState": "?"}}})",
+        R"({"iscsiTargets": {"sessions": {"counters": {"?": 0}}}})",
     };
     for (std::string object : objects) {
         const bool is_top = object.starts_with("{\"?\"") || object.starts_with("{\"libraries") ||

@@ -118,6 +118,25 @@ TEST_F(San, AMappingThatIsTooSmallTellsWhatItNeeds) {
     EXPECT_EQ(255u, whole.entry(255).ScsiId.ScsiOSLun);
 }
 
+TEST_F(San, AMappingGrowsAndGoesByUnitsWhereTheScenarioSaysSo) {
+    start_text(R"({"cards": [{"type": "fcoe", "model": "M", "wwpn": "1000024500000001",
+        "functions": [{}], "hba": {"order": "units"},
+        "targets": [{"number": 7, "luns": [{"count": 2}, {"fromCall": 2}]},
+                    {"number": 8, "luns": [{"vendor": {"bytes": "41FF"}}]}]}]})");
+    const HBA_HANDLE handle = open_adapter(0);
+    const std::string expected[] = {"7:0 8:0 7:1 ", "7:0 8:0 7:1 7:2 "};
+    for (const std::string& order : expected) {
+        Mapping mapping(8);
+        ASSERT_EQ(0u, HBA(HBA_GetFcpTargetMapping)(handle, mapping.get()));
+        std::string seen;
+        for (std::uint32_t i = 0; i < mapping.get()->NumberOfEntries; ++i)
+            seen += std::to_string(mapping.entry(i).ScsiId.ScsiTargetNumber) + ":" +
+                    std::to_string(mapping.entry(i).ScsiId.ScsiOSLun) + " ";
+        EXPECT_EQ(order, seen);
+        EXPECT_EQ("A\xFF      ", inquire(handle, mapping.entry(1), 0, 0, 16).response.substr(8));
+    }
+}
+
 TEST_F(San, UnitsAnswerInquiriesOfTheirType) {
     start("san-4096-luns.json");
     const HBA_HANDLE handle = open_adapter(1);
@@ -136,7 +155,7 @@ TEST_F(San, UnitsAnswerInquiriesOfTheirType) {
     std::set<int> types;
     for (std::uint32_t i = 0; i < 16; ++i)
         types.insert(inquire(handle, mapping.entry(i), 0, 0, 1).response[0]);
-    EXPECT_EQ((std::set<int>{0, 1, 2, 3, 4, 5, 6, 7, 8, 12, 13, 14, 31}), types);
+    EXPECT_EQ((std::set<int>{0, 1, 3, 4, 5, 6, 7, 8, 12, 13, 14, 17, 31}), types);
     // A tape has no capacity to read: illegal request, invalid command.
     const Answer tape = read_capacity(handle, mapping.entry(3));
     EXPECT_EQ(HBA_STATUS_SCSI_CHECK_CONDITION, tape.status);

@@ -56,6 +56,8 @@ const Bad_Scenario bad_scenarios[] = {
      "f.json:1: cards[0].flags: a number from 0 to 4294967295 is wanted"},
     {"{\"cards\": [{" NIC ", \"flags\": \"seven\", \"functions\": [{}]}]}",
      "f.json:1: cards[0].flags: \"seven\" is not a number"},
+    {"{\"server\": {\"address\": \"2001:db8::7\"}}",
+     "f.json:1: server.address: \"2001:db8::7\" is not an IPv4 address"},
     {"{\"cards\": [{" NIC ", \"network\": {\"address\": \"300.1.2.3\"}, \"functions\": [{}]}]}",
      "f.json:1: cards[0].network.address: \"300.1.2.3\" is not an IPv4 or IPv6 address"},
     {"{\"cards\": [{" NIC ", \"vpd\": {\"PNX\": \"1\"}, \"functions\": [{}]}]}",

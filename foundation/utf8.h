@@ -1,0 +1,19 @@
+// Text that may be no text: what devices tell comes as bytes, and goes to a client as UTF-8.
+#ifndef FOUNDATION_UTF8_H
+#define FOUNDATION_UTF8_H
+
+#include <string>
+#include <string_view>
+
+namespace cimple {
+
+// Whether the bytes are well-formed UTF-8 (RFC 3629). A zero is a character like others.
+bool is_utf8(std::string_view bytes) noexcept;
+
+// The bytes as well-formed UTF-8: each one that is no part of a well-formed sequence becomes the
+// replacement character U+FFFD, so that a reader sees where and how many.
+std::string to_utf8(std::string_view bytes);
+
+} // namespace cimple
+
+#endif // FOUNDATION_UTF8_H

@@ -4,9 +4,9 @@ namespace cimple {
 
 namespace {
 
-// Sets the next reference of the association, from the given feature on, to a clone of the end.
-// Answers the feature after it, or -1 if there is none left or the end does not fit.
-sint32 set_reference(Instance* association, uint32 feature, const Instance* end) {
+// Sets the next reference of the association, from the given feature on, to the end. Answers the
+// feature after it, or -1 if there is none left or the end does not fit.
+sint32 set_reference(Instance* association, uint32 feature, Ref<Instance> end) {
     const Meta_Class* meta_class = association->__meta_class;
     for (; feature < meta_class->num_meta_features; ++feature) {
         const Meta_Feature* candidate = meta_class->meta_features[feature];
@@ -15,15 +15,15 @@ sint32 set_reference(Instance* association, uint32 feature, const Instance* end)
         const auto* description = static_cast<const Meta_Reference*>(candidate);
         if (!is_subclass(description->meta_class, end->__meta_class))
             return -1;
-        reference(association, description) = clone(end);
+        reference(association, description) = end.release();
         return static_cast<sint32>(feature + 1);
     }
     return -1;
 }
 
-bool set_ends(Instance* association, std::span<const Instance* const> ends) {
+bool set_ends(Instance* association, std::span<const Ref<Instance>> ends) {
     sint32 feature = 0;
-    for (const Instance* end : ends) {
+    for (const Ref<Instance>& end : ends) {
         if (end)
             feature = set_reference(association, static_cast<uint32>(feature), end);
         if (!end || feature < 0)
@@ -57,11 +57,15 @@ Instance* insert_instance(Instance_Map_Base& store, Ref<Instance> instance,
 
 Instance* associate(Instance_Map_Base& store, const Instance* first, const Instance* second,
                     const Insert_Failure& failure) {
-    const Instance* const ends[] = {first, second};
+    const Ref<Instance> ends[] = {association_end(first), association_end(second)};
     return associate(store, ends, failure);
 }
 
-Instance* associate(Instance_Map_Base& store, std::span<const Instance* const> ends,
+Ref<Instance> association_end(const Instance* instance) {
+    return Ref<Instance>(instance ? clone(instance) : nullptr);
+}
+
+Instance* associate(Instance_Map_Base& store, std::span<const Ref<Instance>> ends,
                     const Insert_Failure& failure) {
     Ref<Instance> association(make_instance(store.meta_class()));
     if (!association) {

@@ -49,8 +49,12 @@ T* insert_instance(Instance_Map<T>& store, Ref<T> instance, const Insert_Failure
 Instance* associate(Instance_Map_Base& store, const Instance* first, const Instance* second,
                     const Insert_Failure& failure = {});
 
-// The same for an association of any number of ends.
-Instance* associate(Instance_Map_Base& store, std::span<const Instance* const> ends,
+// What an association holds of an end: a clone, taken now. Null for no instance.
+Ref<Instance> association_end(const Instance* instance);
+
+// The same for any number of ends that are clones already. Associations may share them: an end is
+// never changed, so that thousands of paths to one target need no more than one.
+Instance* associate(Instance_Map_Base& store, std::span<const Ref<Instance>> ends,
                     const Insert_Failure& failure = {});
 
 // The same for two ends after a line that tells the class and, in the text, who is joined.

@@ -42,14 +42,9 @@ String inquiry_of(const Target& unit) {
 
 // One line for a unit, however many of its texts are none.
 void warn_of_wild_bytes(const Target& unit) {
-    for (const std::string* part :
-         {&unit.vendor, &unit.product, &unit.revision, &unit.serialNumber, &unit.osDeviceName}) {
-        if (is_utf8(*part))
-            continue;
+    if (!are_utf8({unit.vendor, unit.product, unit.revision, unit.serialNumber, unit.osDeviceName}))
         VLN_LOG(VLN_ERR, "Texts of unit %u of target %s are no UTF-8: bytes were replaced",
                 unit.scsiOSLun, unit.portWWN.c_str());
-        return;
-    }
 }
 
 Ref<VLNMPCA_SCSIProtocolEndpoint> endpoint_instance(const Target& first_unit, const String& key,
@@ -99,8 +94,8 @@ Logical_Unit logical_unit(const Target& unit, const String& initiator_port) {
 } // namespace
 
 struct FC_SAN_Maps::FC_Initiator {
-    String port_name;         // 16 digits
-    const Instance* endpoint; // in its store; null for a port that the adapter pass left out
+    String port_name;  // 16 digits
+    Ref<Instance> end; // of the paths; null for a port that the adapter pass left out
 };
 
 std::vector<SCSI_Target> group_units(Port& port) {
@@ -121,7 +116,8 @@ FC_SAN_Maps::FC_SAN_Maps(ProviderAgent& agent)
 FC_SAN_Maps::FC_Initiator FC_SAN_Maps::findInitiator(Port& port) const {
     const String name = text(port.getPortName());
     const auto key = initiator_key(name, *_system);
-    return {name, _agent.m_VLNMPCA_SCSIProtocolInitiatorEndpoint_map.lookup(key.get())};
+    return {name,
+            association_end(_agent.m_VLNMPCA_SCSIProtocolInitiatorEndpoint_map.lookup(key.get()))};
 }
 
 void FC_SAN_Maps::createTargets(Port& port) {
@@ -134,12 +130,16 @@ void FC_SAN_Maps::createTargets(Port& port) {
     VLN_LOG(VLN_DBG, "Checking Number of target instance.");
     const FC_Initiator initiator = findInitiator(port);
     const auto targets = group_units(port);
+    Logical_Unit_Maps units(_agent, _system);
     for (std::size_t i = 0; i < targets.size(); ++i) {
         VLN_LOG(VLN_DBG, "Creating classes for target %d of %d.", static_cast<int>(i + 1),
                 static_cast<int>(targets.size()));
-        const auto* endpoint = createTarget(initiator, *targets[i].front());
+        const Target& first = *targets[i].front();
+        const Unit_Path path = {
+            Unit_Transport::FC, initiator.end, association_end(createTarget(initiator, first)),
+            format_text("%s:%s", initiator.port_name.c_str(), first.portWWN.c_str())};
         for (const Target* unit : targets[i])
-            createUnit(initiator, endpoint, *unit);
+            createUnit(units, path, initiator, *unit);
     }
 }
 
@@ -156,14 +156,13 @@ const VLNMPCA_SCSIProtocolEndpoint* FC_SAN_Maps::createTarget(const FC_Initiator
     return endpoint.get(); // which the store keeps alive
 }
 
-void FC_SAN_Maps::createUnit(const FC_Initiator& initiator,
-                             const VLNMPCA_SCSIProtocolEndpoint* target, const Target& unit) {
+void FC_SAN_Maps::createUnit(Logical_Unit_Maps& units, const Unit_Path& path,
+                             const FC_Initiator& initiator, const Target& unit) {
     VLN_LOG(VLN_DBG, "Target %d is of type %d.", static_cast<int>(unit.scsiOSLun),
             static_cast<int>(unit.deviceType));
     warn_of_wild_bytes(unit);
     const Logical_Unit device = logical_unit(unit, initiator.port_name);
-    Logical_Unit_Maps maps(_agent, _system);
-    maps.joinPath(Unit_Transport::FC, device, maps.findOrMake(device), initiator.endpoint, target);
+    units.joinPath(path, device, units.findOrMake(device));
 }
 
 } // namespace cimple

@@ -14,6 +14,7 @@ namespace cimple {
 class Logical_Unit_Maps;
 class Port;
 class Target;
+struct Unit_Path;
 
 // A target of a port, with its units in the order in which the port lists them.
 using SCSI_Target = std::vector<const Target*>;
@@ -34,7 +35,7 @@ private:
     FC_Initiator findInitiator(Port& port) const;
     const VLNMPCA_SCSIProtocolEndpoint* createTarget(const FC_Initiator& initiator,
                                                      const Target& first_unit);
-    void createUnit(const FC_Initiator& initiator, const VLNMPCA_SCSIProtocolEndpoint* target,
+    void createUnit(Logical_Unit_Maps& units, const Unit_Path& path, const FC_Initiator& initiator,
                     const Target& unit);
 
     ProviderAgent& _agent;

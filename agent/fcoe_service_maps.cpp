@@ -130,9 +130,7 @@ uint32 FCoE_Map_Builder::createDriverIdentity() {
             adapter->Manufacturer.c_str());
     const auto* identity = insert_instance(
         _agent.m_VLNMPCA_SoftwareIdentity_map,
-        driver_identity_instance({"FCoE Driver", "Vorlan FCoE Driver", "VLN FCoE",
-                                  text(adapter->DriverName), text(adapter->DriverVersion),
-                                  text(adapter->Manufacturer)}));
+        driver_identity_instance({"FCoE Driver", "Vorlan FCoE Driver", "VLN FCoE"}, *adapter));
     if (!identity) {
         VLN_LOG(VLN_DBG, "CreateDriverIdentity failed");
         return MAP_OK;

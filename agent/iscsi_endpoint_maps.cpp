@@ -4,6 +4,7 @@
 #include "agent/associations.h"
 #include "agent/ip_interface_maps.h"
 #include "agent/iscsi_maps.h"
+#include "agent/port_name.h"
 #include "agent/state_tables.h"
 #include "agent/text.h"
 #include "classes/VLNMPCA_IPProtocolEndpoint.h"
@@ -13,8 +14,7 @@ namespace cimple {
 
 namespace {
 
-constexpr uint32 ISCSI_TCP_PORT = 3260; // RFC 7143
-constexpr uint16 IF_TYPE_TCP = 4111;    // CIM_TCPProtocolEndpoint.ProtocolIFType
+constexpr uint16 IF_TYPE_TCP = 4111; // CIM_TCPProtocolEndpoint.ProtocolIFType
 
 // What all endpoints of a port have in common.
 template <class Endpoint>
@@ -34,8 +34,7 @@ Ref<VLNMPCA_TCPProtocolEndpoint> tcp_endpoint_instance(const iSCSIPortAttributes
                                                        const CIM_ComputerSystem& system) {
     auto endpoint = endpoint_instance<VLNMPCA_TCPProtocolEndpoint>(
         "VLNMPCA_TCPProtocolEndpoint", attributes.FunctionalPortState, system);
-    const String name =
-        format_text("VLN:TCP Endpoint:%s:%d", port_name.c_str(), static_cast<int>(ISCSI_TCP_PORT));
+    const String name = tcp_endpoint_name(port_name);
     endpoint->Name.set(name);
     endpoint->ElementName.set(name);
     endpoint->ProtocolIFType.set(IF_TYPE_TCP);

@@ -84,9 +84,7 @@ void ISCSI_Map_Builder::createDriverIdentity() {
 uint32 ISCSI_Map_Builder::CreateISCSIDriverIdentity(const iSCSIAdapterAttributes& attributes) {
     _driver = insert_instance(
         _agent.m_VLNMPCA_SoftwareIdentity_map,
-        driver_identity_instance({"CNA iSCSI Driver", "Vorlan CNA Driver", "VLN CNA",
-                                  text(attributes.DriverName), text(attributes.DriverVersion),
-                                  text(attributes.Manufacturer)}));
+        driver_identity_instance({"CNA iSCSI Driver", "Vorlan CNA Driver", "VLN CNA"}, attributes));
     if (!_driver)
         return END_PASS;
     Profile_Maps(_agent).createSoftwareConforms("Driver, Software Inventory",

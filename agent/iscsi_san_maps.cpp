@@ -4,6 +4,7 @@
 #include "agent/iscsi_san_maps.h"
 
 #include "agent/iscsi_session_maps.h"
+#include "agent/port_name.h"
 #include "agent/store_search.h"
 #include "agent/text.h"
 #include "classes/CIM_ComputerSystem.h"
@@ -19,8 +20,6 @@
 namespace cimple {
 
 namespace {
-
-constexpr int ISCSI_TCP_PORT = 3260; // RFC 7143
 
 // A list of the library, which allocates as the caller of an operation frees.
 struct Free_List {
@@ -75,8 +74,7 @@ void ISCSI_SAN_Maps::findEnds(ISCSI_View& view) const {
         find_first(_agent.m_VLNMPCA_EthernetPort_map, [&](const VLNMPCA_EthernetPort& candidate) {
             return candidate.DeviceID.value == view.port_name;
         });
-    const String endpoint =
-        format_text("VLN:TCP Endpoint:%s:%d", view.port_name.c_str(), ISCSI_TCP_PORT);
+    const String endpoint = tcp_endpoint_name(view.port_name);
     view.tcp_endpoint = find_first(_agent.m_VLNMPCA_TCPProtocolEndpoint_map,
                                    [&](const VLNMPCA_TCPProtocolEndpoint& candidate) {
                                        return candidate.ElementName.value == endpoint;

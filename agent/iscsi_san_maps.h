@@ -50,7 +50,8 @@ private:
     // iscsi_unit_maps.cpp
     uint32 createTarget(const ISCSI_View& view, const ISCSI_Target& target);
     void createUnits(const ISCSI_View& view, const ISCSI_Target& target,
-                     const AX_iSCSI_LunList& luns, const Instance* target_endpoint);
+                     const AX_iSCSI_LunList& luns,
+                     const VLNMPCA_iSCSITargetProtocolEndpoint* target_endpoint);
 
     ProviderAgent& _agent;
 };

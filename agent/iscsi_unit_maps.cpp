@@ -58,14 +58,10 @@ struct Told_Texts {
 // One line for a unit, however many of its texts are none.
 void warn_of_wild_bytes(const ISCSI_Target& target, const Told_Unit& unit,
                         const Told_Texts& texts) {
-    for (const std::string* part : {&unit.words, &texts.vendor, &texts.product, &texts.revision,
-                                    &texts.serial, &texts.os_device_name}) {
-        if (is_utf8(*part))
-            continue;
+    if (!are_utf8({unit.words, texts.vendor, texts.product, texts.revision, texts.serial,
+                   texts.os_device_name}))
         VLN_LOG(VLN_ERR, "Texts of LUN %d of target %s are no UTF-8: bytes were replaced",
                 static_cast<int>(unit.number), target.name.c_str());
-        return;
-    }
 }
 
 Logical_Unit logical_unit(const ISCSI_Target& target, const Told_Unit& unit) {
@@ -86,6 +82,18 @@ Logical_Unit logical_unit(const ISCSI_Target& target, const Told_Unit& unit) {
             .capacity = properties.blockCount * properties.blockSize,
             .block_size = properties.blockSize,
             .number_of_blocks = properties.blockCount};
+}
+
+// One from each endpoint that has a session with the target.
+std::vector<Unit_Path> paths_to(const ISCSI_Target& target,
+                                const VLNMPCA_iSCSITargetProtocolEndpoint* endpoint) {
+    std::vector<Unit_Path> paths;
+    const auto end = association_end(endpoint);
+    for (const auto* initiator : target.initiators)
+        paths.push_back(
+            {Unit_Transport::ISCSI, association_end(initiator), end,
+             format_text("%s:%s", initiator->Name.value.c_str(), endpoint->Name.value.c_str())});
+    return paths;
 }
 
 } // namespace
@@ -118,11 +126,13 @@ uint32 ISCSI_SAN_Maps::createTarget(const ISCSI_View& view, const ISCSI_Target& 
 // A unit that two ports see stands once, with a path from each. Without a usable session with the
 // target there is nothing that a path could begin at.
 void ISCSI_SAN_Maps::createUnits(const ISCSI_View& view, const ISCSI_Target& target,
-                                 const AX_iSCSI_LunList& luns, const Instance* target_endpoint) {
+                                 const AX_iSCSI_LunList& luns,
+                                 const VLNMPCA_iSCSITargetProtocolEndpoint* target_endpoint) {
     if (target.initiators.empty())
         VLN_LOG(VLN_DBG, "No open session with target %s: its LUNs have no paths",
                 target.name.c_str());
     Logical_Unit_Maps maps(_agent, view.system);
+    const auto paths = paths_to(target, target_endpoint);
     for (uint32 i = 0; i < luns.count; ++i) {
         Told_Unit told{};
         told.index = i;
@@ -136,9 +146,9 @@ void ISCSI_SAN_Maps::createUnits(const ISCSI_View& view, const ISCSI_Target& tar
         VLN_LOG(VLN_DBG, "iSCSI Target %zu LUN %zu is of type %d.", target.index, told.index,
                 static_cast<int>(told.properties.deviceType));
         const Logical_Unit unit = logical_unit(target, told);
-        const auto* device = maps.findOrMake(unit);
-        for (const auto* initiator : target.initiators)
-            maps.joinPath(Unit_Transport::ISCSI, unit, device, initiator, target_endpoint);
+        const auto device = maps.findOrMake(unit);
+        for (const Unit_Path& path : paths)
+            maps.joinPath(path, unit, device);
     }
 }
 

@@ -4,7 +4,6 @@
 #include "agent/text.h"
 #include "classes/CIM_ComputerSystem.h"
 #include "classes/CIM_SCSIInitiatorTargetLogicalUnitPath.h"
-#include "classes/CIM_ServiceAccessPoint.h"
 #include "classes/VLNMPCA_LogicalDisk.h"
 #include "classes/VLNMPCA_SCSIArbitraryLogicalUnit.h"
 #include "classes/VLNMPCA_StorageExtent.h"
@@ -214,11 +213,6 @@ constexpr const Peripheral_Type& find_peripheral_type(uint32 type) {
     return UNKNOWN_TYPE;
 }
 
-const char* name_of(const Instance* endpoint) {
-    const auto* point = cast<CIM_ServiceAccessPoint>(endpoint);
-    return point ? point->Name.value.c_str() : "";
-}
-
 void describe_path(CIM_SCSIInitiatorTargetLogicalUnitPath& path, const Logical_Unit& unit) {
     if (!unit.os_device_name.empty())
         path.OSDeviceName.set(unit.os_device_name);
@@ -233,35 +227,39 @@ String logical_unit_name(uint32 peripheral_type, uint64 number) {
                        static_cast<unsigned long long>(number));
 }
 
-const CIM_LogicalDevice* Logical_Unit_Maps::findOrMake(const Logical_Unit& unit) {
+Logical_Unit_Maps::Logical_Unit_Maps(ProviderAgent& agent, const CIM_ComputerSystem* system)
+    : _agent(agent), _system(system), _system_end(association_end(system)) {}
+
+Ref<Instance> Logical_Unit_Maps::findOrMake(const Logical_Unit& unit) {
     const Unit_Class& unit_class = find_peripheral_type(unit.peripheral_type).unit_class;
     Instance_Map_Base& store = _agent.store(unit_class.store);
     const Ref<Instance> device = unit_class.make(unit, *_system);
     if (!insert_instance(store, device))
-        return cast<CIM_LogicalDevice>(store.lookup(device.get()));
-    associate_as(_agent.store(unit_class.system_device),
-                 format_text("%s: %s", unit_class.text, unit.device_id.c_str()), _system,
-                 device.get());
-    return cast<CIM_LogicalDevice>(device.get()); // which the store keeps alive
+        return association_end(store.lookup(device.get()));
+    Instance_Map_Base& system_devices = _agent.store(unit_class.system_device);
+    VLN_LOG(VLN_DBG, "Generating %s (%s: %s)", system_devices.meta_class()->name, unit_class.text,
+            unit.device_id.c_str());
+    const Ref<Instance> ends[] = {_system_end, association_end(device.get())};
+    associate(system_devices, ends);
+    return ends[1];
 }
 
-bool Logical_Unit_Maps::joinPath(Unit_Transport transport, const Logical_Unit& unit,
-                                 const CIM_LogicalDevice* device, const Instance* initiator,
-                                 const Instance* target) {
-    if (!initiator) {
+bool Logical_Unit_Maps::joinPath(const Unit_Path& path, const Logical_Unit& unit,
+                                 const Ref<Instance>& device) {
+    if (!path.initiator) {
         VLN_LOG(VLN_ERR, "Could not find VLNMPCA_SCSIProtocolEndpoint Initiator instance.");
         return false;
     }
     const Unit_Class& unit_class = find_peripheral_type(unit.peripheral_type).unit_class;
-    Instance_Map_Base& store =
-        _agent.store(transport == Unit_Transport::FC ? unit_class.fc_path : unit_class.iscsi_path);
-    VLN_LOG(VLN_DBG, "creating %s - %s:%s:%d", store.meta_class()->name, name_of(initiator),
-            name_of(target), static_cast<int>(unit.number));
-    const Instance* const ends[] = {initiator, target, device};
-    auto* path = cast<CIM_SCSIInitiatorTargetLogicalUnitPath>(associate(store, ends));
-    if (path)
-        describe_path(*path, unit);
-    return path != nullptr;
+    Instance_Map_Base& store = _agent.store(
+        path.transport == Unit_Transport::FC ? unit_class.fc_path : unit_class.iscsi_path);
+    VLN_LOG(VLN_DBG, "creating %s - %s:%d", store.meta_class()->name, path.ends.c_str(),
+            static_cast<int>(unit.number));
+    const Ref<Instance> ends[] = {path.initiator, path.target, device};
+    auto* joined = cast<CIM_SCSIInitiatorTargetLogicalUnitPath>(associate(store, ends));
+    if (joined)
+        describe_path(*joined, unit);
+    return joined != nullptr;
 }
 
 } // namespace cimple

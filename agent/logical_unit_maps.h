@@ -7,7 +7,6 @@
 #define VLN_AGENT_LOGICAL_UNIT_MAPS_H
 
 #include "agent/provider_agent.h"
-#include "classes/CIM_LogicalDevice.h"
 
 #include <optional>
 
@@ -34,25 +33,33 @@ String logical_unit_name(uint32 peripheral_type, uint64 number);
 
 enum class Unit_Transport : uint8 { FC, ISCSI };
 
+// The way from an initiator to a target, which the paths to all units of the target share.
+struct Unit_Path {
+    Unit_Transport transport;
+    Ref<Instance> initiator; // as association_end() makes it; null for a missing one
+    Ref<Instance> target;
+    String ends; // "initiator:target", for the log
+};
+
+// One serves any number of units.
 class Logical_Unit_Maps {
 public:
     // The system stands in its store: no unit can be named without it.
-    Logical_Unit_Maps(ProviderAgent& agent, const CIM_ComputerSystem* system)
-        : _agent(agent), _system(system) {}
+    Logical_Unit_Maps(ProviderAgent& agent, const CIM_ComputerSystem* system);
 
-    // The unit in the store of its class, tied to the computer system. The one that stands there
-    // already, after the line of a failed insertion, for a unit that two ports see under one key.
-    const CIM_LogicalDevice* findOrMake(const Logical_Unit& unit);
+    // Puts the unit into the store of its class and ties it to the computer system. Answers it as
+    // the end of an association; for a unit that two ports see under one key the one that stands
+    // there already, after the line of a failed insertion.
+    Ref<Instance> findOrMake(const Logical_Unit& unit);
 
-    // The path from an initiator to a unit that findOrMake answered. False, with a line in the log,
-    // if an end is null or the path stands already.
-    bool joinPath(Unit_Transport transport, const Logical_Unit& unit,
-                  const CIM_LogicalDevice* device, const Instance* initiator,
-                  const Instance* target);
+    // The path to a unit that findOrMake answered. False, with a line in the log, if an end is
+    // missing or the path stands already.
+    bool joinPath(const Unit_Path& path, const Logical_Unit& unit, const Ref<Instance>& device);
 
 private:
     ProviderAgent& _agent;
     const CIM_ComputerSystem* _system;
+    Ref<Instance> _system_end;
 };
 
 } // namespace cimple

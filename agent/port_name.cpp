@@ -30,4 +30,9 @@ String physical_port_name(const AdapterAttributes& adapter) {
     return format_text("%s:%d", adapter.SerialNumber.c_str(), static_cast<int>(adapter.PortNumber));
 }
 
+String tcp_endpoint_name(const String& port_name) {
+    return format_text("VLN:TCP Endpoint:%s:%d", port_name.c_str(),
+                       static_cast<int>(ISCSI_TCP_PORT));
+}
+
 } // namespace cimple

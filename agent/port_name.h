@@ -18,6 +18,11 @@ String asic_name(const AdapterAttributes& adapter);
 // The physical port of a function, which functions of all kinds on it share: "serial:port number".
 String physical_port_name(const AdapterAttributes& adapter);
 
+inline constexpr uint16 ISCSI_TCP_PORT = 3260; // RFC 7143
+
+// The TCP endpoint of an iSCSI port.
+String tcp_endpoint_name(const String& port_name);
+
 } // namespace cimple
 
 #endif // VLN_AGENT_PORT_NAME_H

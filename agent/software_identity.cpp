@@ -82,20 +82,22 @@ void append_identity(CIM_SoftwareIdentity& software, const char* type, const Str
     software.IdentityInfoValue.append(value);
 }
 
-Ref<VLNMPCA_SoftwareIdentity> driver_identity_instance(const Driver& driver) {
+Ref<VLNMPCA_SoftwareIdentity> driver_identity_instance(const Driver_Texts& texts,
+                                                       const CNAAdapterAttributes& adapter) {
     auto identity = make_instance<VLNMPCA_SoftwareIdentity>();
-    const String name = format_text("%s v%s", driver.name.c_str(), driver.version.c_str());
-    identity->Description.set(driver.description);
+    const String name =
+        format_text("%s v%s", adapter.DriverName.c_str(), adapter.DriverVersion.c_str());
+    identity->Description.set(texts.description);
     identity->ElementName.set(name);
     identity->Name.set(name);
-    identity->InstanceID.set(format_text("%s: Driver %s", driver.id_head, name.c_str()));
-    identity->VersionString.set(driver.version);
-    identity->Manufacturer.set(driver.manufacturer);
+    identity->InstanceID.set(format_text("%s: Driver %s", texts.id_head, name.c_str()));
+    identity->VersionString.set(text(adapter.DriverVersion));
+    identity->Manufacturer.set(text(adapter.Manufacturer));
     identity->Classifications.append(SOFTWARE_DRIVER);
-    identity->ClassificationDescriptions.append(String(driver.kind));
+    identity->ClassificationDescriptions.append(String(texts.kind));
     identity->IsEntity.set(true);
-    append_identity(*identity, "VORLAN:DRIVER_NAME", driver.name);
-    append_identity(*identity, "VORLAN:DRIVER_VERSION", driver.version);
+    append_identity(*identity, "VORLAN:DRIVER_NAME", text(adapter.DriverName));
+    append_identity(*identity, "VORLAN:DRIVER_VERSION", text(adapter.DriverVersion));
     return identity;
 }
 

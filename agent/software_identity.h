@@ -27,16 +27,15 @@ enum Software_Status : uint16 { // CIM_ElementSoftwareIdentity.ElementSoftwareSt
 // Who a software is besides its key: one pair of type and value.
 void append_identity(CIM_SoftwareIdentity& software, const char* type, const String& value);
 
-struct Driver {
+// How the driver of a kind of function is named.
+struct Driver_Texts {
     const char* kind;        // "CNA Driver"
     const char* description; // "Vorlan CNA Driver"
     const char* id_head;     // of the key, before name and version: "VLN CNA"
-    String name;
-    String version;
-    String manufacturer;
 };
 
-Ref<VLNMPCA_SoftwareIdentity> driver_identity_instance(const Driver& driver);
+Ref<VLNMPCA_SoftwareIdentity> driver_identity_instance(const Driver_Texts& texts,
+                                                       const CNAAdapterAttributes& adapter);
 
 // The firmware of the adapter's ASIC, or null: the functions of an ASIC share it
 // (firmware_maps.cpp).

@@ -112,9 +112,8 @@ uint32 Adapter_Map_Builder::createDriverIdentity() {
 uint32 Adapter_Map_Builder::CreateDriverIdentity(NICAdapter& adapter) {
     const auto& attributes =
         static_cast<const NICAdapterAttributes&>(*adapter.getAdapterAttributes());
-    auto driver = driver_identity_instance(
-        {"CNA Driver", "Vorlan CNA Driver", "VLN CNA", text(attributes.DriverName),
-         text(attributes.DriverVersion), text(attributes.Manufacturer)});
+    auto driver =
+        driver_identity_instance({"CNA Driver", "Vorlan CNA Driver", "VLN CNA"}, attributes);
     append_identity(*driver, "VORLAN:VNICD_DRIVER_TYPE",
                     format_text("%d", static_cast<int>(adapter.getDriverType())));
     const auto* identity = insert_instance(_agent.m_VLNMPCA_SoftwareIdentity_map, driver);

@@ -7,58 +7,16 @@
 // a function of the management library, with its binding and without; memory: resident kilobytes
 // after the first enumeration of a fresh process.
 #include "bench/bench_hooks.h"
+#include "bench/bench_program.h"
 #include "host/manager.h"
-#include "simulator/vlnsim.h"
-
-#include <dlfcn.h>
-#include <unistd.h>
 
 #include <cstdio>
 #include <cstdlib>
 #include <cstring>
-#include <filesystem>
 
 namespace {
 
 constexpr const char* CLASS_NAME = "VLNMPCA_EthernetPort";
-
-[[noreturn]] void fail(const std::string& text) {
-    std::fprintf(stderr, "bench_enumeration: %s\n", text.c_str());
-    std::exit(2);
-}
-
-void simulate() {
-    char error[512] = "";
-    char folder[] = "/tmp/vorlan-bench-XXXXXX";
-    if (!mkdtemp(folder))
-        fail("no temporary folder");
-    std::filesystem::create_directories(std::string(folder) + "/etc");
-    vlnsim_use_virtual_clock(1400000000ull * 1000000);
-    vlnsim_set_host_root(folder);
-    if (vlnsim_load_scenario(VLN_SCENARIOS "/two-port-cna.json", error, sizeof error) ||
-        vlnsim_open_libraries(error, sizeof error))
-        fail(error);
-}
-
-template <class Function>
-Function hook(const char* name) {
-    void* module = dlopen(VLN_BENCH_MODULE, RTLD_NOW);
-    void* symbol = module ? dlsym(module, name) : nullptr;
-    if (!symbol)
-        fail(dlerror());
-    return reinterpret_cast<Function>(symbol);
-}
-
-unsigned long resident_kilobytes() {
-    unsigned long size = 0;
-    unsigned long resident = 0;
-    if (std::FILE* file = std::fopen("/proc/self/statm", "r")) {
-        if (std::fscanf(file, "%lu %lu", &size, &resident) != 2)
-            resident = 0;
-        std::fclose(file);
-    }
-    return resident * static_cast<unsigned long>(sysconf(_SC_PAGESIZE)) / 1024;
-}
 
 } // namespace
 
@@ -85,7 +43,7 @@ int main(int argc, char** argv) {
     if (floor)
         setenv("VLN_FLOOR_INSTANCES", argv[2], 1);
     else
-        simulate();
+        simulate(read_scenario("two-port-cna.json"));
     const unsigned long before = resident_kilobytes();
     const char* module = floor              ? VLN_FLOOR_MODULE
                          : mode == "memory" ? VLN_SIMULATED_MODULE

@@ -7,10 +7,9 @@
 //
 // FACTOR multiplies the cards. What callgrind is to count stands in functions of its own.
 #include "bench/bench_hooks.h"
+#include "bench/bench_program.h"
 #include "host/manager.h"
-#include "simulator/vlnsim.h"
 
-#include <dlfcn.h>
 #include <malloc.h>
 
 #include <algorithm>
@@ -18,25 +17,15 @@
 #include <chrono>
 #include <cstdio>
 #include <cstdlib>
-#include <filesystem>
-#include <fstream>
-#include <sstream>
 #include <thread>
 
 namespace {
 
-constexpr const char* SCENARIO = VLN_SCENARIOS "/blade-16-functions.json";
-
-[[noreturn]] void fail(const std::string& text) {
-    std::fprintf(stderr, "bench_host: %s\n", text.c_str());
-    std::exit(2);
-}
+constexpr const char* SCENARIO = "blade-16-functions.json";
 
 // The scenario with each group of two cards multiplied.
 std::string scenario(unsigned factor) {
-    std::stringstream content;
-    content << std::ifstream(SCENARIO).rdbuf();
-    std::string text = content.str();
+    std::string text = read_scenario(SCENARIO);
     const std::string two = "\"count\": 2,";
     const std::string more = "\"count\": " + std::to_string(2 * factor) + ",";
     std::size_t replaced = 0;
@@ -47,28 +36,6 @@ std::string scenario(unsigned factor) {
     if (replaced != 2)
         fail("the scenario has another form than expected");
     return text;
-}
-
-void simulate(unsigned factor) {
-    char error[512] = "";
-    char folder[] = "/tmp/vorlan-bench-XXXXXX";
-    if (!mkdtemp(folder))
-        fail("no temporary folder");
-    std::filesystem::create_directories(std::string(folder) + "/etc");
-    vlnsim_use_virtual_clock(1400000000ull * 1000000);
-    vlnsim_set_host_root(folder);
-    if (vlnsim_load_scenario_text(scenario(factor).c_str(), SCENARIO, error, sizeof error) ||
-        vlnsim_open_libraries(error, sizeof error))
-        fail(error);
-}
-
-template <class Function>
-Function hook(const char* name) {
-    void* module = dlopen(VLN_BENCH_MODULE, RTLD_NOW);
-    void* symbol = module ? dlsym(module, name) : nullptr;
-    if (!symbol)
-        fail(dlerror());
-    return reinterpret_cast<Function>(symbol);
 }
 
 bool refresh() {
@@ -167,7 +134,7 @@ int main(int argc, char** argv) {
     if (argc != (mode == "walk" ? 4 : 3))
         fail("usage: bench_host walk names|instances FACTOR, or refresh|latency|memory FACTOR");
     mallopt(M_ARENA_MAX, 1); // all threads' memory in one count
-    simulate(static_cast<unsigned>(std::strtoul(argv[argc - 1], nullptr, 10)));
+    simulate(scenario(static_cast<unsigned>(std::strtoul(argv[argc - 1], nullptr, 10))));
     host::Options options;
     options.strict = false;
     host::Manager manager(options);

@@ -7,34 +7,21 @@
 //
 // What callgrind is to count stands in functions of its own.
 #include "bench/bench_hooks.h"
+#include "bench/bench_program.h"
 #include "host/manager.h"
-#include "simulator/vlnsim.h"
-
-#include <dlfcn.h>
-#include <unistd.h>
 
 #include <cstdio>
 #include <cstdlib>
-#include <filesystem>
-#include <fstream>
-#include <sstream>
 
 namespace {
 
-constexpr const char* SCENARIO = VLN_SCENARIOS "/san-4096-luns.json";
+constexpr const char* SCENARIO = "san-4096-luns.json";
 constexpr const char* VOLUME = "VLNMPCA_StorageVolume";
 constexpr unsigned TARGETS = 16; // in the scenario, of 256 units each
 
-[[noreturn]] void fail(const std::string& text) {
-    std::fprintf(stderr, "bench_san: %s\n", text.c_str());
-    std::exit(2);
-}
-
 // The scenario with another number of units.
 std::string san_of(unsigned units) {
-    std::stringstream content;
-    content << std::ifstream(SCENARIO).rdbuf();
-    std::string text = content.str();
+    std::string text = read_scenario(SCENARIO);
     const std::string as_it_is = "\"luns\": 256,";
     const std::size_t at = text.find(as_it_is);
     if (at == std::string::npos || units % TARGETS != 0)
@@ -47,39 +34,6 @@ std::string volumes(unsigned count) {
     return R"({"include": "parts/cna.json", "cards": [{"use": "cna", "functions": [{"use": "nic"},
         {"use": "fcoe", "targets": {"luns": )" +
            std::to_string(count) + R"(, "wwpn": "50:25:64:C0:00:00:00:01"}}]}]})";
-}
-
-void simulate(const std::string& scenario) {
-    char error[512] = "";
-    char folder[] = "/tmp/vorlan-bench-XXXXXX";
-    if (!mkdtemp(folder))
-        fail("no temporary folder");
-    std::filesystem::create_directories(std::string(folder) + "/etc");
-    vlnsim_use_virtual_clock(1400000000ull * 1000000);
-    vlnsim_set_host_root(folder);
-    if (vlnsim_load_scenario_text(scenario.c_str(), SCENARIO, error, sizeof error) ||
-        vlnsim_open_libraries(error, sizeof error))
-        fail(error);
-}
-
-template <class Function>
-Function hook(const char* name) {
-    void* module = dlopen(VLN_BENCH_MODULE, RTLD_NOW);
-    void* symbol = module ? dlsym(module, name) : nullptr;
-    if (!symbol)
-        fail(dlerror());
-    return reinterpret_cast<Function>(symbol);
-}
-
-unsigned long resident_kilobytes() {
-    unsigned long size = 0;
-    unsigned long resident = 0;
-    if (std::FILE* file = std::fopen("/proc/self/statm", "r")) {
-        if (std::fscanf(file, "%lu %lu", &size, &resident) != 2)
-            resident = 0;
-        std::fclose(file);
-    }
-    return resident * static_cast<unsigned long>(sysconf(_SC_PAGESIZE)) / 1024;
 }
 
 } // namespace

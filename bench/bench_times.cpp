@@ -1,37 +1,17 @@
 // Wall-clock times, for orientation: they vary with the machine, the instruction counts do not.
 #include "bench/bench_hooks.h"
+#include "bench/bench_program.h"
 #include "host/manager.h"
-#include "simulator/vlnsim.h"
 
 #include <benchmark/benchmark.h>
 
 #include <dlfcn.h>
 #include <stdlib.h>
 
-#include <filesystem>
 #include <memory>
 #include <string>
 
 namespace {
-
-void simulate(const char* scenario) {
-    static const std::string root = [] {
-        char folder[] = "/tmp/vorlan-bench-XXXXXX";
-        const char* made = mkdtemp(folder);
-        std::filesystem::create_directories(std::string(made ? made : "/tmp") + "/etc");
-        return std::string(made ? made : "/tmp");
-    }();
-    char error[512] = "";
-    vlnsim_reset();
-    vlnsim_use_virtual_clock(1400000000ull * 1000000);
-    vlnsim_set_host_root(root.c_str());
-    if (vlnsim_load_scenario((std::string(VLN_SCENARIOS "/") + scenario).c_str(), error,
-                             sizeof error) ||
-        vlnsim_open_libraries(error, sizeof error)) {
-        std::fprintf(stderr, "%s\n", error);
-        std::exit(2);
-    }
-}
 
 void load_module(benchmark::State& state) {
     for (auto _ : state) {
@@ -44,7 +24,7 @@ BENCHMARK(load_module)->Unit(benchmark::kMicrosecond);
 
 // From the first call of a fresh agent, with its scan of the adapters, to the answer.
 void first_enumeration(benchmark::State& state) {
-    simulate("two-port-cna.json");
+    simulate(read_scenario("two-port-cna.json"));
     host::Manager manager;
     manager.load(VLN_SIMULATED_MODULE);
     for (auto _ : state) {
@@ -57,7 +37,7 @@ void first_enumeration(benchmark::State& state) {
 BENCHMARK(first_enumeration)->Unit(benchmark::kMicrosecond);
 
 void enumeration_from_the_cache(benchmark::State& state) {
-    simulate("two-port-cna.json");
+    simulate(read_scenario("two-port-cna.json"));
     host::Manager manager;
     manager.load(VLN_SIMULATED_MODULE);
     manager.enumerate("VLNMPCA_EthernetPort");
@@ -67,21 +47,15 @@ void enumeration_from_the_cache(benchmark::State& state) {
 BENCHMARK(enumeration_from_the_cache)->Unit(benchmark::kMicrosecond);
 
 // So many calls of a function of the management library, with its binding and without.
-void library_calls(benchmark::State& state, const char* hook) {
-    simulate("two-port-cna.json");
+void library_calls(benchmark::State& state, const char* name) {
+    simulate(read_scenario("two-port-cna.json"));
     host::Manager manager;
     manager.load(VLN_BENCH_MODULE);
     manager.enumerate("VLNMPCA_Card");
-    void* module = dlopen(VLN_BENCH_MODULE, RTLD_NOW);
-    const auto work = reinterpret_cast<void (*)()>(module ? dlsym(module, hook) : nullptr);
-    if (!work) {
-        state.SkipWithError("no such hook");
-        return;
-    }
+    const auto work = hook<void (*)()>(name);
     for (auto _ : state)
         work();
     state.SetItemsProcessed(static_cast<int64_t>(state.iterations()) * VLN_BENCH_CALLS);
-    dlclose(module);
 }
 BENCHMARK_CAPTURE(library_calls, bound, "vln_bench_bound_calls");
 BENCHMARK_CAPTURE(library_calls, direct, "vln_bench_direct_calls");

@@ -2,6 +2,7 @@
 
 #include "cimple/types.h"
 
+#include <algorithm>
 #include <cstring>
 
 namespace cimple {
@@ -79,6 +80,10 @@ std::size_t text_prefix(std::string_view bytes) {
 
 bool is_utf8(std::string_view bytes) noexcept {
     return text_prefix(bytes) == bytes.size();
+}
+
+bool are_utf8(std::initializer_list<std::string_view> texts) noexcept {
+    return std::all_of(texts.begin(), texts.end(), is_utf8);
 }
 
 std::string to_utf8(std::string_view bytes) {

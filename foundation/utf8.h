@@ -2,6 +2,7 @@
 #ifndef FOUNDATION_UTF8_H
 #define FOUNDATION_UTF8_H
 
+#include <initializer_list>
 #include <string>
 #include <string_view>
 
@@ -9,6 +10,7 @@ namespace cimple {
 
 // Whether the bytes are well-formed UTF-8 (RFC 3629). A zero is a character like others.
 bool is_utf8(std::string_view bytes) noexcept;
+bool are_utf8(std::initializer_list<std::string_view> texts) noexcept;
 
 // The bytes as well-formed UTF-8: each one that is no part of a well-formed sequence becomes the
 // replacement character U+FFFD, so that a reader sees where and how many.

@@ -35,9 +35,11 @@ TEST_F(Logical_Units_Test, AUnitSeenTwiceStandsOnce) {
     const auto system = make_instance<CIM_ComputerSystem>();
     Logical_Unit_Maps maps(*agent, system.get());
     Log_Capture log;
-    const CIM_LogicalDevice* first = maps.findOrMake(tape(1));
-    ASSERT_NE(first, nullptr);
-    EXPECT_EQ(maps.findOrMake(tape(1)), first);
+    const auto first = maps.findOrMake(tape(1));
+    ASSERT_TRUE(first);
+    const auto second = maps.findOrMake(tape(1));
+    ASSERT_TRUE(second);
+    EXPECT_TRUE(key_eq(first.get(), second.get()));
     EXPECT_EQ(agent->store(STORE_VLNMPCA_TapeDrive).size(), 1u);
     EXPECT_EQ(agent->store(STORE_VLNMPCA_TapeDriveSystemDevice).size(), 1u);
     EXPECT_EQ(log.count(VLN_CRIT, "Insert Failed : m_VLNMPCA_TapeDrive_map"), 1);
@@ -50,19 +52,21 @@ TEST_F(Logical_Units_Test, APathNeedsItsEndsAndStandsOnce) {
     const auto initiator = endpoint<VLNMPCA_SCSIProtocolInitiatorEndpoint>("I");
     const auto target = endpoint<VLNMPCA_SCSIProtocolEndpoint>("T");
     const Logical_Unit unit = tape(65536);
-    const CIM_LogicalDevice* device = maps.findOrMake(unit);
+    const auto device = maps.findOrMake(unit);
     Instance_Map_Base& paths = agent->store(STORE_VLNMPCA_SCSIInitiatorTargetTapeDrivePath);
 
     Log_Capture log;
     const auto join = [&](const Instance* from, const Instance* to) {
-        return maps.joinPath(Unit_Transport::FC, unit, device, from, to);
+        return maps.joinPath(
+            {Unit_Transport::FC, association_end(from), association_end(to), "I:T"}, unit, device);
     };
     EXPECT_FALSE(join(nullptr, target.get()));
     EXPECT_EQ(log.count(VLN_ERR, "Could not find VLNMPCA_SCSIProtocolEndpoint Initiator instance."),
               1);
     EXPECT_FALSE(join(initiator.get(), nullptr));
-    EXPECT_FALSE(maps.joinPath(Unit_Transport::ISCSI, unit, device, initiator.get(), target.get()))
-        << "endpoints of the other transport";
+    const Unit_Path wrong = {Unit_Transport::ISCSI, association_end(initiator.get()),
+                             association_end(target.get()), "I:T"};
+    EXPECT_FALSE(maps.joinPath(wrong, unit, device)) << "endpoints of the other transport";
     EXPECT_EQ(paths.size(), 0u);
     EXPECT_TRUE(join(initiator.get(), target.get()));
     EXPECT_FALSE(join(initiator.get(), target.get()));

@@ -100,3 +100,18 @@ function(vln_module target directory)
     target_include_directories(${target} PRIVATE "${VLN_GENERATED_DIR}")
     add_dependencies(${target} vln_generate)
 endfunction()
+
+# The same objects on a simulated host: the root folder, the clock, the host's name and its network
+# interfaces come from the simulator.
+#   vln_simulated_module(TARGET OUTPUT_DIRECTORY [WITH source...] [NO_EXPORT_MAP])
+function(vln_simulated_module target directory)
+    cmake_parse_arguments(ARG "NO_EXPORT_MAP" "" "WITH" ${ARGN})
+    set(names host_root.cpp system_clock.cpp host_identity.cpp kernel_ip_calls.cpp)
+    list(TRANSFORM names PREPEND "${CMAKE_SOURCE_DIR}/simulator/hooks/" OUTPUT_VARIABLE sources)
+    set(map "")
+    if(ARG_NO_EXPORT_MAP)
+        set(map NO_EXPORT_MAP)
+    endif()
+    vln_module(${target} "${directory}" REPLACE ${names} WITH ${sources} ${ARG_WITH}
+        LIBRARIES vlnsim ${map})
+endfunction()

@@ -1,0 +1,73 @@
+// Want of memory at any one allocation of the product: the process lives, nothing is lost, and what
+// was refused is there again after the next fresh start.
+#include "tests/hostile/starving.h"
+#include "tests/road/road.h"
+
+#include <dlfcn.h>
+
+using road::Road;
+
+namespace {
+
+// A card with everything, and few units behind it.
+const std::string SCENARIO = R"({"include": ")" VLN_SCENARIOS R"(/parts/cna.json",
+    "cards": [{"use": "cna", "functions": [{"use": "nic"}, {"use": "iscsi"},
+        {"use": "fcoe", "targets": {"luns": 2, "wwpn": "50:25:64:C{port}:00:00:00:{target:02X}"}}]}]})";
+
+using Starve = decltype(&starve);
+
+Starve find_hook() {
+    void* module = dlopen(VLN_MODULE, RTLD_LAZY | RTLD_NOLOAD);
+    void* hook = module ? dlsym(module, "starve") : nullptr;
+    if (module)
+        dlclose(module);
+    return reinterpret_cast<Starve>(hook);
+}
+
+// A fresh agent, a look at every shape of class and of request, and the end of the agent. Answers
+// how many ports there were.
+std::size_t one_life(Road& road) {
+    vlnsim_restart();
+    host::Manager& manager = road.manager();
+    for (const char* name : {"VLNMPCA_StorageVolume", "VLNMPCA_Card", "VLNMPCA_FCPortStatistics",
+                             "VLNMPCA_BaseServerReferencedProfile", "VLNMPCA_EthernetPort"})
+        manager.enumerate(name);
+    const auto ports = manager.enumerate_names("VLNMPCA_EthernetPort").value;
+    for (const host::ObjectPath& port : ports) {
+        manager.get(port);
+        manager.associators(port);
+        manager.reference_names(port);
+    }
+    for (const host::Instance& setting : manager.enumerate("VLNMPCA_ProviderConfigSetting").value)
+        manager.modify(setting);
+    manager.cleanup(true);
+    return ports.size();
+}
+
+TEST(Starvation, AnyOneAllocationMayFail) {
+    Road road({.scenario = SCENARIO});
+    const Starve starve_hook = find_hook();
+    ASSERT_NE(starve_hook, nullptr);
+    one_life(road); // what is made once for the process
+    starve_hook(0);
+    const std::size_t healthy = one_life(road);
+    const unsigned long allocations = starve_hook(0);
+    ASSERT_EQ(healthy, 2u);
+    ASSERT_GT(allocations, 3000u);
+
+    constexpr unsigned long FIRST = 150; // the start of an agent in full, then samples of the rest
+    constexpr unsigned long SAMPLES = 250;
+    const unsigned long step = allocations / SAMPLES + 1;
+    for (unsigned long number = 1; number < allocations;
+         number += number < FIRST ? 1 : step + number % 7) {
+        SCOPED_TRACE("allocation " + std::to_string(number) + " of " + std::to_string(allocations));
+        starve_hook(number);
+        one_life(road);
+        starve_hook(0);
+        ASSERT_EQ(road.manager().live_object_count(), 0u);
+        ASSERT_EQ(road.manager().fault_count(), 0u) << host::to_string(road.manager().faults()[0]);
+        ASSERT_EQ(one_life(road), healthy) << "the next life is not whole";
+    }
+}
+
+} // namespace

@@ -4,7 +4,6 @@
 #include <atomic>
 #include <cstring>
 #include <mutex>
-#include <strings.h>
 
 namespace fake {
 
@@ -142,6 +141,16 @@ CMPIData get_member_at(const void* container, const char* function, CMPICount in
     return load(owner(container), held.members[index].second);
 }
 
+// A getter that the test may make fail.
+template <class Get>
+auto get(const void* object, const char* function, CMPIStatus* status, Get value) {
+    const std::lock_guard guard(the_mutex);
+    if (!owner(object).fails(function))
+        return value(data(object));
+    set(status, FAILED);
+    return decltype(value(data(object))){};
+}
+
 CMPICount count_members(const void* container, const char* function, CMPIStatus* status) {
     const std::lock_guard guard(the_mutex);
     if (owner(container).fails(function))
@@ -165,13 +174,10 @@ CMPIInstanceFT instance_table = {
     [](const CMPIInstance* i, const char* name, const CMPIValue* value, CMPIType type) {
         return set_member(i, "setProperty", name, value, type);
     },
-    [](const CMPIInstance* i, CMPIStatus* status) -> CMPIObjectPath* {
-        const std::lock_guard guard(the_mutex);
-        if (owner(i).fails("getObjectPath")) {
-            set(status, FAILED);
-            return nullptr;
-        }
-        return reinterpret_cast<CMPIObjectPath*>(owner(i).make(&path_table, data(i).path));
+    [](const CMPIInstance* i, CMPIStatus* status) {
+        return get(i, "getObjectPath", status, [i](const Data& held) {
+            return reinterpret_cast<CMPIObjectPath*>(owner(i).make(&path_table, held.path));
+        });
     },
     [](CMPIInstance* i, const char** properties, const char** keys) {
         std::vector<std::string> names;
@@ -189,24 +195,16 @@ CMPIObjectPathFT path_table = {
     release<CMPIObjectPath>,
     nullptr,
     nullptr,
-    [](const CMPIObjectPath* p, CMPIStatus* status) -> CMPIString* {
-        const std::lock_guard guard(the_mutex);
-        if (owner(p).fails("getNameSpace")) {
-            set(status, FAILED);
-            return nullptr;
-        }
-        return make_string(owner(p), data(p).name_space);
+    [](const CMPIObjectPath* p, CMPIStatus* status) {
+        return get(p, "getNameSpace", status,
+                   [p](const Data& held) { return make_string(owner(p), held.name_space); });
     },
     nullptr,
     nullptr,
     nullptr,
-    [](const CMPIObjectPath* p, CMPIStatus* status) -> CMPIString* {
-        const std::lock_guard guard(the_mutex);
-        if (owner(p).fails("getClassName")) {
-            set(status, FAILED);
-            return nullptr;
-        }
-        return make_string(owner(p), data(p).text);
+    [](const CMPIObjectPath* p, CMPIStatus* status) {
+        return get(p, "getClassName", status,
+                   [p](const Data& held) { return make_string(owner(p), held.text); });
     },
     [](CMPIObjectPath* p, const char* name, const CMPIValue* value, CMPIType type) {
         return set_member(p, "addKey", name, value, type);
@@ -245,13 +243,8 @@ CMPIStringFT string_table = {
     CMPICurrentVersion,
     release<CMPIString>,
     nullptr,
-    [](const CMPIString* s, CMPIStatus* status) -> const char* {
-        const std::lock_guard guard(the_mutex);
-        if (owner(s).fails("getCharPtr")) {
-            set(status, FAILED);
-            return nullptr;
-        }
-        return data(s).text.c_str();
+    [](const CMPIString* s, CMPIStatus* status) {
+        return get(s, "getCharPtr", status, [](const Data& held) { return held.text.c_str(); });
     },
 };
 
@@ -288,13 +281,9 @@ CMPIDateTimeFT datetime_table = {
     release<CMPIDateTime>,
     nullptr,
     nullptr,
-    [](const CMPIDateTime* d, CMPIStatus* status) -> CMPIString* {
-        const std::lock_guard guard(the_mutex);
-        if (owner(d).fails("getStringFormat")) {
-            set(status, FAILED);
-            return nullptr;
-        }
-        return make_string(owner(d), data(d).text);
+    [](const CMPIDateTime* d, CMPIStatus* status) {
+        return get(d, "getStringFormat", status,
+                   [d](const Data& held) { return make_string(owner(d), held.text); });
     },
     nullptr,
 };
@@ -491,68 +480,6 @@ CMPIBrokerEncFT object_table = {
 };
 
 } // namespace
-
-// ---- Data ----
-
-const Value* Data::find(const std::string& name) const {
-    for (const auto& [member, value] : members)
-        if (strcasecmp(member.c_str(), name.c_str()) == 0)
-            return &value;
-    return nullptr;
-}
-
-std::string Data::string(const std::string& name) const {
-    const Value* value = find(name);
-    return value && value->object ? value->object->text : "(none)";
-}
-
-Value text(const char* chars) {
-    auto data = std::make_shared<Data>();
-    data->text = chars;
-    return object(CMPI_string, data);
-}
-
-Value number(CMPIType type, unsigned long long value) {
-    Value made;
-    made.type = type;
-    made.scalar.uint64 = value;
-    return made;
-}
-
-Value object(CMPIType type, Data_Ref data) {
-    Value made;
-    made.type = type;
-    made.object = std::move(data);
-    return made;
-}
-
-Value null(CMPIType type) {
-    Value made;
-    made.type = type;
-    made.state = CMPI_nullValue;
-    return made;
-}
-
-Value array(CMPIType element_type, std::vector<Value> elements) {
-    auto data = std::make_shared<Data>();
-    data->elements = std::move(elements);
-    return object(static_cast<CMPIType>(element_type | CMPI_ARRAY), data);
-}
-
-Data_Ref path_data(const char* name_space, const char* class_name, Members keys) {
-    auto data = std::make_shared<Data>();
-    data->name_space = name_space;
-    data->text = class_name;
-    data->members = std::move(keys);
-    return data;
-}
-
-Data_Ref instance_data(Data_Ref path, Members properties) {
-    auto data = std::make_shared<Data>();
-    data->path = std::move(path);
-    data->members = std::move(properties);
-    return data;
-}
 
 // ---- Broker ----
 

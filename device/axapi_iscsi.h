@@ -126,7 +126,7 @@ typedef struct AX_iSCSI_Session {
     AX_UINT64 isid;
     uint32_t isidQualifier;
     uint16_t tsih;
-    uint16_t closed; /* non-zero: a session that has ended */
+    uint16_t closed;    /* non-zero: a session that has ended */
     uint32_t sessionId; /* of the port; none is given twice while the library lists it */
     uint8_t reserved[12];
 } AX_iSCSI_Session;

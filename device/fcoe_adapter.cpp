@@ -69,8 +69,8 @@ std::string match_hba_adapter(const std::string& portWWN) {
 
 FCoEAdapter::FCoEAdapter(const std::string& name, uint32 number, const HBAIdentifier& hbaIdentifier,
                          const LocalHBAInfoV4& localHBAInfo)
-    : Adapter(name, number, ADAPTER_FCOE),
-      hbaAdapterName(match_hba_adapter(VLN_Common::wwnText(localHBAInfo.portWWN))) {
+    : Storage_Adapter(name, number, ADAPTER_FCOE) {
+    hbaAdapterName = match_hba_adapter(VLN_Common::wwnText(localHBAInfo.portWWN));
     VLN_LOG(VLN_DBG, "HBAAPI AdapterName:%s:AXAPI AdapterName%s", hbaAdapterName.c_str(),
             adapterName.c_str());
 
@@ -92,12 +92,9 @@ void FCoEAdapter::rescanTargets() {
 
 FCoEPort::FCoEPort(Adapter& owner, uint32 index, const HBAIdentifier& hbaIdentifier,
                    const LocalHBAInfoV4& localHBAInfo)
-    : Port(owner, index) {
-    auto read = std::make_unique<FCoEPortAttributes>(owner, index, hbaIdentifier, localHBAInfo);
-    portName = read->PortWWN;
-    nodeName = read->NodeWWN;
-    attributes = std::move(read);
-}
+    : Storage_Port(
+          owner, index,
+          std::make_unique<FCoEPortAttributes>(owner, index, hbaIdentifier, localHBAInfo)) {}
 
 FCoEPort::~FCoEPort() noexcept(false) {
     releaseOwned(PORT_TEXTS);

@@ -2,25 +2,20 @@
 #ifndef DEVICE_FCOE_ADAPTER_H
 #define DEVICE_FCOE_ADAPTER_H
 
-#include "device/adapter.h"
+#include "device/storage_adapter.h"
 
 namespace cimple {
 
-class FCoEAdapter : public Adapter {
+class FCoEAdapter : public Storage_Adapter {
 public:
     FCoEAdapter(const std::string& name, uint32 number, const HBAIdentifier& hbaIdentifier,
                 const LocalHBAInfoV4& localHBAInfo);
     ~FCoEAdapter() noexcept(false) override;
 
     void rescanTargets() override;
-    // The adapter's name in the HBA API, by which it is opened there.
-    const std::string& getHbaAdapterName() const { return hbaAdapterName; }
-
-private:
-    std::string hbaAdapterName;
 };
 
-class FCoEPort : public Port {
+class FCoEPort : public Storage_Port {
 public:
     FCoEPort(Adapter& owner, uint32 index, const HBAIdentifier& hbaIdentifier,
              const LocalHBAInfoV4& localHBAInfo);
@@ -28,10 +23,6 @@ public:
 
     void rescanTargets(Adapter& owner) override;
     PortStatistics* getPortStatistics() override;
-    const std::string& getNodeName() const { return nodeName; }
-
-private:
-    std::string nodeName; // 16 upper-case digits
 };
 
 } // namespace cimple

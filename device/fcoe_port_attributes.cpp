@@ -35,10 +35,7 @@ constexpr Attribute_Row<A> TABLE[] = {
 
 FCoEPortAttributes::FCoEPortAttributes(Adapter&, uint32, const HBAIdentifier&,
                                        const LocalHBAInfoV4& localHBAInfo)
-    : PortWWN(VLN_Common::wwnText(localHBAInfo.portWWN)),
-      NodeWWN(VLN_Common::wwnText(localHBAInfo.nodeWWN)),
-      FabricName(colonText(localHBAInfo.fabricName, sizeof localHBAInfo.fabricName)),
-      nFlags(flagsText(localHBAInfo.nFlags)) {
+    : StoragePortAttributes(localHBAInfo) {
     VLN_LOG(VLN_DBG, "Port 0's WWPN: %s", PortWWN.c_str());
     Attribute_Buffer buffer = fetchPortAttributes(wwnOfPort(PortWWN));
     readTable(PORT_FAMILY, buffer, *this, TABLE);

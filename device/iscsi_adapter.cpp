@@ -16,7 +16,7 @@ constexpr Cleanup_Texts PORT_TEXTS = {"~iSCSIPort", "Port Attribute delete error
 
 iSCSIAdapter::iSCSIAdapter(const std::string& name, uint32 number,
                            const HBAIdentifier& hbaIdentifier, const LocalHBAInfoV4& localHBAInfo)
-    : Adapter(name, number, ADAPTER_ISCSI) {
+    : Storage_Adapter(name, number, ADAPTER_ISCSI) {
     HBA_Name_Buffer hbaName;
     if (readHbaAdapterName(number, hbaName) != HBA_STATUS_OK)
         VLN_LOG(VLN_DBG, "AdapterName:%s:adapterNumber%d", hbaName.text, number);
@@ -40,12 +40,9 @@ void iSCSIAdapter::rescanTargets() {
 
 iSCSIPort::iSCSIPort(Adapter& owner, uint32 index, const HBAIdentifier& hbaIdentifier,
                      const LocalHBAInfoV4& localHBAInfo)
-    : Port(owner, index) {
-    auto read = std::make_unique<iSCSIPortAttributes>(owner, index, hbaIdentifier, localHBAInfo);
-    portName = read->PortWWN;
-    nodeName = read->NodeWWN;
-    attributes = std::move(read);
-}
+    : Storage_Port(
+          owner, index,
+          std::make_unique<iSCSIPortAttributes>(owner, index, hbaIdentifier, localHBAInfo)) {}
 
 iSCSIPort::~iSCSIPort() noexcept(false) {
     releaseOwned(PORT_TEXTS);

@@ -68,16 +68,23 @@ public:
     uint32 VEPAState = 2;
 };
 
-class iSCSIPortAttributes : public PortAttributes {
+// Of a port that storage is reached through, as the management library lists it.
+class StoragePortAttributes : public PortAttributes {
 public:
-    iSCSIPortAttributes(Adapter& adapter, uint32 portIndex, const HBAIdentifier& hbaIdentifier,
-                        const LocalHBAInfoV4& localHBAInfo);
-
-    std::string PortWWN;
+    std::string PortWWN; // 16 upper-case digits
     std::string NodeWWN;
     std::string FabricName; // "xx:xx:xx:xx:xx:xx:xx:xx"
     std::string nFlags;     // eight lower-case digits
     uint32 PortType = 1;
+
+protected:
+    explicit StoragePortAttributes(const LocalHBAInfoV4& localHBAInfo);
+};
+
+class iSCSIPortAttributes : public StoragePortAttributes {
+public:
+    iSCSIPortAttributes(Adapter& adapter, uint32 portIndex, const HBAIdentifier& hbaIdentifier,
+                        const LocalHBAInfoV4& localHBAInfo);
 
     uint32 FunctionalPortState = 0;
     uint32 PortSupportedSpeed = 0;
@@ -120,19 +127,13 @@ private:
     void readNetworkProperties(AX_WWN wwn);
 };
 
-class FCoEPortAttributes : public PortAttributes {
+class FCoEPortAttributes : public StoragePortAttributes {
 public:
     FCoEPortAttributes(Adapter& adapter, uint32 portIndex, const HBAIdentifier& hbaIdentifier,
                        const LocalHBAInfoV4& localHBAInfo);
 
-    std::string PortWWN;
-    std::string NodeWWN;
-    std::string FabricName; // "xx:xx:xx:xx:xx:xx:xx:xx"
-    std::string nFlags;     // eight lower-case digits
-
     std::string PortSymbolicName;
     uint32 PortFcId = 0;
-    uint32 PortType = 1;
     uint32 FunctionalPortState = 0;
     uint32 PORT_SERVICE_TYPE = 0;
     uint32 PortSupportedClassofService = 0; // the same attribute, read a second time

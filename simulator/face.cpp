@@ -10,7 +10,7 @@
 // The types of the functions do not matter here: who looks a symbol up knows them.
 #define VLNSIM_EXPORT(symbol, entry, exported)                                                     \
     extern "C" {                                                                                   \
-    [[maybe_unused]] static vlnsim_any_function resolve_##symbol(void) {                           \
+    vlnsim_any_function resolve_##symbol(void) {                                                   \
         return vlnsim_resolve(VLNSIM_FACE, #symbol, static_cast<unsigned>(vlnsim::Entry::entry),   \
                               exported);                                                           \
     }                                                                                              \

@@ -7,7 +7,7 @@
 
 #include <cstdlib>
 #include <cstring>
-#include <optional>
+#include <memory>
 #include <random>
 
 namespace cimple {
@@ -19,13 +19,13 @@ protected:
         fake_san = Fake_San{};
         fake_library.add(3, FCOE).adapterValues = {{553, number(1)}};
         fake_library.addHba("fcoe3", 3);
-        adapter.emplace("Vorlan", 0, identifier, info());
+        adapter = std::make_unique<FCoEAdapter>("Vorlan", 0, identifier, info());
         fake_library.openHandles = 0;
         log_capture::take();
     }
     Target make(const Fake_Unit& unit) { return Target(*adapter, unit.entry); }
 
-    std::optional<FCoEAdapter> adapter;
+    std::unique_ptr<FCoEAdapter> adapter;
 };
 
 TEST_F(Target_Test, FieldsComeFromTheMappingAndTheUnit) {

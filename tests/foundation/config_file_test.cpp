@@ -55,14 +55,14 @@ TEST_F(Config_File_Test, SettersRefuseWhatIsOutOfRange) {
     EXPECT_EQ(config.get_cache_timeout(), 10U);
 }
 
-struct Case {
+struct Tuning_Case {
     std::string text;
     uint32 timeout;
     bool adapter, san;
 };
 
 TEST_F(Config_File_Test, Lines) {
-    const Case cases[] = {
+    const Tuning_Case cases[] = {
         {"VLN_PROVIDER_CACHE_TIMEOUT = 31\nVLN_PROVIDER_CACHE_TIMEOUT = 7\n"
          "VLN_PROVIDER_CACHE_TIMEOUT = 8\n",
          7, false, true},
@@ -88,7 +88,7 @@ TEST_F(Config_File_Test, Lines) {
              "VLN_PROVIDER_CACHE_TIMEOUT = 6\n",
          6, false, true},
     };
-    for (const Case& c : cases) {
+    for (const Tuning_Case& c : cases) {
         SCOPED_TRACE(c.text);
         write(path, c.text);
         VlnConfigFile config;

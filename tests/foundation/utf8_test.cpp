@@ -4,6 +4,8 @@
 
 namespace cimple {
 
+namespace {
+
 constexpr const char* BAD = "\xEF\xBF\xBD"; // U+FFFD
 
 // In `expected`, '?' stands for a byte that was replaced.
@@ -54,5 +56,7 @@ TEST(Utf8, EachByteThatIsNoTextIsReplaced) {
         EXPECT_TRUE(is_utf8(to_utf8(row.bytes))) << row.what;
     }
 }
+
+} // namespace
 
 } // namespace cimple

@@ -10,24 +10,48 @@ namespace host {
 
 namespace {
 
-CMPIData named_at(Core& core, const Named_Values& values, CMPICount index, CMPIString** name,
-                  CMPIStatus* status) {
-    if (name)
-        *name = nullptr;
-    if (index >= values.size()) {
-        put(status, CMPI_RC_ERR_NOT_FOUND);
-        return missing_data();
-    }
-    put(status);
-    if (name)
-        *name = new_string(core, values[index].name);
-    return to_data(core, values[index].value);
+// The values of an object that has them as a member; `call` is what its caller calls.
+template <class Body, class Object>
+const Named_Values* values_of(const Object* object, Named_Values Body::*values, const char* call,
+                              CMPIStatus* status) {
+    const Body* body = body_of<Body>(object, call);
+    put(status, body ? CMPI_RC_OK : CMPI_RC_ERR_INVALID_HANDLE);
+    return body ? &(body->*values) : nullptr;
 }
 
-CMPIData named(Core& core, const Named_Values& values, const char* name, CMPIStatus* status) {
-    const Value* value = name ? find(values, name) : nullptr;
-    put(status, value ? CMPI_RC_OK : CMPI_RC_ERR_NOT_FOUND);
-    return value ? to_data(core, *value) : missing_data();
+template <class Body, class Object>
+CMPIData get_named(const Object* object, Named_Values Body::*values, const char* call,
+                   const char* name, CMPIStatus* status) {
+    const Named_Values* known = values_of(object, values, call, status);
+    const Value* value = known && name ? find(*known, name) : nullptr;
+    if (value)
+        return to_data(core_of(object), *value);
+    if (known)
+        put(status, CMPI_RC_ERR_NOT_FOUND);
+    return missing_data();
+}
+
+template <class Body, class Object>
+CMPIData get_at(const Object* object, Named_Values Body::*values, const char* call, CMPICount index,
+                CMPIString** name, CMPIStatus* status) {
+    if (name)
+        *name = nullptr;
+    const Named_Values* known = values_of(object, values, call, status);
+    if (!known || index >= known->size()) {
+        if (known)
+            put(status, CMPI_RC_ERR_NOT_FOUND);
+        return missing_data();
+    }
+    if (name)
+        *name = new_string(core_of(object), (*known)[index].name);
+    return to_data(core_of(object), (*known)[index].value);
+}
+
+template <class Body, class Object>
+CMPICount count_named(const Object* object, Named_Values Body::*values, const char* call,
+                      CMPIStatus* status) {
+    const Named_Values* known = values_of(object, values, call, status);
+    return known ? static_cast<CMPICount>(known->size()) : 0;
 }
 
 } // namespace
@@ -72,26 +96,16 @@ CMPIStatus args_add(const CMPIArgs* args, const char* name, const CMPIValue* val
 }
 
 CMPIData args_get(const CMPIArgs* args, const char* name, CMPIStatus* status) noexcept {
-    const ArgsBody* body = body_of<ArgsBody>(args, "getArg");
-    if (body)
-        return named(core_of(args), body->values, name, status);
-    put(status, CMPI_RC_ERR_INVALID_HANDLE);
-    return missing_data();
+    return get_named(args, &ArgsBody::values, "getArg", name, status);
 }
 
 CMPIData args_get_at(const CMPIArgs* args, CMPICount index, CMPIString** name,
                      CMPIStatus* status) noexcept {
-    const ArgsBody* body = body_of<ArgsBody>(args, "getArgAt");
-    if (body)
-        return named_at(core_of(args), body->values, index, name, status);
-    put(status, CMPI_RC_ERR_INVALID_HANDLE);
-    return missing_data();
+    return get_at(args, &ArgsBody::values, "getArgAt", index, name, status);
 }
 
 CMPICount args_count(const CMPIArgs* args, CMPIStatus* status) noexcept {
-    const ArgsBody* body = body_of<ArgsBody>(args, "getArgCount");
-    put(status, body ? CMPI_RC_OK : CMPI_RC_ERR_INVALID_HANDLE);
-    return body ? static_cast<CMPICount>(body->values.size()) : 0;
+    return count_named(args, &ArgsBody::values, "getArgCount", status);
 }
 
 } // namespace
@@ -267,26 +281,16 @@ const CMPIEnumerationFT EnumerationBody::table = {CMPIVersion100,         releas
 namespace {
 
 CMPIData context_entry(const CMPIContext* context, const char* name, CMPIStatus* status) noexcept {
-    const ContextBody* body = body_of<ContextBody>(context, "getEntry");
-    if (body)
-        return named(core_of(context), body->entries, name, status);
-    put(status, CMPI_RC_ERR_INVALID_HANDLE);
-    return missing_data();
+    return get_named(context, &ContextBody::entries, "getEntry", name, status);
 }
 
 CMPIData context_entry_at(const CMPIContext* context, CMPICount index, CMPIString** name,
                           CMPIStatus* status) noexcept {
-    const ContextBody* body = body_of<ContextBody>(context, "getEntryAt");
-    if (body)
-        return named_at(core_of(context), body->entries, index, name, status);
-    put(status, CMPI_RC_ERR_INVALID_HANDLE);
-    return missing_data();
+    return get_at(context, &ContextBody::entries, "getEntryAt", index, name, status);
 }
 
 CMPICount context_count(const CMPIContext* context, CMPIStatus* status) noexcept {
-    const ContextBody* body = body_of<ContextBody>(context, "getEntryCount");
-    put(status, body ? CMPI_RC_OK : CMPI_RC_ERR_INVALID_HANDLE);
-    return body ? static_cast<CMPICount>(body->entries.size()) : 0;
+    return count_named(context, &ContextBody::entries, "getEntryCount", status);
 }
 
 CMPIStatus context_add(const CMPIContext* context, const char* name, const CMPIValue* value,

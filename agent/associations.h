@@ -6,6 +6,7 @@
 
 #include "agent/name_spaces.h"
 #include "cimple/instance_map.h"
+#include "classes/CIM_ComputerSystem.h"
 #include "foundation/logger.h"
 
 #include <span>
@@ -18,6 +19,14 @@ Instance* make_instance(const Meta_Class* meta_class);
 template <class T>
 Ref<T> make_instance() {
     return Ref<T>(make_instance(&T::static_meta_class));
+}
+
+// The keys of an instance that is weak to its system: the system's, and its own class.
+template <class T>
+void name_in_system(T& instance, const CIM_ComputerSystem& system) {
+    instance.SystemCreationClassName.set(system.CreationClassName.value);
+    instance.SystemName.set(system.Name.value);
+    instance.CreationClassName.set(instance.__meta_class->name);
 }
 
 // What a failed insertion says, and at which level; a null text stands for "Insert Failed :

@@ -26,9 +26,7 @@ ethernet_port_instance(const AdapterAttributes& adapter, const Port_Attributes& 
         return {};
     auto port = make_instance<VLNMPCA_EthernetPort>();
     port->Description.set(text(adapter.ModelDescription));
-    port->SystemCreationClassName.set(system.CreationClassName.value);
-    port->SystemName.set(system.Name.value);
-    port->CreationClassName.set("VLNMPCA_EthernetPort");
+    name_in_system(*port, system);
     port->DeviceID.set(name);
     append_port_state(port.get(), find_port_state(portStateMap, attributes.FunctionalPortState));
     port->PermanentAddress.set(address);

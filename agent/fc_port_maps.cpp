@@ -69,9 +69,7 @@ void set_link_properties(VLNMPCA_FCPort& port, const FCoEPortAttributes& attribu
 Ref<VLNMPCA_FCPort> CreateFCPort(const FC_Function& function, const CIM_ComputerSystem& system) {
     const FCoEPortAttributes& attributes = function.attributes;
     auto port = make_instance<VLNMPCA_FCPort>();
-    port->SystemCreationClassName.set(system.CreationClassName.value);
-    port->SystemName.set(system.Name.value);
-    port->CreationClassName.set("VLNMPCA_FCPort");
+    name_in_system(*port, system);
     port->Name.set(function.name);
     port->DeviceID.set(function.name);
     port->PermanentAddress.set(function.name);
@@ -99,9 +97,7 @@ Ref<VLNMPCA_FCPortStatistics> port_statistics_instance(const FC_Function& functi
 Ref<VLNMPCA_SCSIProtocolInitiatorEndpoint>
 initiator_endpoint_instance(const FC_Function& function, const CIM_ComputerSystem& system) {
     auto endpoint = make_instance<VLNMPCA_SCSIProtocolInitiatorEndpoint>();
-    endpoint->SystemCreationClassName.set(system.CreationClassName.value);
-    endpoint->SystemName.set(system.Name.value);
-    endpoint->CreationClassName.set("VLNMPCA_SCSIProtocolInitiatorEndpoint");
+    name_in_system(*endpoint, system);
     endpoint->Name.set(format_text("Initiator:%s", function.name.c_str()));
     endpoint->ConnectionType.set(CONNECTION_TYPE_FCOE);
     endpoint->ProtocolIFType.set(IF_TYPE_FIBRE_CHANNEL);

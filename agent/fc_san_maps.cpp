@@ -23,9 +23,7 @@ constexpr uint16 ROLE_TARGET = 3;            // CIM_SCSIProtocolEndpoint.Role
 Ref<VLNMPCA_SCSIProtocolInitiatorEndpoint> initiator_key(const String& port_name,
                                                          const CIM_ComputerSystem& system) {
     auto key = make_instance<VLNMPCA_SCSIProtocolInitiatorEndpoint>();
-    key->SystemCreationClassName.set(system.CreationClassName.value);
-    key->SystemName.set(system.Name.value);
-    key->CreationClassName.set("VLNMPCA_SCSIProtocolInitiatorEndpoint");
+    name_in_system(*key, system);
     key->Name.set(format_text("Initiator:%s", port_name.c_str()));
     return key;
 }
@@ -51,9 +49,7 @@ Ref<VLNMPCA_SCSIProtocolEndpoint> endpoint_instance(const Target& first_unit, co
                                                     const CIM_ComputerSystem& system) {
     auto endpoint = make_instance<VLNMPCA_SCSIProtocolEndpoint>();
     const String name = text(first_unit.portWWN);
-    endpoint->SystemCreationClassName.set(system.CreationClassName.value);
-    endpoint->SystemName.set(system.Name.value);
-    endpoint->CreationClassName.set("VLNMPCA_SCSIProtocolEndpoint");
+    name_in_system(*endpoint, system);
     endpoint->Name.set(name);
     endpoint->ElementName.set(format_text("Target:%s", name.c_str()));
     endpoint->Description.set(inquiry_of(first_unit));

@@ -24,13 +24,11 @@ constexpr uint16 ACCESS_CONTEXT_OTHER = 1;
 
 // A service that runs from the start.
 template <class Service>
-Ref<Service> service_instance(const char* class_name, const char* description, const char* status,
+Ref<Service> service_instance(const char* description, const char* status,
                               const CIM_ComputerSystem& system) {
     auto service = make_instance<Service>();
-    service->SystemCreationClassName.set(system.CreationClassName.value);
-    service->SystemName.set(system.Name.value);
-    service->CreationClassName.set(class_name);
-    service->Name.set(class_name);
+    name_in_system(*service, system);
+    service->Name.set(Service::static_meta_class.name);
     service->Description.set(description);
     service->StartMode.set("Automatic");
     service->Started.set(true);
@@ -41,8 +39,8 @@ Ref<Service> service_instance(const char* class_name, const char* description, c
 }
 
 Ref<VLNMPCA_FCWWNService> wwn_service_instance(const CIM_ComputerSystem& system) {
-    auto service = service_instance<VLNMPCA_FCWWNService>(
-        "VLNMPCA_FCWWNService", "Vorlan FCOE FC WWN Management Service", "Ok", system);
+    auto service = service_instance<VLNMPCA_FCWWNService>("Vorlan FCOE FC WWN Management Service",
+                                                          "Ok", system);
     service->RequestedState.set(STATE_ENABLED);
     service->EnabledDefault.set(STATE_ENABLED);
     return service;
@@ -50,8 +48,7 @@ Ref<VLNMPCA_FCWWNService> wwn_service_instance(const CIM_ComputerSystem& system)
 
 Ref<VLNMPCA_DriverParameterService> parameter_service_instance(const CIM_ComputerSystem& system) {
     constexpr char DESCRIPTION[] = "Vorlan FCoE MPCA Set Driver Parameters Service";
-    auto service = service_instance<VLNMPCA_DriverParameterService>(
-        "VLNMPCA_DriverParameterService", DESCRIPTION, "OK", system);
+    auto service = service_instance<VLNMPCA_DriverParameterService>(DESCRIPTION, "OK", system);
     service->ElementName.set(DESCRIPTION);
     return service;
 }
@@ -62,9 +59,7 @@ Ref<VLNMPCA_RemoteServiceAccessPoint> web_launch_instance(const std::string& url
     point->Name.set("Portvista WebLaunch URL");
     point->ElementName.set("Portvista");
     point->Description.set("VLN FCoE HBA:Portvista Management Interface");
-    point->SystemCreationClassName.set(system.CreationClassName.value);
-    point->SystemName.set(system.Name.value);
-    point->CreationClassName.set("VLNMPCA_RemoteServiceAccessPoint");
+    name_in_system(*point, system);
     point->AccessInfo.set(text(url));
     point->InfoFormat.set(INFO_FORMAT_URL);
     point->AccessContext.set(ACCESS_CONTEXT_OTHER);

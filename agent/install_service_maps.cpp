@@ -40,9 +40,7 @@ void append_all(Property<Array<uint16>>& property, const uint16 (&values)[N]) {
 
 Ref<VLNMPCA_SoftwareInstallationService> service_instance(const CIM_ComputerSystem& system) {
     auto service = make_instance<VLNMPCA_SoftwareInstallationService>();
-    service->SystemCreationClassName.set(system.CreationClassName.value);
-    service->SystemName.set(system.Name.value);
-    service->CreationClassName.set("VLNMPCA_SoftwareInstallationService");
+    name_in_system(*service, system);
     service->Name.set(SERVICE_NAME);
     service->Description.set(SERVICE_NAME);
     service->ElementName.set(SERVICE_NAME);

@@ -27,9 +27,7 @@ constexpr uint16 INFO_FORMAT_IPV6_ADDRESS = 4;
 
 Ref<VLNMPCA_IPConfigurationService> service_instance(const CIM_ComputerSystem& system) {
     auto service = make_instance<VLNMPCA_IPConfigurationService>();
-    service->SystemCreationClassName.set(system.CreationClassName.value);
-    service->SystemName.set(system.Name.value);
-    service->CreationClassName.set("VLNMPCA_IPConfigurationService");
+    name_in_system(*service, system);
     service->Name.set("VLN:IP Configuration Service");
     service->ElementName.set("Vorlan IP Configuration Service");
     service->EnabledState.set(ENABLED);
@@ -82,9 +80,7 @@ Ref<VLNMPCA_RemoteServiceAccessPoint> gateway_instance(const String& address,
                                                        const CIM_ComputerSystem& system) {
     auto gateway = make_instance<VLNMPCA_RemoteServiceAccessPoint>();
     gateway->InstanceID.set("Default Gateway Address");
-    gateway->SystemCreationClassName.set(system.CreationClassName.value);
-    gateway->SystemName.set(system.Name.value);
-    gateway->CreationClassName.set("VLNMPCA_RemoteServiceAccessPoint");
+    name_in_system(*gateway, system);
     gateway->Name.set(address);
     gateway->ElementName.set("Default Gateway Address");
     gateway->AccessInfo.set(address);

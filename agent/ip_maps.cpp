@@ -75,9 +75,7 @@ Ref<VLNMPCA_IPProtocolEndpoint> ip_endpoint_instance(NICAdapter& adapter, Port& 
     const char* interface = attributes.IPProtocolEndpointName.c_str();
     const uint16 state = facts.up ? STATE_ENABLED : STATE_DISABLED;
     auto endpoint = make_instance<VLNMPCA_IPProtocolEndpoint>();
-    endpoint->CreationClassName.set("VLNMPCA_IPProtocolEndpoint");
-    endpoint->SystemCreationClassName.set(system.CreationClassName.value);
-    endpoint->SystemName.set(system.Name.value);
+    name_in_system(*endpoint, system);
     endpoint->ProtocolIFType.set(if_type(facts.family));
     endpoint->Name.set(format_text("IPv4_%d_%d_%s_%s", static_cast<int>(adapter.getAdapterNumber()),
                                    static_cast<int>(port.getPortIndex()), facts.address.c_str(),

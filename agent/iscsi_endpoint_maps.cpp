@@ -18,12 +18,9 @@ constexpr uint16 IF_TYPE_TCP = 4111; // CIM_TCPProtocolEndpoint.ProtocolIFType
 
 // What all endpoints of a port have in common.
 template <class Endpoint>
-Ref<Endpoint> endpoint_instance(const char* class_name, uint32 functional_state,
-                                const CIM_ComputerSystem& system) {
+Ref<Endpoint> endpoint_instance(uint32 functional_state, const CIM_ComputerSystem& system) {
     auto endpoint = make_instance<Endpoint>();
-    endpoint->SystemCreationClassName.set(system.CreationClassName.value);
-    endpoint->SystemName.set(system.Name.value);
-    endpoint->CreationClassName.set(class_name);
+    name_in_system(*endpoint, system);
     endpoint->RequestedState.set(REQUESTED_STATE_NOT_APPLICABLE);
     endpoint->EnabledState.set(enabled_state(functional_state));
     return endpoint;
@@ -32,8 +29,8 @@ Ref<Endpoint> endpoint_instance(const char* class_name, uint32 functional_state,
 Ref<VLNMPCA_TCPProtocolEndpoint> tcp_endpoint_instance(const iSCSIPortAttributes& attributes,
                                                        const String& port_name,
                                                        const CIM_ComputerSystem& system) {
-    auto endpoint = endpoint_instance<VLNMPCA_TCPProtocolEndpoint>(
-        "VLNMPCA_TCPProtocolEndpoint", attributes.FunctionalPortState, system);
+    auto endpoint =
+        endpoint_instance<VLNMPCA_TCPProtocolEndpoint>(attributes.FunctionalPortState, system);
     const String name = tcp_endpoint_name(port_name);
     endpoint->Name.set(name);
     endpoint->ElementName.set(name);
@@ -65,8 +62,8 @@ Ref<VLNMPCA_IPProtocolEndpoint> ip_endpoint_instance(const iSCSIPortAttributes& 
                                                      uint32 adapter_number, uint32 port_index,
                                                      const String& port_name,
                                                      const CIM_ComputerSystem& system) {
-    auto endpoint = endpoint_instance<VLNMPCA_IPProtocolEndpoint>(
-        "VLNMPCA_IPProtocolEndpoint", attributes.FunctionalPortState, system);
+    auto endpoint =
+        endpoint_instance<VLNMPCA_IPProtocolEndpoint>(attributes.FunctionalPortState, system);
     endpoint->Name.set(format_text("IPv4_%zu_%d_%s", static_cast<std::size_t>(adapter_number),
                                    static_cast<int>(port_index), attributes.IPAddress.c_str()));
     // How the name is made, for the reader of the console.

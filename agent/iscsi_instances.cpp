@@ -89,9 +89,7 @@ std::optional<String> portal_text(const AX_IPAddress& portal) {
 
 void describe_endpoint(CIM_iSCSIProtocolEndpoint& endpoint, const CIM_ComputerSystem& system,
                        const String& name, const String& identifier, ISCSI_Role role) {
-    endpoint.SystemCreationClassName.set(system.CreationClassName.value);
-    endpoint.SystemName.set(system.Name.value);
-    endpoint.CreationClassName.set(endpoint.__meta_class->name);
+    name_in_system(endpoint, system);
     endpoint.Name.set(name);
     endpoint.ElementName.set(name);
     endpoint.Identifier.set(identifier);

@@ -16,9 +16,7 @@ namespace {
 Ref<VLNMPCA_SCSIProtocolController> protocol_controller_instance(const CIM_ComputerSystem& system) {
     auto controller = make_instance<VLNMPCA_SCSIProtocolController>();
     const String name = format_text("SCSI Protocol Controller:%s", system.Name.value.c_str());
-    controller->SystemCreationClassName.set(system.CreationClassName.value);
-    controller->SystemName.set(system.Name.value);
-    controller->CreationClassName.set("VLNMPCA_SCSIProtocolController");
+    name_in_system(*controller, system);
     controller->DeviceID.set(name);
     controller->ElementName.set(name);
     return controller;

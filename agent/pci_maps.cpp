@@ -129,9 +129,7 @@ Ref<D> pci_device_instance(const PCI_Function& function, const R& registers,
                            const CIM_ComputerSystem& system) {
     VLN_LOG(VLN_DBG, "Creating VLNMPCA_PCIDevice");
     auto device = make_instance<D>();
-    device->SystemCreationClassName.set(system.CreationClassName.value);
-    device->SystemName.set(system.Name.value);
-    device->CreationClassName.set("VLNMPCA_PCIDevice");
+    name_in_system(*device, system);
     device->DeviceID.set(format_text("%s:0x%04X", function.device_id.c_str(),
                                      static_cast<unsigned>(registers.deviceID)));
     device->ElementName.set(function.element_name);

@@ -30,9 +30,7 @@ Ref<VLNMPCA_PortController> port_controller_instance(const NICAdapterAttributes&
     controller->Description.set(text(adapter.ModelDescription));
     controller->ElementName.set(name);
     controller->Name.set(name);
-    controller->SystemCreationClassName.set(system.CreationClassName.value);
-    controller->SystemName.set(system.Name.value);
-    controller->CreationClassName.set("VLNMPCA_PortController");
+    name_in_system(*controller, system);
     controller->DeviceID.set(serial_and_number);
     controller->ControllerType.set(CONTROLLER_TYPE_ETHERNET);
     controller->ProtocolSupported.set(PROTOCOL_SUPPORTED_OTHER);

@@ -46,9 +46,7 @@ Ref<VLNMPCA_LANEndpoint> lan_endpoint_instance(const NICAdapterAttributes& adapt
                                                const CIM_ComputerSystem& system) {
     auto endpoint = make_instance<VLNMPCA_LANEndpoint>();
     endpoint->Description.set(text(adapter.ModelDescription));
-    endpoint->SystemCreationClassName.set(system.CreationClassName.value);
-    endpoint->SystemName.set(system.Name.value);
-    endpoint->CreationClassName.set("VLNMPCA_LANEndpoint");
+    name_in_system(*endpoint, system);
     endpoint->ElementName.set(port_name);
     endpoint->Name.set(port_name);
     endpoint->NameFormat.set("Ethernet");

@@ -7,39 +7,6 @@
 
 namespace cimple {
 
-TEST_F(Maps_Test, TwoPortsOfOneCard) {
-    load(R"({"use": "nic"}, {"use": "iscsi"}, {"use": "fcoe"})");
-    Loaded_Agent agent;
-    Log_Capture log;
-    EXPECT_EQ(refreshes_started(*agent), 1);
-    expect_counts(*agent, {{STORE_CIM_ComputerSystem, 1},
-                           {STORE_CIM_Chassis, 1},
-                           {STORE_VLNMPCA_ProviderConfigSetting, 3},
-                           {STORE_VLNMPCA_Product, 1},
-                           {STORE_VLNMPCA_Card, 1},
-                           {STORE_VLNMPCA_ProductPhysicalComponent, 1},
-                           {STORE_VLNMPCA_ChassisContainsCard, 1},
-                           {STORE_VLNMPCA_PhysicalConnector, 2},
-                           {STORE_VLNMPCA_ProductPhysicalConnector, 2},
-                           {STORE_VLNMPCA_Container, 2},
-                           {STORE_VLNMPCA_EthernetPort, 4},
-                           {STORE_VLNMPCA_EthernetPortSystemDevice, 4},
-                           {STORE_VLNMPCA_Realizes, 4},
-                           {STORE_VLNMPCA_LANEndpoint, 2},
-                           {STORE_VLNMPCA_EnabledLogicalElementCapabilities, 2},
-                           {STORE_VLNMPCA_NICCapabilities, 2},
-                           {STORE_VLNMPCA_EndpointCapabilities, 2},
-                           {STORE_VLNMPCA_NICSAPImplementation, 2},
-                           {STORE_VLNMPCA_HostedLANEndpoint, 2},
-                           {STORE_VLNMPCA_PortController, 2},
-                           {STORE_VLNMPCA_ProductPortControllerComponent, 2},
-                           {STORE_VLNMPCA_CardRealizesPortController, 2},
-                           {STORE_VLNMPCA_PortControllerSystemDevice, 2},
-                           {STORE_VLNMPCA_PortControllerRealizes, 2},
-                           {STORE_VLNMPCA_ControlledBy, 4}});
-    EXPECT_EQ(log.count(VLN_DBG, "PERF: updateAdapterMaps: cleanExit"), 1);
-}
-
 // Every property that the maps set, and no other.
 class Properties_Test : public Maps_Test {
 protected:

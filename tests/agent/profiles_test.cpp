@@ -3,36 +3,14 @@
 #include "agent/profile_maps.h"
 
 #include "agent/associations.h"
-#include "classes/CIM_ElementConformsToProfile.h"
 #include "classes/VLNMPCA_RegisteredProfile.h"
 #include "tests/agent/maps_fixture.h"
-
-#include <map>
 
 namespace cimple {
 
 namespace {
 
 using Profiles_Test = Maps_Test;
-
-// Conforming elements by the profile's name, over all conformance classes.
-std::map<std::string, int> conforming(ProviderAgent& agent) {
-    std::map<std::string, int> counts;
-    for (const Store_Row& row : store_table) {
-        const Instance_Map_Base& store = row.store(agent);
-        for (uint32 i = 0; i < store.size(); ++i)
-            if (auto* conforms = cast<CIM_ElementConformsToProfile>(store.at(i)))
-                ++counts[value_of(conforms->ConformantStandard, "RegisteredName")];
-    }
-    return counts;
-}
-
-// Profiles of a host whose port controllers, cards and so on are conforming as well as its system.
-const char* const NIC_PROFILES[] = {
-    "Profile Registration", "Ethernet Port",   "Host LAN Network Port",
-    "PCI Device",           "Physical Asset",  "Software",
-    "Software Inventory",   "Software Update", "Host Discovered Resources",
-    "Access Points"};
 
 } // namespace
 
@@ -70,24 +48,6 @@ TEST_F(Profiles_Test, EachIsMadeOnceWithTheReferencesOfItsStandard) {
     EXPECT_EQ(references.size(), 1u);
     maps.createRegisteredProfile(PROFILE_ISCSI_INITIATOR_PORTS);
     EXPECT_EQ(references.size(), 2u);
-}
-
-// The system and at least one element of the card conform to each.
-TEST_F(Profiles_Test, EveryProfileReachesItsElements) {
-    load(R"({"use": "nic"})");
-    Loaded_Agent agent;
-    EXPECT_EQ(refreshes_started(*agent), 1);
-    auto counts = conforming(*agent);
-    for (const char* name : NIC_PROFILES)
-        EXPECT_GE(counts["\"" + std::string(name) + "\""], 2) << name;
-    const auto& profiles = agent->m_VLNMPCA_RegisteredProfile_map;
-    for (uint32 i = 0; i < profiles.size(); ++i)
-        EXPECT_GE(counts[value_of(profiles.at(i), "RegisteredName")], 1)
-            << profiles[i]->RegisteredName.value.c_str();
-    // The system, two controllers and two logs.
-    EXPECT_EQ(counts["\"Profile Registration\""], 5);
-    EXPECT_EQ(counts["\"Host LAN Network Port\""], 3);
-    EXPECT_EQ(counts["\"FCoE Initiator Ports\""], 1);
 }
 
 TEST_F(Profiles_Test, APlatformsSystemIsNotOursToConform) {

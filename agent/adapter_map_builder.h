@@ -9,6 +9,8 @@
 #define VLN_AGENT_ADAPTER_MAP_BUILDER_H
 
 #include "agent/associations.h"
+#include "agent/class_groups.h"
+#include "agent/map_status.h"
 #include "agent/provider_agent.h"
 #include "classes/CIM_Chassis.h"
 #include "classes/CIM_ComputerSystem.h"
@@ -27,12 +29,6 @@ namespace cimple {
 struct IP_Interface;
 class VLN_IPInterfaceConfig;
 
-enum Map_Status : uint32 {
-    MAP_OK = 0,
-    SKIP_DEVICE = 32768, // the present port or device is left out
-    END_PASS = 32769,    // the pass ends here
-};
-
 class Adapter_Map_Builder {
 public:
     explicit Adapter_Map_Builder(ProviderAgent& agent) : _agent(agent) {}
@@ -44,9 +40,11 @@ private:
     // adapter_maps.cpp
     uint32 createNICClasses();
     void registerBaseProfiles();
+    void registerStorageProfiles();
     uint32 createNICPart();
     uint32 createNICSoftware();
     void updateSoftwareIdentities();
+    uint32 makeGroups(Group_Place place) { return make_class_groups(place, {_agent, _system}); }
 
     // A NIC function on its way through the card loop, with what its card shares with others.
     struct NIC_Function {
@@ -72,43 +70,26 @@ private:
         VLNMPCA_SoftwareIdentity* firmware = nullptr;
     };
 
-    // platform_maps.cpp
+    // platform/platform_maps.cpp
     uint32 createComputerSystem();
     Ref<CIM_ComputerSystem> ownComputerSystem() const;
     void findChassis();
     uint32 createChassis();
     Ref<CIM_Chassis> ownChassis() const;
 
-    // configuration_maps.cpp
-    uint32 createConfigurationSettings();
-
-    // software_maps.cpp
+    // software/software_maps.cpp
     void createProviderIdentity();
-    VLNMPCA_SoftwareIdentity* findProviderIdentity() const;
     uint32 createDriverIdentity();
     uint32 CreateDriverIdentity(NICAdapter& adapter);
 
-    // firmware_maps.cpp
+    // software/firmware_maps.cpp
     void findOrMakeFirmware(NIC_Port& port);
     VLNMPCA_SoftwareIdentity* CreateFirmwareIdentityInstance(const NICAdapterAttributes& adapter);
     void joinFirmwareToPort(const NIC_Port& port);
     void joinFirmwareToController(const NIC_Port& port);
     void joinFlashImage(const NIC_Port& port);
 
-    // install_service_maps.cpp
-    uint32 StartSoftwareInstallationService();
-    void joinInstallService(const VLNMPCA_SoftwareInstallationService* service);
-    void affectByInstallService(Instance_Map_Base& store, const Instance* element,
-                                const Insert_Failure& failure = {});
-
-    // record_log_maps.cpp
-    uint32 createRecordLogs();
-    void conformRecordLog(const VLNMPCA_RecordLog& log);
-    void createRecordLogCapabilities(const VLNMPCA_RecordLog* provider_log);
-    uint32 joinRecordLogs();
-    void conformPortControllers();
-
-    // card_maps.cpp
+    // hardware/card_maps.cpp
     uint32 createNICCards();
     uint32 createNICCard(NICAdapter& adapter);
     VLNMPCA_Product* findOrMakeProduct(const NICAdapterAttributes& attributes);
@@ -119,11 +100,11 @@ private:
     void findOrMakeConnector(NIC_Port& port);
     void joinConnector(const NIC_Port& port);
 
-    // chip_maps.cpp
+    // hardware/chip_maps.cpp
     void findOrMakeChip(NIC_Function& function);
     uint32 CreateMPCAChipInstance(NIC_Function& function);
 
-    // port_maps.cpp
+    // ethernet/port_maps.cpp
     uint32 createNICPort(NIC_Function& function, Port& port);
     Ref<VLNMPCA_EthernetPort> CreateEthernetPort(const NIC_Port& port) const;
     void createLANEndpoint(NIC_Port& port);
@@ -131,19 +112,19 @@ private:
     void conformEthernetPort(const VLNMPCA_EthernetPort& port);
     uint32 createPCIDevice(const NIC_Port& port);
 
-    // vlan_maps.cpp
+    // ethernet/vlan_maps.cpp
     void createVLANObjects(const NIC_Port& port);
 
-    // port_controller_maps.cpp
+    // hardware/port_controller_maps.cpp
     void findOrMakePortController(NIC_Port& port);
     void joinPortController(const NIC_Port& port);
     void conformPortController(const VLNMPCA_PortController& controller);
     void joinControlledBy(const NIC_Port& port);
 
-    // transceiver_maps.cpp
+    // hardware/transceiver_maps.cpp
     void createTransceiver(const NIC_Port& port);
 
-    // ip_maps.cpp
+    // ip/ip_maps.cpp
     uint32 createIPClasses();
     void createIPEndpoint(NICAdapter& adapter, Port& port, VLN_IPInterfaceConfig& kernel);
     void joinIPEndpoint(const IP_Interface& interface);

@@ -1,10 +1,10 @@
 // The order of the adapter pass.
 
 #include "agent/adapter_map_builder.h"
-#include "agent/fcoe_maps.h"
-#include "agent/iscsi_maps.h"
-#include "agent/profile_maps.h"
-#include "agent/vpd_maps.h"
+#include "agent/fcoe/fcoe_maps.h"
+#include "agent/hardware/vpd_maps.h"
+#include "agent/iscsi/iscsi_maps.h"
+#include "agent/profiles/profile_maps.h"
 
 namespace cimple {
 
@@ -21,15 +21,16 @@ uint32 Adapter_Map_Builder::run() {
     }
     findChassis();
     registerBaseProfiles();
-    if (const uint32 status = createConfigurationSettings())
+    if (const uint32 status = makeGroups(Group_Place::PLATFORM))
         return status;
     if (const uint32 status = createChassis())
         return status;
     Profile_Maps(_agent).registerForSystem(PROFILE_SOFTWARE_UPDATE);
     if (const uint32 status = createNICPart())
         return status;
-    if (const uint32 status = createRecordLogs())
+    if (const uint32 status = makeGroups(Group_Place::LOGS))
         return status;
+    registerStorageProfiles();
     if (const uint32 status = FCoE_Map_Builder(_agent, _system).run())
         return status;
     if (ISCSI_Map_Builder(_agent, _system).CreateISCSIClasses() != MAP_OK) {
@@ -37,6 +38,8 @@ uint32 Adapter_Map_Builder::run() {
         return END_PASS;
     }
     updateSoftwareIdentities();
+    if (const uint32 status = makeGroups(Group_Place::CLOSING))
+        return status;
     VLN_LOG(VLN_DBG, "PERF: updateAdapterMaps: cleanExit");
     return MAP_OK;
 }
@@ -49,6 +52,14 @@ void Adapter_Map_Builder::registerBaseProfiles() {
     };
     for (Profile profile : BASE_PROFILES)
         Profile_Maps(_agent).registerForSystem(profile);
+}
+
+// What the storage stretches conform to.
+void Adapter_Map_Builder::registerStorageProfiles() {
+    VLN_LOG(VLN_DBG, "create VLNMPCA_RegisteredProfile");
+    Profile_Maps profiles(_agent);
+    profiles.registerForSystem(PROFILE_FCOE_INITIATOR_PORTS);
+    profiles.registerForSystem(PROFILE_STORAGE_HBA);
 }
 
 uint32 Adapter_Map_Builder::createNICPart() {
@@ -65,10 +76,8 @@ uint32 Adapter_Map_Builder::createNICPart() {
 // provider and driver, and the profiles of storage hosts.
 uint32 Adapter_Map_Builder::createNICSoftware() {
     VLN_LOG(VLN_DBG, "Ethernet Port Profile");
-    if (StartSoftwareInstallationService() != MAP_OK) {
-        VLN_LOG(VLN_CRIT, "StartSoftwareInstallationService failed");
-        return END_PASS;
-    }
+    if (const uint32 status = makeGroups(Group_Place::NIC_CARDS))
+        return status;
     createProviderIdentity();
     if (createDriverIdentity() != MAP_OK) {
         VLN_LOG(VLN_CRIT, "CreateDriverIdentity failed");
@@ -86,7 +95,11 @@ uint32 Adapter_Map_Builder::createNICClasses() {
     try {
         if (const uint32 status = createNICCards())
             return status;
-        return createIPClasses();
+        if (const uint32 status = makeGroups(Group_Place::NIC_PORTS))
+            return status;
+        if (const uint32 status = createIPClasses())
+            return status;
+        return makeGroups(Group_Place::NIC);
     } catch (...) {
         VLN_LOG(VLN_DBG, "Unknown exception in  NIC card discovery");
     }

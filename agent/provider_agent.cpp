@@ -5,8 +5,8 @@
 #include "agent/lock_order.h"
 #include "agent/signal_handler.h"
 #include "agent/version.h"
-#include "device/bound_functions.h"
-#include "device/runtime_loader.h"
+#include "device/library/bound_functions.h"
+#include "device/library/runtime_loader.h"
 #include "foundation/common.h"
 #include "foundation/host_paths.h"
 

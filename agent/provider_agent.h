@@ -9,9 +9,9 @@
 #ifndef VLN_AGENT_PROVIDER_AGENT_H
 #define VLN_AGENT_PROVIDER_AGENT_H
 
-#include "agent/dynamic_port_status.h"
-#include "agent/dynamic_status.h"
 #include "agent/plain_flag.h"
+#include "agent/status/dynamic_port_status.h"
+#include "agent/status/dynamic_status.h"
 #include "agent/stores.h"
 #include "cimple/thread.h"
 #include "device/data.h"

@@ -2,7 +2,7 @@
 
 #include "agent/provider_agent.h"
 #include "classes/VLNMPCA_EthernetPort.h"
-#include "device/bound_functions.h"
+#include "device/library/bound_functions.h"
 #include "simulator/vlnsim.h"
 
 #include <dlfcn.h>

@@ -4,14 +4,16 @@ set(VLN_GENERATED_DIR "${CMAKE_BINARY_DIR}/generated")
 
 # A room of the product: an object library, since the rooms of the module call one another and are
 # linked into one shared library at the end. Its sources are all .cpp files of the folder.
-#   vln_room(NAME [SCHEMA] [EXCLUDE file...])
-# SCHEMA: the room includes generated class headers ("classes/VLNMPCA_Card.h").
+#   vln_room(NAME [SCHEMA] [FOLDERS])
+# SCHEMA: the room includes generated class headers ("classes/VLNMPCA_Card.h"). FOLDERS: the folders below
+# it belong to it as well.
 function(vln_room name)
-    cmake_parse_arguments(ARG "SCHEMA" "" "EXCLUDE" ${ARGN})
-    file(GLOB sources CONFIGURE_DEPENDS "${CMAKE_CURRENT_SOURCE_DIR}/*.cpp")
-    foreach(file IN LISTS ARG_EXCLUDE)
-        list(REMOVE_ITEM sources "${CMAKE_CURRENT_SOURCE_DIR}/${file}")
-    endforeach()
+    cmake_parse_arguments(ARG "SCHEMA;FOLDERS" "" "" ${ARGN})
+    set(glob GLOB)
+    if(ARG_FOLDERS)
+        set(glob GLOB_RECURSE)
+    endif()
+    file(${glob} sources CONFIGURE_DEPENDS "${CMAKE_CURRENT_SOURCE_DIR}/*.cpp")
     add_library(vln_${name} OBJECT ${sources})
     target_link_libraries(vln_${name} PUBLIC vln_warnings Threads::Threads)
     if(ARG_SCHEMA)
@@ -56,8 +58,8 @@ function(vln_test name)
 endfunction()
 
 # The rooms that the shared library is made of.
-set(VLN_PRODUCT_ROOMS vln_cimple vln_schema_meta vln_schema vln_foundation vln_device
-    vln_operations vln_agent vln_services vln_derivedObjects)
+set(VLN_PRODUCT_ROOMS vln_cimple vln_schema_meta vln_schema vln_foundation vln_library
+    vln_operations vln_device vln_agent vln_services vln_derivedObjects)
 
 # A module of the product's objects. With REPLACE, the objects of the named sources are left out and
 # the given sources take their place: the simulation's module differs in the host's root folder, the

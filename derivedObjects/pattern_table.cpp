@@ -1,8 +1,8 @@
 // The row of each of the provider's classes. A class has the shape of its store's group, and six
 // classes are active.
 
-#include "agent/dynamic_status.h"
 #include "agent/lock_order.h"
+#include "agent/status/dynamic_status.h"
 #include "derivedObjects/pattern.h"
 #include "stored_classes.h"
 

@@ -17,7 +17,7 @@ struct Provider_For {
 
 } // namespace cimple
 
-#include "services/base_server_profile.h"
-#include "services/configuration_setting.h"
+#include "services/configuration/provider.h"
+#include "services/profiles/provider.h"
 
 #endif // VLN_DERIVED_OBJECTS_PROVIDER_FOR_H

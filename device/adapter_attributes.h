@@ -8,7 +8,7 @@
 #define DEVICE_ADAPTER_ATTRIBUTES_H
 
 #include "cimple/types.h"
-#include "device/axapi.h"
+#include "device/library/axapi.h"
 
 #include <string>
 

@@ -2,7 +2,7 @@
 #ifndef DEVICE_ATTRIBUTE_TABLE_H
 #define DEVICE_ATTRIBUTE_TABLE_H
 
-#include "device/attribute_buffer.h"
+#include "device/library/attribute_buffer.h"
 #include "device/port_attributes.h"
 
 #include <span>

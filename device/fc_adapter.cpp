@@ -1,6 +1,6 @@
 #include "device/fc_adapter.h"
 
-#include "device/hba_api.h"
+#include "device/library/hba_api.h"
 #include "device/target_mapping.h"
 
 namespace cimple {

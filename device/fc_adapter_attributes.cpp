@@ -1,7 +1,7 @@
 #include "device/adapter.h"
 #include "device/adapter_attributes.h"
 #include "device/attribute_table.h"
-#include "device/hba_api.h"
+#include "device/library/hba_api.h"
 #include "foundation/common.h"
 #include "foundation/log.h"
 

@@ -1,6 +1,6 @@
 #include "device/adapter.h"
 #include "device/attribute_table.h"
-#include "device/hba_api.h"
+#include "device/library/hba_api.h"
 #include "device/port_attributes.h"
 #include "foundation/common.h"
 #include "foundation/log.h"

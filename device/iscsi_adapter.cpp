@@ -1,6 +1,6 @@
 #include "device/iscsi_adapter.h"
 
-#include "device/hba_api.h"
+#include "device/library/hba_api.h"
 
 namespace cimple {
 

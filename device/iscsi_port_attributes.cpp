@@ -1,5 +1,5 @@
 #include "device/attribute_table.h"
-#include "device/hba_api.h"
+#include "device/library/hba_api.h"
 #include "device/port_attributes.h"
 #include "foundation/common.h"
 #include "foundation/log.h"

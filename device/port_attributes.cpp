@@ -1,6 +1,6 @@
 #include "device/port_attributes.h"
 
-#include "device/attribute_buffer.h"
+#include "device/library/attribute_buffer.h"
 #include "foundation/common.h"
 
 namespace cimple {

@@ -5,7 +5,7 @@
 #define DEVICE_PORT_ATTRIBUTES_H
 
 #include "cimple/types.h"
-#include "device/axapi.h"
+#include "device/library/axapi.h"
 
 #include <array>
 #include <string>

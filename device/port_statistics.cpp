@@ -1,6 +1,6 @@
 #include "device/port_statistics.h"
 
-#include "device/attribute_buffer.h"
+#include "device/library/attribute_buffer.h"
 #include "foundation/log.h"
 
 #include <algorithm>

@@ -7,7 +7,7 @@
 #define DEVICE_SFF8472_H
 
 #include "cimple/types.h"
-#include "device/axapi.h"
+#include "device/library/axapi.h"
 
 #include <optional>
 #include <string>

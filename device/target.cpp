@@ -1,7 +1,7 @@
 #include "device/target.h"
 
 #include "device/fcoe_adapter.h"
-#include "device/hba_api.h"
+#include "device/library/hba_api.h"
 #include "foundation/common.h"
 #include "foundation/log.h"
 

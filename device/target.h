@@ -7,7 +7,7 @@
 #define DEVICE_TARGET_H
 
 #include "cimple/types.h"
-#include "device/axapi.h"
+#include "device/library/axapi.h"
 
 #include <string>
 

@@ -4,7 +4,7 @@
 #define DEVICE_TARGET_MAPPING_H
 
 #include "cimple/types.h"
-#include "device/axapi.h"
+#include "device/library/axapi.h"
 
 #include <cstddef>
 #include <memory>

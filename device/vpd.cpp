@@ -1,8 +1,8 @@
 #include "device/vpd.h"
 
+#include "device/library/identifiers.h"
 #include "foundation/common.h"
 #include "foundation/log.h"
-#include "operations/method_wrapper.h"
 
 #include <algorithm>
 #include <cstdio>
@@ -159,13 +159,13 @@ void walk(char* buffer, Take take) {
 // Reads the data with call(wwn, buffer, size) and hands each entry to take(entry).
 template <class Call, class Take>
 AX_STATUS read_entries(const char* deviceId, const char* function, Call call, Take take) {
-    char colonForm[VLN_MethodWrapper::HBA_NAME_SIZE];
-    if (VLN_MethodWrapper::Id2HBAName(colonForm, deviceId) != 0) {
+    char colonForm[VLN_Identifiers::HBA_NAME_SIZE];
+    if (VLN_Identifiers::Id2HBAName(colonForm, deviceId) != 0) {
         VLN_LOG(VLN_DBG, "Id2HBAName failed");
         return AX_STATUS_ERROR;
     }
     HBA_WWN name{};
-    if (VLN_MethodWrapper::str2HBAName(&name, colonForm) != 0) {
+    if (VLN_Identifiers::str2HBAName(&name, colonForm) != 0) {
         VLN_LOG(VLN_DBG, "str2HBAName failed");
         return AX_STATUS_ERROR;
     }

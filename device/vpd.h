@@ -3,7 +3,7 @@
 #define DEVICE_VPD_H
 
 #include "cimple/types.h"
-#include "device/axapi.h"
+#include "device/library/axapi.h"
 
 #include <cstddef>
 #include <string>
@@ -12,7 +12,7 @@
 namespace cimple {
 
 // The texts are padded with zeros, and have no terminator when they fill their field: read them
-// with fieldText (device/hba_api.h).
+// with fieldText (device/library/hba_api.h).
 struct FRUVPD {
     char manufacturer[256];
     char productName[256];

@@ -1,4 +1,4 @@
-#include "device/runtime_loader.h"
+#include "device/library/runtime_loader.h"
 #include "fuzz/fuzz.h"
 
 namespace fuzz {

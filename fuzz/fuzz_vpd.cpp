@@ -1,5 +1,5 @@
 // Vital product data: the buffer, the entries in it, and cursors that lead astray.
-#include "device/hba_api.h"
+#include "device/library/hba_api.h"
 #include "device/vpd.h"
 #include "fuzz/fuzz.h"
 

@@ -2,7 +2,7 @@
 #ifndef OPERATIONS_CURL_LIBRARY_H
 #define OPERATIONS_CURL_LIBRARY_H
 
-#include "device/runtime_loader.h"
+#include "device/library/runtime_loader.h"
 
 namespace cimple {
 

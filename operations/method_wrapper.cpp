@@ -1,6 +1,6 @@
 #include "operations/method_wrapper.h"
 
-#include "device/bound_functions.h"
+#include "device/library/bound_functions.h"
 #include "foundation/log.h"
 
 #include <cerrno>

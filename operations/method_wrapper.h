@@ -13,22 +13,15 @@
 #define OPERATIONS_METHOD_WRAPPER_H
 
 #include "cimple/types.h"
-#include "device/axapi.h"
+#include "device/library/identifiers.h"
 
 #include <string>
 #include <vector>
 
 namespace cimple {
 
-// An IP address: IPv4 in the first four bytes and the rest zero, or IPv6, in network order.
-struct VLN_IpInfo {
-    uint8 address[16];
-};
-
-class VLN_MethodWrapper {
+class VLN_MethodWrapper : public VLN_Identifiers {
 public:
-    // Bytes of a name in colon form with its end mark.
-    static constexpr std::size_t HBA_NAME_SIZE = 24;
     // Bytes of the name of the host's system with its end mark.
     static constexpr std::size_t TARGET_OS_SIZE = 41;
 
@@ -40,25 +33,6 @@ public:
     ~VLN_MethodWrapper();
     VLN_MethodWrapper(const VLN_MethodWrapper&) = delete;
     VLN_MethodWrapper& operator=(const VLN_MethodWrapper&) = delete;
-
-    // ---- Identifiers (identifiers.cpp) ----
-    //
-    // A device identifier is 16 hexadecimal digits, with or without a double quote in front; the
-    // colon form is "XX:XX:XX:XX:XX:XX:XX:XX". Mind the senses of the results.
-
-    // Device identifier to colon form; text has room for HBA_NAME_SIZE. 0, or 1 for a null
-    // argument. The characters are not tested: str2HBAName refuses what is no name.
-    static uint32 Id2HBAName(char* text, const char* deviceId);
-    // Colon form to binary. 0, or 1 when the text is not valid.
-    static uint32 str2HBAName(HBA_WWN* name, const char* text);
-    // 16 hexadecimal digits to binary. 1 for success and 0 for failure: the reverse of the others.
-    static uint32 string2HBAName(HBA_WWN* name, const char* text);
-    // Binary to colon form; text has room for HBA_NAME_SIZE. 0 always; a null text is left alone.
-    static uint32 HBAName2Str(char* text, const HBA_WWN* name);
-    // 0 when the name is a local adapter's, 1 otherwise.
-    static uint32 Validatewwpn(const HBA_WWN* name);
-    // Address or host name to binary; it may ask the resolver. 0, or 1 when that fails.
-    static uint32 ipAddr2IpInfo(const char* text, VLN_IpInfo* address);
 
     // ---- Library and features (library_queries.cpp) ----
 
@@ -87,7 +61,7 @@ public:
                                        AX_iSCSI_SessionList** sessions);
     static AX_STATUS GetiSCSILuns(const HBA_WWN* name, const char* target, AX_iSCSI_LunList** luns);
 
-    // ---- Port speed (port_speed.cpp) ----
+    // ---- Port speed (phy.cpp) ----
 
     // How the speed of the physical port is set. What the adapter does not tell is 0 or empty.
     static AX_STATUS GetPhyPortSpeedAttributesValues(const HBA_WWN* name,

@@ -18,10 +18,6 @@ void logAt(const Place& place, sint32 level, const char* line) {
 
 } // namespace
 
-AX_WWN wwnOf(const HBA_WWN* name) {
-    return name ? AX_WwnOf(name) : AX_WWN{};
-}
-
 Operation_Frame::Operation_Frame(const char* entry, const char* exit, Place place)
     : m_exit(exit), m_place(place) {
     logAt(m_place, VLN_DBG, entry);

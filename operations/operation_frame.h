@@ -22,7 +22,7 @@
 #define OPERATIONS_OPERATION_FRAME_H
 
 #include "cimple/types.h"
-#include "device/bound_functions.h"
+#include "device/library/bound_functions.h"
 #include "foundation/log.h"
 #include "operations/method_wrapper.h"
 
@@ -34,10 +34,6 @@ namespace cimple {
 // Logs the line of a failed library call at level 3, and what the library says of the status.
 #define VLN_OPERATION_FAILED(status, ...)                                                          \
     (VLN_LOG(VLN_ERR, __VA_ARGS__), ::cimple::VLN_MethodWrapper::logStatus(status))
-
-// The name as the library takes it. A null pointer gives the null name, which is no adapter's and
-// which the library refuses.
-AX_WWN wwnOf(const HBA_WWN* name);
 
 // The feature that an operation needs (AX_GetHBAFeature) and the lines of its absence.
 struct Feature_Test {

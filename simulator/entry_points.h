@@ -2,7 +2,7 @@
 #ifndef VLNSIM_ENTRY_POINTS_H
 #define VLNSIM_ENTRY_POINTS_H
 
-#include "device/axapi.h"
+#include "device/library/axapi.h"
 #include "simulator/entry_numbers.h"
 
 #include <string>

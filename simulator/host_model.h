@@ -4,7 +4,7 @@
 #ifndef VLNSIM_HOST_MODEL_H
 #define VLNSIM_HOST_MODEL_H
 
-#include "device/axapi.h"
+#include "device/library/axapi.h"
 
 #include <array>
 #include <cstdint>

@@ -1,5 +1,5 @@
 // The module for simulation bears the simulated host's name, never the machine's.
-#include "agent/host_identity.h"
+#include "agent/platform/host_identity.h"
 #include "simulator/vlnsim.h"
 
 namespace cimple {

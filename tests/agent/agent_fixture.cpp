@@ -1,8 +1,8 @@
 #include "tests/agent/agent_fixture.h"
 
 #include "derivedObjects/pattern.h"
-#include "device/axapi.h"
-#include "device/runtime_loader.h"
+#include "device/library/axapi.h"
+#include "device/library/runtime_loader.h"
 #include "foundation/host_paths.h"
 
 #include <cstring>

@@ -1,6 +1,6 @@
 // The masks of Fibre Channel ports as a client sees them.
 
-#include "agent/fc_port_tables.h"
+#include "agent/fcoe/fc_port_tables.h"
 
 #include "cimple/instance.h"
 #include "classes/VLNMPCA_FCPort.h"

@@ -1,5 +1,5 @@
 // Units that are seen twice and paths that lack an end.
-#include "agent/logical_unit_maps.h"
+#include "agent/san/logical_unit_maps.h"
 
 #include "agent/associations.h"
 #include "classes/CIM_ComputerSystem.h"

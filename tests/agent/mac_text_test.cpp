@@ -1,4 +1,4 @@
-#include "agent/mac_text.h"
+#include "agent/ethernet/mac_text.h"
 
 #include <gtest/gtest.h>
 

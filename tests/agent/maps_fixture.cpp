@@ -1,7 +1,7 @@
 #include "tests/agent/maps_fixture.h"
 
 #include "device/ip_interface.h"
-#include "device/runtime_loader.h"
+#include "device/library/runtime_loader.h"
 
 #include <cstdlib>
 

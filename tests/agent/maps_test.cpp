@@ -2,7 +2,7 @@
 
 #include "tests/agent/maps_fixture.h"
 
-#include "agent/host_identity.h"
+#include "agent/platform/host_identity.h"
 #include "derivedObjects/pattern.h"
 
 namespace cimple {

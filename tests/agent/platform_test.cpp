@@ -1,4 +1,4 @@
-#include "agent/host_identity.h"
+#include "agent/platform/host_identity.h"
 #include "cimple/thread_context.h"
 #include "classes/CIM_Chassis.h"
 #include "classes/CIM_ComputerSystem.h"

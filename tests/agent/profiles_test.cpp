@@ -1,6 +1,6 @@
 // The registered profiles of simulated hosts, and what conforms to them.
 
-#include "agent/profile_maps.h"
+#include "agent/profiles/profile_maps.h"
 
 #include "agent/associations.h"
 #include "classes/VLNMPCA_RegisteredProfile.h"

@@ -1,6 +1,6 @@
 // The software identities, the installation service and the record logs of simulated hosts.
 
-#include "agent/software_identity.h"
+#include "agent/software/software_identity.h"
 #include "foundation/common.h"
 #include "operations/curl_library.h"
 #include "tests/agent/maps_fixture.h"

@@ -1,7 +1,7 @@
 // FRU data in the stores, and the SAN pass over the device model, on simulated hosts.
 
 #include "agent/associations.h"
-#include "agent/vpd_maps.h"
+#include "agent/hardware/vpd_maps.h"
 #include "classes/VLNMPCA_Card.h"
 #include "classes/VLNMPCA_FRUElementVPD.h"
 #include "classes/VLNMPCA_FRUVitalProductData.h"

@@ -1,7 +1,7 @@
 // A closed library of the tests. What it exports is chosen at build time: FAKE_LAX, FAKE_AX and
 // FAKE_HBA. FAKE_IDENTITY goes into its answers, so that a test can tell which library answered.
 #define AX_LIBRARY
-#include "device/axapi.h"
+#include "device/library/axapi.h"
 
 #ifdef FAKE_LAX
 extern "C" AX_API AX_STATUS LAX_GetHBAFeature(AX_WWN, uint32_t identifier, uint32_t* value);

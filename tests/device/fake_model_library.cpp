@@ -192,9 +192,6 @@ AX_STATUS AX_IsLocalHBA(AX_WWN, uint32_t*) {
     return AX_STATUS_ERROR;
 }
 
-AX_WWN cimple::wwnOf(const HBA_WWN* name) {
-    return AX_WwnOf(name);
-}
 
 // ---- The HBA API ----
 

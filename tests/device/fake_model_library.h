@@ -3,7 +3,7 @@
 #ifndef TESTS_DEVICE_FAKE_MODEL_LIBRARY_H
 #define TESTS_DEVICE_FAKE_MODEL_LIBRARY_H
 
-#include "device/axapi.h"
+#include "device/library/axapi.h"
 
 #include <array>
 #include <cstdint>

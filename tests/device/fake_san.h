@@ -2,7 +2,7 @@
 #ifndef TESTS_DEVICE_FAKE_SAN_H
 #define TESTS_DEVICE_FAKE_SAN_H
 
-#include "device/axapi.h"
+#include "device/library/axapi.h"
 
 #include <array>
 #include <cstdint>

@@ -1,8 +1,8 @@
 #include "tests/device/model_fixture.h"
 
-#include "device/attribute_buffer.h"
 #include "device/fcoe_adapter.h"
 #include "device/iscsi_adapter.h"
+#include "device/library/attribute_buffer.h"
 #include "device/nic_adapter.h"
 
 #include <cstring>

@@ -1,6 +1,6 @@
 // The binding against real shared libraries: load order, log lines, arguments by value, reload.
-#include "device/bound_functions.h"
-#include "device/runtime_loader.h"
+#include "device/library/bound_functions.h"
+#include "device/library/runtime_loader.h"
 #include "tests/device/log_capture.h"
 
 #include <cstring>
@@ -185,7 +185,7 @@ TEST(Binding_Module, LetsNoBoundFunctionOut) {
     ASSERT_NE(module, nullptr) << dlerror();
     const char* const names[] = {
 #define VLN_BOUND(form, name, arguments, failure) #name,
-#include "device/bound_functions.inc"
+#include "device/library/bound_functions.inc"
 #undef VLN_BOUND
     };
     for (const char* name : names) {

@@ -1,8 +1,8 @@
 // The forms of the bound functions against a loader of the test's own: which library and symbol a
 // call looks for under each combination of missing flags, what it calls, and what it answers when
 // there is nothing to call.
-#include "device/bound_functions.h"
-#include "device/runtime_loader.h"
+#include "device/library/bound_functions.h"
+#include "device/library/runtime_loader.h"
 #include "tests/device/log_capture.h"
 
 #include <gtest/gtest.h>
@@ -104,7 +104,7 @@ struct Bound {
 
 const Bound ALL_BOUND[] = {
 #define VLN_BOUND(form, name, arguments, failure) {#name, [] { return failureOf(::name); }},
-#include "device/bound_functions.inc"
+#include "device/library/bound_functions.inc"
 #undef VLN_BOUND
 };
 

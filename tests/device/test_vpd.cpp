@@ -1,6 +1,6 @@
 // Reading the FRU data out of vital product data, and the text look-ups.
 
-#include "device/hba_api.h"
+#include "device/library/hba_api.h"
 #include "device/vpd.h"
 #include "tests/device/log_capture.h"
 

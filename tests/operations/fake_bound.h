@@ -2,7 +2,7 @@
 #ifndef TESTS_OPERATIONS_FAKE_BOUND_H
 #define TESTS_OPERATIONS_FAKE_BOUND_H
 
-#include "device/bound_functions.h"
+#include "device/library/bound_functions.h"
 
 #include <functional>
 #include <map>

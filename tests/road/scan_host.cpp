@@ -1,7 +1,7 @@
 #include "tests/road/scan_host.h"
 
 #include "device/fcoe_adapter.h"
-#include "device/runtime_loader.h"
+#include "device/library/runtime_loader.h"
 
 #include <sstream>
 #include <stdexcept>

@@ -1,5 +1,5 @@
 // Prints the number of adapters that the local library of the library path tells.
-#include "device/axapi.h"
+#include "device/library/axapi.h"
 
 #include <cstdio>
 #include <dlfcn.h>

@@ -2,7 +2,7 @@
 #ifndef TESTS_SIMULATOR_SIMULATED_H
 #define TESTS_SIMULATOR_SIMULATED_H
 
-#include "device/axapi.h"
+#include "device/library/axapi.h"
 #include "simulator/vlnsim.h"
 
 #include <dlfcn.h>

@@ -1,0 +1,27 @@
+// The table that the status thread and the status updates share: what each logical port last
+// reported.
+#ifndef VLN_AGENT_STATUS_DYNAMIC_PORT_STATUS_H
+#define VLN_AGENT_STATUS_DYNAMIC_PORT_STATUS_H
+
+#include "cimple/types.h"
+
+#include <vector>
+
+namespace cimple {
+
+struct Dynamic_Port_Row {
+    static constexpr std::size_t NAME_LENGTH = 20; // at most
+
+    uint32 functional_state;
+    uint32 physical_state;
+    char name[24]; // of the port, with its end mark
+};
+static_assert(sizeof(Dynamic_Port_Row) == 32);
+
+struct Dynamic_Port_Status {
+    std::vector<Dynamic_Port_Row> rows;
+};
+
+} // namespace cimple
+
+#endif // VLN_AGENT_STATUS_DYNAMIC_PORT_STATUS_H

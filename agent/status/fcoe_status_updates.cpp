@@ -1,0 +1,192 @@
+// Update routines of FCoE ports and their statistics.
+
+#include "agent/provider_agent.h"
+#include "agent/state_tables.h"
+#include "agent/status/dynamic_reading.h"
+#include "agent/status/dynamic_status.h"
+#include "agent/store_search.h"
+#include "agent/text.h"
+#include "classes/VLNMPCA_FCPort.h"
+#include "classes/VLNMPCA_FCPortStatistics.h"
+
+#include <cstring>
+#include <optional>
+
+namespace cimple {
+
+namespace {
+
+bool holds(const String& text, const std::string& port_name) {
+    return std::strstr(text.c_str(), port_name.c_str()) != nullptr;
+}
+
+// Calls update(port) for each port of the FCoE adapters.
+template <class Update>
+void for_each_fcoe_port(ProviderAgent& agent, Update update) {
+    for (const auto& adapter : agent.m_pData->adapters) {
+        if (adapter->getAdapterType() != ADAPTER_FCOE) {
+            VLN_LOG(VLN_DBG, "Skippping Adapter [%s] since it is not an FCoE Adapter",
+                    adapter->getAdapterName().c_str());
+            continue;
+        }
+        for (const auto& port : adapter->getPorts())
+            update(*port);
+    }
+}
+
+// ---- Ports ----
+
+std::optional<Attribute_Buffer> fetch_attributes(AX_WWN wwn) {
+    std::optional<Attribute_Buffer> buffer;
+    try {
+        buffer.emplace(AX_PORT_ATTRIBUTES_SIZE);
+    } catch (const std::bad_alloc&) {
+        VLN_LOG(VLN_ERR, "ERROR: vlncimGetPortAttributes: Unable to allocate buffer");
+        return buffer;
+    }
+    if (!fetch_port_attributes(wwn, *buffer, "AX_GetPortAttributes"))
+        buffer.reset();
+    return buffer;
+}
+
+// The properties in turn, up to the first that can't be read.
+void read_port(Attribute_Buffer& buffer, VLNMPCA_FCPort& port) {
+    constexpr char STATE[] = "ERROR: AX_GetttributeValue for PortState";
+    uint32 number = 0;
+    uint8 detail = 0;
+    if (!read_number(buffer, PHYSICAL_PORT_STATE, STATE, number))
+        return;
+    replace_port_state(&port, find_fcoe_port_state(number));
+    if (!read_number(buffer, FUNCTIONAL_PORT_STATE, STATE, detail))
+        return;
+    port.DetailedStatus.set(detail);
+    if (!read_number(buffer, PORT_TYPE, "ERROR: AX_GetttributeValue for PortType", number))
+        return;
+    const Port_Type& type = find_port_type(number);
+    port.PortType.set(type.port_type);
+    port.OtherPortType.set(type.name);
+    if (!read_number(buffer, PORT_SPEED, "AX_GetttributeValue for PortSpeed", number))
+        return;
+    port.Speed.set(speed_of_code(number));
+    if (!read_number(buffer, PHYSICAL_PORT_SPEED, "AX_GetttributeValue for PhysicalPortSpeed",
+                     number))
+        return;
+    port.PhysicalPortSpeed.set(speed_of_code(number));
+    Attribute_Text speed;
+    if (getAttributeText(PORT_FAMILY, speed, buffer, FUNCTIONAL_PORT_SPEED,
+                         "FunctionalPortSpeed") == AX_STATUS_OK)
+        port.FunctionalPortSpeed.set(text(speed));
+}
+
+void update_port(const ProviderAgent& agent, const std::string& name) {
+    VLN_LOG(VLN_DBG, "Fetching Port Speeds.");
+    auto* port = find_first(agent.m_VLNMPCA_FCPort_map, [&](const VLNMPCA_FCPort& candidate) {
+        return holds(candidate.DeviceID.value, name);
+    });
+    AX_WWN wwn{};
+    if (!port || !wwn_of_name(name.c_str(), wwn))
+        return;
+    if (auto buffer = fetch_attributes(wwn))
+        read_port(*buffer, *port);
+}
+
+// ---- Statistics ----
+
+enum class Counter_Rule : uint8 {
+    PLAIN,         // one that the library does not report shows as its start value
+    WORDS,         // the library counts words of four bytes
+    REPORTED_ONLY, // the property stays as it is without a report
+};
+
+struct Counter_Row {
+    uint16 identifier;
+    Property<uint64> VLNMPCA_FCPortStatistics::*property;
+    Counter_Rule rule = Counter_Rule::PLAIN;
+};
+
+using S = VLNMPCA_FCPortStatistics;
+
+// Every counter that has a property; 1059 has none.
+constexpr Counter_Row COUNTERS[] = {
+    {1030, &S::BytesTransmitted, Counter_Rule::WORDS},
+    {1031, &S::BytesReceived, Counter_Rule::WORDS},
+    {1025, &S::PacketsTransmitted},
+    {1032, &S::PacketsReceived},
+    {1033, &S::LIPCount},
+    {1036, &S::NOSCount, Counter_Rule::REPORTED_ONLY},
+    {1037, &S::ErrorFrames},
+    {1038, &S::DumpedFrames, Counter_Rule::REPORTED_ONLY},
+    {1039, &S::LinkFailures},
+    {1041, &S::LossOfSignalCounter},
+    {1040, &S::LossOfSyncCounter},
+    {1042, &S::PrimitiveSeqProtocolErrCount},
+    {1044, &S::CRCErrors},
+    {1043, &S::InvalidTransmissionWords},
+    {1045, &S::TxSequences},
+    {1028, &S::RxSequences},
+    {1029, &S::ExCountOrig},
+    {1026, &S::ExCountResp},
+    {1027, &S::ActiveXRIs},
+    {1048, &S::ActiveRPIs},
+    {1047, &S::ElasticBufOverruns},
+    {1058, &S::LinkTransitions},
+    {1046, &S::PrimitiveSeqTimesouts},
+    {1057, &S::ArbitrationTimeouts},
+};
+
+void copy_counters(const PortStatistics& counters, VLNMPCA_FCPortStatistics& statistics) {
+    for (const Counter_Row& row : COUNTERS) {
+        const uint64 count = counters.counter(row.identifier);
+        if (row.rule == Counter_Rule::REPORTED_ONLY && count >= PortStatistics::NOT_REPORTED)
+            continue;
+        (statistics.*row.property).set(row.rule == Counter_Rule::WORDS ? count * 4 : count);
+    }
+}
+
+void update_statistics(const ProviderAgent& agent, Port& port) {
+    auto* statistics = find_first(agent.m_VLNMPCA_FCPortStatistics_map,
+                                  [&](const VLNMPCA_FCPortStatistics& candidate) {
+                                      return holds(candidate.InstanceID.value, port.getPortName());
+                                  });
+    if (!statistics)
+        return;
+    readFCoEPortStatistics(port, *statistics);
+}
+
+} // namespace
+
+void readFCoEPortStatistics(Port& port, VLNMPCA_FCPortStatistics& statistics) {
+    try {
+        if (const PortStatistics* counters = port.getPortStatistics()) {
+            statistics.StatisticTime.set(Datetime::now());
+            copy_counters(*counters, statistics);
+        }
+    } catch (...) {
+        VLN_LOG(VLN_ERR, "Error occurred while retrieving FCoEPort Statistics");
+        VLN_LOG(VLN_ERR, "Error getting FCoE Port statistics");
+    }
+}
+
+void UpdateFCoEPortStatus(ProviderAgent& agent) {
+    if (!update_due(agent, UPDATE_FC_PORT))
+        return;
+    VLN_LOG(VLN_DBG, "PERF: update driver map");
+    for_each_fcoe_port(agent, [&agent](const Port& port) {
+        try {
+            update_port(agent, port.getPortName());
+        } catch (...) {
+            VLN_LOG(VLN_ERR, "Error occurred while retrieving FCoEPort status...");
+            VLN_LOG(VLN_ERR, "Error getting FCoE Port status");
+        }
+    });
+}
+
+void GetFCoEPortStats(ProviderAgent& agent) {
+    if (!update_due(agent, UPDATE_FC_PORT_STATISTICS))
+        return;
+    VLN_LOG(VLN_DBG, "GetFCoEPortStats(): Update");
+    for_each_fcoe_port(agent, [&agent](Port& port) { update_statistics(agent, port); });
+    VLN_LOG(VLN_DBG, "PERF: GetFCoEPortStats: cleanExit");
+}
+
+} // namespace cimple

@@ -1,0 +1,189 @@
+// Update routines of Ethernet ports, port controllers and cards.
+
+#include "agent/hardware/port_identity.h"
+#include "agent/provider_agent.h"
+#include "agent/state_tables.h"
+#include "agent/status/dynamic_reading.h"
+#include "agent/status/dynamic_status.h"
+#include "agent/store_search.h"
+#include "classes/VLNMPCA_Card.h"
+#include "classes/VLNMPCA_EthernetPort.h"
+#include "classes/VLNMPCA_PortController.h"
+
+#include <cstring>
+
+namespace cimple {
+
+namespace {
+
+// The first Ethernet port that bears the identity.
+const VLNMPCA_EthernetPort* find_port(const ProviderAgent& agent, const char* description,
+                                      const String& identity) {
+    return find_first(agent.m_VLNMPCA_EthernetPort_map, [&](const VLNMPCA_EthernetPort& port) {
+        const String* found = port_identity(port, description);
+        return found && *found == identity;
+    });
+}
+
+// ---- Ethernet ports ----
+
+// States that the device model read at the last scan; false for a port that it does not know.
+bool find_states(VLN_Data& data, const String& name, Dynamic_Port_Row& row) {
+    const auto take = [&row](const auto* attributes) {
+        if (attributes) {
+            row.functional_state = attributes->FunctionalPortState;
+            row.physical_state = attributes->PhysicalPortState;
+        }
+        return attributes != nullptr;
+    };
+    for (const auto& adapter : data.adapters) {
+        for (const auto& port : adapter->getPorts()) {
+            PortAttributes* attributes = port->getPortAttributes();
+            if (name == port->getPortName().c_str() &&
+                (take(dynamic_cast<const NICPortAttributes*>(attributes)) ||
+                 take(dynamic_cast<const iSCSIPortAttributes*>(attributes))))
+                return true;
+        }
+    }
+    return false;
+}
+
+// A port whose name is no port's, or is too long for a row, is never polled.
+std::unique_ptr<Dynamic_Port_Status> port_status(ProviderAgent& agent) {
+    auto status = std::make_unique<Dynamic_Port_Status>();
+    const auto& ports = agent.m_VLNMPCA_EthernetPort_map;
+    status->rows.reserve(ports.size());
+    for (uint32 i = 0; i < ports.size(); ++i) {
+        const String& name = ports[i]->DeviceID.value;
+        Dynamic_Port_Row row{};
+        if (name.size() > Dynamic_Port_Row::NAME_LENGTH || !find_states(*agent.m_pData, name, row))
+            continue;
+        std::memcpy(row.name, name.c_str(), name.size());
+        status->rows.push_back(row);
+    }
+    return status;
+}
+
+void start_thread(ProviderAgent& agent) {
+    if (agent.m_VLNMPCA_EthernetPort_map.size() == 0) {
+        VLN_LOG(VLN_DBG, "No Logical Port available to fetch the dynamic properties");
+        return;
+    }
+    try {
+        auto status = port_status(agent);
+        Auto_Mutex lock(agent.m_DynamicPortStatusMutex);
+        agent.m_pDynamicPortStatus = std::move(status);
+    } catch (const std::bad_alloc&) {
+        VLN_LOG(VLN_ERR, "ERROR: GetPortAttributes: Unable to allocate buffer");
+        throw;
+    }
+    VLN_LOG(VLN_DBG, "PERF: Creating DynamicDataFetch_Handler Thread.");
+    if (Thread::create_joinable(agent.m_DynamicPortThread, DynamicDataFetch_Handler, &agent) != 0) {
+        VLN_LOG(VLN_DBG, "PERF: Thread DynamicDataFetch_Handler Creation failed");
+        return;
+    }
+    agent.m_DynamicPortThreadInitialized = true;
+}
+
+void show_status(VLNMPCA_EthernetPort& port, const Dynamic_Port_Row& row) {
+    replace_port_state(&port, find_port_state(portStateMap, row.functional_state));
+    VLN_LOG(VLN_DBG, "Updating port speeds.");
+    port.DetailedStatus.set(static_cast<uint16>(row.functional_state));
+    port.EnabledState.set(enabled_state(row.physical_state));
+    // A link that comes back gets its speeds at the next refresh.
+    if (row.physical_state != PHYSICAL_STATE_UP) {
+        port.Speed.set(0);
+        port.PhysicalPortSpeed.set(0);
+        port.FunctionalPortSpeed.set("Not Available");
+    }
+}
+
+void show_port_status(ProviderAgent& agent) {
+    const auto& ports = agent.m_VLNMPCA_EthernetPort_map;
+    Auto_Mutex lock(agent.m_DynamicPortStatusMutex);
+    for (uint32 i = 0; i < ports.size(); ++i)
+        for (const Dynamic_Port_Row& row : agent.m_pDynamicPortStatus->rows)
+            if (ports[i]->DeviceID.value == row.name)
+                show_status(*ports[i], row);
+}
+
+// ---- Port controllers and cards ----
+
+void update_phy_link_down_reason(const ProviderAgent& agent, VLNMPCA_PortController& controller,
+                                 Attribute_Buffer& buffer) {
+    const auto* port = find_port(agent, IDENTITY_PHYSICAL_PORT, controller.DeviceID.value);
+    AX_WWN wwn{};
+    uint32 reason = 0;
+    if (port && wwn_of_name(port->DeviceID.value.c_str(), wwn) &&
+        fetch_port_attributes(wwn, buffer, "ERROR: AX_GetPortAttributes") &&
+        read_number(buffer, PHY_LINK_DOWN_REASON,
+                    "ERROR: AX_GetttributeValue for _PhyLinkDownReason", reason))
+        controller.PhyLinkDownReason.set(reason);
+}
+
+// The serial number by which functions know their card: what the card's own data say of it may be
+// another one. Throws std::exception if the library refuses.
+void update_board_temperature(const ProviderAgent& agent, VLNMPCA_Card& card) {
+    const auto* port = find_port(agent, IDENTITY_SERIAL, card.VLNSerialNumber.value);
+    AX_WWN wwn{};
+    if (!port || !wwn_of_name(port->DeviceID.value.c_str(), wwn))
+        return;
+    Attribute_Buffer buffer = fetchAdapterAttributes(wwn);
+    // The bytes above the first are the temperature's thresholds.
+    uint8 celsius = 0;
+    if (read_number(buffer, BOARD_TEMPERATURE, "ERROR: AX_GetttributeValue for _BoardTemperature",
+                    celsius))
+        card.BoardTemperature.set(celsius);
+}
+
+} // namespace
+
+void UpdateEthernetPortStatus(ProviderAgent& agent) {
+    if (update_due(agent, UPDATE_ETHERNET_PORT))
+        UpdateDynamicEthernetPortStatus(agent);
+}
+
+void UpdateDynamicEthernetPortStatus(ProviderAgent& agent) {
+    VLN_LOG(VLN_DBG, "PERF: UpdateDynamicEthernetPortStatus: Entry");
+    if (!agent.m_bIsAdapterMapsReady) {
+        VLN_LOG(VLN_DBG, "Returning from m_bIsAdapterMapsReady condn");
+        return;
+    }
+    if (!agent.m_DynamicPortThreadInitialized) {
+        VLN_LOG(VLN_DBG, "Returning from m_DynamicPortThreadInitialized false condn");
+        start_thread(agent);
+        return;
+    }
+    VLN_LOG(VLN_DBG, "Returning from m_DynamicPortThreadInitialized true condn");
+    try {
+        show_port_status(agent);
+    } catch (...) {
+        VLN_LOG(VLN_ERR, "Error getting Nic Port status");
+    }
+}
+
+void UpdatePhyLinkDownReason(ProviderAgent& agent) {
+    if (!update_due(agent, UPDATE_PHY_LINK_DOWN_REASON))
+        return;
+    Attribute_Buffer buffer(AX_PORT_ATTRIBUTES_SIZE);
+    const auto& controllers = agent.m_VLNMPCA_PortController_map;
+    for (uint32 i = 0; i < controllers.size(); ++i)
+        update_phy_link_down_reason(agent, *controllers[i], buffer);
+    VLN_LOG(VLN_DBG, "UpdatePhyLinkDownReason(): Successful");
+}
+
+void UpdateBoardTemp(ProviderAgent& agent) {
+    if (!update_due(agent, UPDATE_BOARD_TEMPERATURE))
+        return;
+    const auto& cards = agent.m_VLNMPCA_Card_map;
+    for (uint32 i = 0; i < cards.size(); ++i) {
+        try {
+            update_board_temperature(agent, *cards[i]);
+        } catch (...) {
+            VLN_LOG(VLN_ERR, "Error Updating Borad Temperature");
+        }
+    }
+    VLN_LOG(VLN_DBG, "UpdateBoardTemp(): Successful");
+}
+
+} // namespace cimple

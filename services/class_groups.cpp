@@ -1,0 +1,34 @@
+#include "agent/class_groups.h"
+
+#include "foundation/logger.h"
+#include "services/configuration/instances.h"
+#include "services/driver_parameters/instances.h"
+#include "services/firmware/instances.h"
+#include "services/record_logs/instances.h"
+#include "services/wwn/instances.h"
+
+namespace cimple {
+
+namespace {
+
+using enum Group_Place;
+
+constexpr Class_Group GROUPS[] = {
+    {.place = PLATFORM, .create = create_configuration_settings},
+    {.place = NIC_CARDS,
+     .create = StartSoftwareInstallationService,
+     .failed = {VLN_CRIT, "StartSoftwareInstallationService failed"}},
+    {.place = LOGS, .create = create_record_logs},
+    {.place = FCOE,
+     .create = start_wwn_service,
+     .failed = {VLN_CRIT, "Failed to create WWN Services class"}},
+    {.place = FCOE, .create = create_driver_parameter_service},
+    {.place = FC_PORT, .create = create_driver_parameters},
+    {.place = FC_PORTS, .create = join_driver_parameters},
+};
+
+} // namespace
+
+constinit const std::span<const Class_Group> class_groups = GROUPS;
+
+} // namespace cimple

@@ -1,0 +1,126 @@
+#include "services/profiles/provider.h"
+
+#include "agent/associations.h"
+#include "agent/gates.h"
+#include "cimple/cimom.h"
+#include "classes/PG_RegisteredProfile.h"
+#include "classes/VLNMPCA_RegisteredProfile.h"
+
+#include <memory>
+#include <vector>
+
+namespace cimple {
+
+namespace {
+
+constexpr char PLATFORM_CLASS[] = "OMC_RegisteredBaseServerProfile";
+
+struct Class_Releaser {
+    void operator()(const Meta_Class* meta_class) const { unref(meta_class); }
+};
+using Class_Handle = std::unique_ptr<Meta_Class, Class_Releaser>;
+
+using Profiles = std::vector<Ref<VLNMPCA_RegisteredProfile>>;
+
+// Copies, so that no lock of the agent is held during the up-call.
+Profiles registered_profiles(ProviderAgent& agent) {
+    agent.BuildCimpleInfo();
+    const Gate maps = adapter_maps_gate(agent);
+    Auto_Mutex data(agent.m_DataMutex);
+    const auto& store = agent.m_VLNMPCA_RegisteredProfile_map;
+    Profiles profiles;
+    for (uint32 i = 0; i < store.size(); ++i)
+        profiles.emplace_back(clone(store[i]));
+    return profiles;
+}
+
+bool is_base_server(const PG_RegisteredProfile* profile) {
+    return profile && profile->RegisteredName.value == "Base Server";
+}
+
+// The class is the platform's and no part of the schema; its instances look like those of the class
+// that it is derived from. They count the class that is made here, and so outlive this call.
+Ref<PG_RegisteredProfile> base_server_profile() {
+    const Class_Handle platform_class(
+        create_meta_class(PLATFORM_CLASS, &PG_RegisteredProfile::static_meta_class, FLAG_CLASS));
+    const Ref<Instance> model(create(platform_class.get()));
+    VLN_LOG(VLN_DBG,
+            "up-call to enumerate OMC_RegisteredBaseServerProfile/OMC_RegisteredBaseServerProfile/"
+            "PG_RegisteredProfile created--calling now");
+    Instance_Enumerator enumerator;
+    if (cimom::enum_instances(INTEROP_NAME_SPACE, model.get(), enumerator) != 0)
+        return {};
+    for (; enumerator.more(); enumerator.next()) {
+        Ref<PG_RegisteredProfile> profile(enumerator.get().release());
+        if (!is_base_server(profile.get()))
+            continue;
+        profile->__name_space = INTEROP_NAME_SPACE;
+        return profile;
+    }
+    return {};
+}
+
+// Shares the platform's profile instead of cloning it, since a clone would not count its class.
+Ref<VLNMPCA_BaseServerReferencedProfile>
+reference_to(const Ref<PG_RegisteredProfile>& base_server,
+             const Ref<VLNMPCA_RegisteredProfile>& profile) {
+    auto association = make_instance<VLNMPCA_BaseServerReferencedProfile>();
+    association->Antecedent = Ref<PG_RegisteredProfile>(base_server).release();
+    association->Dependent = Ref<VLNMPCA_RegisteredProfile>(profile).release();
+    return association;
+}
+
+void enumerate(ProviderAgent& agent, const Enum_Instances_Handler& handler) {
+    const Profiles profiles = registered_profiles(agent);
+    const auto base_server = base_server_profile();
+    if (!base_server)
+        return;
+    for (const auto& profile : profiles)
+        if (!handler.handle(reference_to(base_server, profile).release()))
+            return;
+}
+
+// The antecedent's class is unknown to the engine, which drops it from the path of a get. The
+// platform has one such profile: ours tells which reference is meant.
+Ref<VLNMPCA_BaseServerReferencedProfile> find(ProviderAgent& agent,
+                                              const VLNMPCA_BaseServerReferencedProfile& model) {
+    if (!model.Dependent)
+        return {};
+    for (const auto& profile : registered_profiles(agent)) {
+        if (!key_eq(profile.get(), model.Dependent))
+            continue;
+        const auto base_server = base_server_profile();
+        if (base_server && (!model.Antecedent || key_eq(base_server.get(), model.Antecedent)))
+            return reference_to(base_server, profile);
+    }
+    return {};
+}
+
+} // namespace
+
+sint32 Base_Server_Profile_Provider::get_instance(const VLNMPCA_BaseServerReferencedProfile* model,
+                                                  VLNMPCA_BaseServerReferencedProfile*& instance) {
+    ProviderAgent* agent = ProviderAgent::current();
+    try {
+        if (agent)
+            instance = find(*agent, *model).release();
+    } catch (...) {
+        VLN_LOG(VLN_CRIT, "Exception in CIM Provider Enumeration - do nothing");
+    }
+    return instance ? GET_INSTANCE_OK : GET_INSTANCE_NOT_FOUND;
+}
+
+sint32 Base_Server_Profile_Provider::enum_instances(const VLNMPCA_BaseServerReferencedProfile*,
+                                                    const Enum_Instances_Handler& handler) {
+    ProviderAgent* agent = ProviderAgent::current();
+    if (!agent)
+        return ENUM_INSTANCES_OK;
+    try {
+        enumerate(*agent, handler);
+    } catch (...) {
+        VLN_LOG(VLN_CRIT, "Exception in CIM Provider Enumeration - do nothing");
+    }
+    return ENUM_INSTANCES_OK;
+}
+
+} // namespace cimple

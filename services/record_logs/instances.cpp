@@ -1,0 +1,141 @@
+// The logs that a console can read: the provider's own, and the management library's.
+
+#include "services/record_logs/instances.h"
+
+#include "agent/associations.h"
+#include "agent/profiles/profile_maps.h"
+#include "agent/provider_agent.h"
+#include "agent/software/software_identity.h"
+#include "agent/text.h"
+#include "classes/VLNMPCA_EnabledRecordLogCapabilities.h"
+#include "classes/VLNMPCA_RecordLog.h"
+#include "classes/VLNMPCA_RegisteredProfile.h"
+#include "classes/VLNMPCA_SoftwareIdentity.h"
+#include "foundation/host_paths.h"
+
+namespace cimple {
+
+namespace {
+
+constexpr uint64 MAX_RECORDS = 1024;
+constexpr uint16 LOG_STATE_NOT_APPLICABLE = 4;  // CIM_Log.LogState
+constexpr uint16 OVERWRITE_WRAPS_WHEN_FULL = 2; // CIM_Log.OverwritePolicy
+constexpr uint16 HEALTH_STATE_OK = 5;
+constexpr uint16 NIMA_LOG_LEVEL = 3;
+constexpr uint16 STATE_ENABLED = 2;
+constexpr uint16 STATE_DISABLED = 3;
+constexpr uint16 REQUESTED_STATE_NO_CHANGE = 5;
+
+// What both logs have in common.
+Ref<VLNMPCA_RecordLog> record_log(const char* key_prefix, const CIM_ComputerSystem& system,
+                                  const char* name) {
+    auto log = make_instance<VLNMPCA_RecordLog>();
+    log->InstanceID.set(format_text("%s:%s", key_prefix, system.Name.value.c_str()));
+    log->MaxNumberOfRecords.set(MAX_RECORDS);
+    log->LogState.set(LOG_STATE_NOT_APPLICABLE);
+    log->OverwritePolicy.set(OVERWRITE_WRAPS_WHEN_FULL);
+    log->RequestedState.set(STATE_ENABLED);
+    log->EnabledState.set(STATE_ENABLED);
+    log->HealthState.set(HEALTH_STATE_OK);
+    log->Name.set(name);
+    log->ElementName.set(name);
+    return log;
+}
+
+String trace_path(Provider_Loggers& loggers) {
+    Auto_Mutex lock(CLogger::instance().list_lock());
+    return loggers.file().get_path();
+}
+
+Ref<VLNMPCA_RecordLog> provider_log_instance(const CIM_ComputerSystem& system,
+                                             Provider_Loggers& loggers) {
+    const CLogger& logger = CLogger::instance();
+    auto log = record_log("VLNMPCA:ProviderLog", system, "Record logs for Vorlan CIM Provider");
+    // An enabled logger shows 5 and 3 and a disabled one 2 and 2: consoles know it so.
+    if (logger.is_enabled()) {
+        log->RequestedState.set(REQUESTED_STATE_NO_CHANGE);
+        log->EnabledState.set(STATE_DISABLED);
+    }
+    log->TracePath.set(trace_path(loggers));
+    log->LogLevel.set(static_cast<uint16>(logger.get_level()));
+    log->LogMode.set(static_cast<uint16>(logger.get_mode()));
+    return log;
+}
+
+Ref<VLNMPCA_RecordLog> nima_log_instance(const CIM_ComputerSystem& system) {
+    auto log = record_log("VLN:MPCA NIMA Record Log", system, "NIMA logs for Vorlan CIM Provider");
+    log->TracePath.set(text(host_path(Host_File::NIMA_LOG)));
+    log->LogLevel.set(NIMA_LOG_LEVEL);
+    return log;
+}
+
+Ref<VLNMPCA_EnabledRecordLogCapabilities> capabilities_instance() {
+    auto capabilities = make_instance<VLNMPCA_EnabledRecordLogCapabilities>();
+    capabilities->InstanceID.set("VLNMPCA provider log capabilities");
+    for (uint16 state : {STATE_ENABLED, STATE_DISABLED}) {
+        capabilities->RequestedStatesSupported.append(state);
+        capabilities->LogParamsSupported.append(state);
+    }
+    capabilities->ElementNameEditSupported.set(false);
+    return capabilities;
+}
+
+void conform(ProviderAgent& agent, const VLNMPCA_RecordLog& log) {
+    Profile_Maps(agent).createRecordLogConforms(
+        format_text("%s conformant to %s profile", log.ElementName.value.c_str(),
+                    profile_table[PROFILE_REGISTRATION].name),
+        PROFILE_REGISTRATION, &log);
+}
+
+// Only the provider's log can be switched and given another level.
+void create_capabilities(ProviderAgent& agent, const VLNMPCA_RecordLog* provider_log) {
+    const auto* capabilities =
+        insert_instance(agent.m_VLNMPCA_EnabledRecordLogCapabilities_map, capabilities_instance());
+    if (provider_log)
+        associate_as(
+            agent.m_VLNMPCA_RecordLogCapabilities_map,
+            format_text("%s : Logging capabilities", provider_log->ElementName.value.c_str()),
+            provider_log, capabilities);
+}
+
+// A host without a NIC has no software identity of the provider: its logs are nobody's, and the
+// pass goes on to what else the host has.
+uint32 join_with_provider(ProviderAgent& agent) {
+    const auto* provider = find_provider_identity(agent.m_VLNMPCA_SoftwareIdentity_map);
+    if (!provider) {
+        VLN_LOG(VLN_DBG, "Missing Provider Software Identity");
+        return agent.m_pData->hasNICAdapter ? END_PASS : MAP_OK;
+    }
+    const auto& logs = agent.m_VLNMPCA_RecordLog_map;
+    for (uint32 i = 0; i < logs.size(); ++i)
+        associate_as(agent.m_VLNMPCA_ProviderUseOfLog_map,
+                     format_text("%s uses log : %s", provider->ElementName.value.c_str(),
+                                 logs[i]->ElementName.value.c_str()),
+                     logs[i], provider);
+    return MAP_OK;
+}
+
+} // namespace
+
+uint32 create_record_logs(const Map_Scope& scope) {
+    ProviderAgent& agent = scope.agent;
+    auto& logs = agent.m_VLNMPCA_RecordLog_map;
+    const auto* provider_log =
+        insert_instance(logs, provider_log_instance(*scope.system, agent.m_Loggers),
+                        "Insert Failed : m_VLNMPCA_VLNMPCA_RecordLog_map");
+    const auto* nima_log = insert_instance(logs, nima_log_instance(*scope.system));
+
+    Profile_Maps profiles(agent);
+    profiles.registerForSystem(PROFILE_RECORD_LOG);
+    if (!profiles.find(PROFILE_REGISTRATION)) {
+        VLN_LOG(VLN_CRIT, "Missing Profile Registration Profile instance");
+        return END_PASS;
+    }
+    for (const auto* log : {provider_log, nima_log})
+        if (log)
+            conform(agent, *log);
+    create_capabilities(agent, provider_log);
+    return join_with_provider(agent);
+}
+
+} // namespace cimple

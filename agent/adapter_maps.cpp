@@ -5,6 +5,7 @@
 #include "agent/hardware/vpd_maps.h"
 #include "agent/iscsi/iscsi_maps.h"
 #include "agent/profiles/profile_maps.h"
+#include "cimple/guard.h"
 
 namespace cimple {
 
@@ -92,29 +93,31 @@ uint32 Adapter_Map_Builder::createNICSoftware() {
 
 // What throws in here ends all that is made of NIC adapters, and nothing else.
 uint32 Adapter_Map_Builder::createNICClasses() {
-    try {
-        if (const uint32 status = createNICCards())
-            return status;
-        if (const uint32 status = makeGroups(Group_Place::NIC_PORTS))
-            return status;
-        if (const uint32 status = createIPClasses())
-            return status;
-        return makeGroups(Group_Place::NIC);
-    } catch (...) {
-        VLN_LOG(VLN_DBG, "Unknown exception in  NIC card discovery");
-    }
+    uint32 status = MAP_OK;
+    const bool complete = run_guarded([&] {
+        status = createNICCards();
+        if (status == MAP_OK)
+            status = makeGroups(Group_Place::NIC_PORTS);
+        if (status == MAP_OK)
+            status = createIPClasses();
+        if (status == MAP_OK)
+            status = makeGroups(Group_Place::NIC);
+    });
+    if (complete)
+        return status;
+    VLN_LOG(VLN_DBG, "Unknown exception in  NIC card discovery");
     return MAP_OK;
 }
 
 // A closing step: what fails here leaves the identities as they are.
 void Adapter_Map_Builder::updateSoftwareIdentities() {
-    try {
+    const bool complete = run_guarded([this] {
         VLN_LOG(VLN_DBG, "Updating FRU information to Softwareidentity Class");
         if (VPD_Maps(_agent).UpdateFRUToSoftwareInstance() != 0)
             VLN_LOG(VLN_DBG, "Failed to update FRU VPD data to cim_softwareidentity instances");
-    } catch (...) {
+    });
+    if (!complete)
         VLN_LOG(VLN_DBG, "UpdateFRUToSoftwareInstance failed");
-    }
 }
 
 } // namespace cimple

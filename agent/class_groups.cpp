@@ -1,5 +1,6 @@
 #include "agent/class_groups.h"
 
+#include "cimple/guard.h"
 #include "foundation/log.h"
 
 namespace cimple {
@@ -23,13 +24,12 @@ uint32 create(const Class_Group& group, const Map_Scope& scope) {
 uint32 create_guarded(const Class_Group& group, const Map_Scope& scope) {
     if (!group.thrown.text)
         return create(group, scope);
-    try {
-        return create(group, scope);
-    } catch (...) {
-        if (group.clear)
-            group.clear(scope.agent);
-        tell(group.thrown);
-    }
+    uint32 status = MAP_OK;
+    if (run_guarded([&] { status = create(group, scope); }))
+        return status;
+    if (group.clear)
+        group.clear(scope.agent);
+    tell(group.thrown);
     return MAP_OK;
 }
 

@@ -1,6 +1,7 @@
 // How the stores are emptied: tables of groups with their log lines, in the order of the lines.
 
 #include "agent/provider_agent.h"
+#include "cimple/guard.h"
 
 namespace cimple {
 
@@ -39,23 +40,19 @@ void run_step(Instance_Stores& stores, const Clearing_Step& step) {
 } // namespace
 
 void ProviderAgent::clearAdapterMaps() {
-    try {
+    const bool complete = run_guarded([this] {
         for (const Clearing_Step& step : ADAPTER_STEPS)
             run_step(*this, step);
-    } catch (...) {
+    });
+    if (!complete)
         VLN_LOG(VLN_ERR, "Error in clearAdapterMaps()");
-    }
     VLN_LOG(VLN_DBG, "Exiting clearAdapterMaps()");
 }
 
 void ProviderAgent::clearSANMaps() {
-    for (const Clearing_Step& step : SAN_STEPS) {
-        try {
-            run_step(*this, step);
-        } catch (...) {
+    for (const Clearing_Step& step : SAN_STEPS)
+        if (!run_guarded([&] { run_step(*this, step); }))
             VLN_LOG(VLN_ERR, "Error in FCoE clearSANMaps()");
-        }
-    }
     VLN_LOG(VLN_DBG, "Exiting clearSANMaps()");
 }
 

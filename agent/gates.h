@@ -44,13 +44,15 @@ void request_stale_san_maps(ProviderAgent& agent);
 
 // What every method and every writing operation of a class provider begins with: the refresh check,
 // the gates of the adapter data and of the adapter maps, each let go again, then m_DataMutex, held
-// to the end of the scope and so through every call into the management library.
+// to the end of the scope and so through every call into the management library. A client may be
+// cancelled at the gates, but not in the library, whose own locks nobody would release.
 class Operation_Prologue {
 public:
     explicit Operation_Prologue(ProviderAgent& agent);
 
 private:
     Auto_Mutex _data_lock;
+    No_Cancellation _in_the_library;
 };
 
 } // namespace cimple

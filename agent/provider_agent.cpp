@@ -5,6 +5,7 @@
 #include "agent/lock_order.h"
 #include "agent/signal_handler.h"
 #include "agent/version.h"
+#include "cimple/guard.h"
 #include "device/library/bound_functions.h"
 #include "device/library/runtime_loader.h"
 #include "foundation/common.h"
@@ -47,11 +48,13 @@ ProviderAgent* ProviderAgent::instanceLocked() {
 ProviderAgent* ProviderAgent::instance() {
     if (ProviderAgent* agent = current())
         return agent;
+    const No_Cancellation whole_agent;
     Auto_Mutex lock(*s_AgentMutex);
     return instanceLocked();
 }
 
 bool ProviderAgent::acquire() {
+    const No_Cancellation whole_agent;
     Auto_Mutex lock(*s_AgentMutex);
     ProviderAgent* agent = instanceLocked();
     if (!agent->m_bLibraryLoaded) {
@@ -64,6 +67,7 @@ bool ProviderAgent::acquire() {
 }
 
 void ProviderAgent::release() {
+    const No_Cancellation whole_agent;
     ProviderAgent* agent = current();
     if (!agent)
         return;
@@ -105,7 +109,7 @@ ProviderAgent::ProviderAgent()
       m_SANMapsReadyMutex(false, RANK_SAN_MAPS_READY, "m_SANMapsReadyMutex"),
       m_DynamicPortStatusMutex(false, RANK_DYNAMIC_PORT_STATUS, "m_DynamicPortStatusMutex"),
       m_DataFetchMutex(false, RANK_DATA_FETCH, "m_DataFetchMutex") {
-    try {
+    const bool complete = run_guarded([this] {
         m_ConfigFile.load(host_path(Host_File::TUNING).c_str());
         prepareSignalAction();
         m_Loggers.start();
@@ -117,11 +121,12 @@ ProviderAgent::ProviderAgent()
         VLN_LOG(VLN_INFO, "Vorlan Provider v%d.%d.%d-%d Loaded[%d]", VLN_PROVIDER_VERSION_NUMBERS,
                 static_cast<int>(getpid()));
         m_bLibraryLoaded = true;
-    } catch (...) {
-        // A half-built agent stays: every load fails from now on and takes no reference.
-        VLN_LOG(VLN_ERR, "Vorlan CIM Provider load failure");
-        m_bLibraryLoaded = false;
-    }
+    });
+    if (complete)
+        return;
+    // A half-built agent stays: every load fails from now on and takes no reference.
+    VLN_LOG(VLN_ERR, "Vorlan CIM Provider load failure");
+    m_bLibraryLoaded = false;
 }
 
 void ProviderAgent::copyConfiguration() {
@@ -144,11 +149,8 @@ void ProviderAgent::loadLibraries() {
 
 ProviderAgent::~ProviderAgent() {
     VLN_LOG(VLN_DBG, "Entering dtor ~ProviderAgent()");
-    try {
-        shutDown();
-    } catch (...) {
+    if (!run_guarded([this] { shutDown(); }))
         VLN_LOG(VLN_ERR, "Error in ProviderAgent unload. Just continue");
-    }
 }
 
 void ProviderAgent::shutDown() {

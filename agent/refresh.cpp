@@ -1,6 +1,7 @@
 // When a refresh is due, and what the refresh thread does.
 
 #include "agent/provider_agent.h"
+#include "cimple/guard.h"
 
 namespace cimple {
 
@@ -11,11 +12,8 @@ constexpr uint32 USEC_PER_MINUTE = 60000000;
 // A builder that throws must cost its stores or its model, never the object manager's process.
 template <class Build>
 void guarded(const char* what, Build build) {
-    try {
-        build();
-    } catch (...) {
+    if (!run_guarded(build))
         VLN_LOG(VLN_ERR, "Exception in %s", what);
-    }
 }
 
 } // namespace
@@ -74,6 +72,7 @@ void ProviderAgent::joinDataFetch() {
 }
 
 int ProviderAgent::BuildCimpleInfo() {
+    const No_Cancellation claimed_and_started;
     VLN_LOG(VLN_INFO, " Entering BuildCimpleInfo()");
     // Without the libraries the refresh still runs: it raises the ready flags over empty stores, so
     // that no client hangs at a gate.

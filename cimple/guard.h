@@ -8,10 +8,11 @@
 namespace cimple {
 
 // Runs the body; false if an exception ended it. Thread::exit and cancellation unwind the stack
-// like an exception, and go on through it. (The run-time library gives a null reference then, which
-// is none of a sanitizer's business.)
+// like an exception, and go on through it: whoever swallowed them would end the process. So nothing
+// between here and a wait may be noexcept, and no catch (...) stands there that does not throw on.
+// (The run-time library gives a null reference then, which is none of a sanitizer's business.)
 template <class Body>
-__attribute__((no_sanitize("undefined"))) bool run_guarded(Body body) {
+__attribute__((no_sanitize("undefined"))) bool run_guarded(Body&& body) {
     try {
         body();
         return true;

@@ -136,6 +136,7 @@ __attribute__((destructor)) void close_log() {
 void log_msg(Log_Level level, const char* file, int line, const char* format, ...) {
     if (level > log_level.load(std::memory_order_relaxed))
         return;
+    const No_Cancellation whole_line;
     va_list args;
     va_start(args, format);
     try {

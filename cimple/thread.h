@@ -116,6 +116,19 @@ private:
     pthread_t _thread{};
 };
 
+// Holds off a cancellation of this thread to the end of the scope, for steps that must not be left
+// half done: the thread ends at its next wait outside.
+class No_Cancellation {
+public:
+    No_Cancellation() { pthread_setcancelstate(PTHREAD_CANCEL_DISABLE, &_former); }
+    ~No_Cancellation() { pthread_setcancelstate(_former, nullptr); }
+    No_Cancellation(const No_Cancellation&) = delete;
+    No_Cancellation& operator=(const No_Cancellation&) = delete;
+
+private:
+    int _former = PTHREAD_CANCEL_ENABLE;
+};
+
 // A plain byte that threads share without a lock, where a late reading does no harm.
 inline bool load_flag(const bool& flag) noexcept {
     return __atomic_load_n(&flag, __ATOMIC_RELAXED);

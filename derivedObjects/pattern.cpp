@@ -2,6 +2,7 @@
 
 #include "agent/gates.h"
 #include "agent/provider_agent.h"
+#include "cimple/guard.h"
 
 #include <optional>
 #include <vector>
@@ -76,6 +77,7 @@ bool copy_active(ProviderAgent& agent, Copying& copying) {
     const Gate adapters = adapter_data_gate(agent);
     const Gate maps = adapter_maps_gate(agent);
     Auto_Mutex data(agent.m_DataMutex);
+    const No_Cancellation in_the_library;
     {
         Auto_Mutex update(copying.row.update_mutex());
         if (copying.row.update)
@@ -107,37 +109,31 @@ void deliver(const Instance_Map_Base& copies, const Enum_Instances_Handler& hand
 void enumerate(ProviderAgent& agent, const Pattern_Row& row,
                const Enum_Instances_Handler& handler) {
     const Shape_Steps& shape = SHAPES[static_cast<std::size_t>(row.shape)];
-    try {
+    const bool complete = run_guarded([&] {
         Copying copying = {row, handler.focus(), Instance_Map_Base(row.meta_class)};
         if (shape.copy(agent, copying))
             deliver(copying.copies, handler);
-    } catch (...) {
+    });
+    if (!complete)
         VLN_LOG(VLN_CRIT, "%s", shape.exception);
-    }
 }
 
 } // namespace
 
-sint32 pattern_load() noexcept {
-    try {
-        return ProviderAgent::acquire() ? PROVIDER_OK : LOAD_FAILED;
-    } catch (...) {
-        return LOAD_FAILED;
-    }
+sint32 pattern_load() {
+    bool loaded = false;
+    run_guarded([&] { loaded = ProviderAgent::acquire(); });
+    return loaded ? PROVIDER_OK : LOAD_FAILED;
 }
 
-sint32 pattern_unload(const Pattern_Row& row) noexcept {
+sint32 pattern_unload(const Pattern_Row& row) {
     VLN_LOG(VLN_DBG, "%s_Provider::unload()", row.meta_class->name);
-    try {
-        ProviderAgent::release();
-    } catch (...) {
+    if (!run_guarded([] { ProviderAgent::release(); }))
         VLN_LOG(VLN_ERR, "Error in ProviderAgent unload. Just continue");
-    }
     return PROVIDER_OK;
 }
 
-sint32 pattern_enum_instances(const Pattern_Row& row,
-                              const Enum_Instances_Handler& handler) noexcept {
+sint32 pattern_enum_instances(const Pattern_Row& row, const Enum_Instances_Handler& handler) {
     // Without an agent nobody has loaded the class: the caller breaks the contract, and gets
     // nothing.
     ProviderAgent* agent = ProviderAgent::current();

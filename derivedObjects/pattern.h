@@ -54,21 +54,20 @@ inline constexpr Pattern_Id pattern_id = NUM_PATTERNS;
 #define VLN_NO_STORE(class_name) VLN_STORE(none, class_name)
 #include "agent/stores.inc"
 
-// ---- The operations. None of them throws. ----
+// ---- The operations. None of them throws; a cancellation of the thread passes through. ----
 
 // Builds the agent if there is none, and takes a reference. LOAD_FAILED, and no reference, when the
 // libraries are not usable.
-sint32 pattern_load() noexcept;
+sint32 pattern_load();
 
 // Gives the reference back; the last one destroys the agent.
-sint32 pattern_unload(const Pattern_Row& row) noexcept;
+sint32 pattern_unload(const Pattern_Row& row);
 
 // Hands a clone of each stored instance to the handler, on the caller's thread with no lock held;
 // of those only that the handler looks at, if it tells and the store can find them.
 // Answers 0 always: an exception makes the enumeration short, and two stored instances with equal
 // keys make it empty.
-sint32 pattern_enum_instances(const Pattern_Row& row,
-                              const Enum_Instances_Handler& handler) noexcept;
+sint32 pattern_enum_instances(const Pattern_Row& row, const Enum_Instances_Handler& handler);
 
 } // namespace cimple
 

@@ -1,5 +1,6 @@
 #include "device/adapter.h"
 
+#include "cimple/guard.h"
 #include "foundation/log.h"
 
 namespace cimple {
@@ -22,11 +23,8 @@ Port* Adapter::getPort(uint32 index) {
 
 void Adapter::rescanPorts() {
     for (const std::unique_ptr<Port>& port : ports) {
-        try {
-            port->rescanTargets(*this);
-        } catch (...) {
+        if (!run_guarded([&] { port->rescanTargets(*this); }))
             VLN_LOG(VLN_ERR, "Issue with Target Rescan - moving to the next Port");
-        }
     }
 }
 

@@ -6,6 +6,7 @@
 #ifndef DEVICE_ADAPTER_H
 #define DEVICE_ADAPTER_H
 
+#include "cimple/guard.h"
 #include "cimple/types.h"
 #include "device/adapter_attributes.h"
 #include "device/adapter_statistics.h"
@@ -75,11 +76,11 @@ private:
 template <class Port_Class, class... Arguments>
 void Adapter::makePorts(uint32 count, const Arguments&... arguments) {
     for (uint32 index = 0; index < count; ++index) {
-        try {
+        const auto make_port = [&] {
             ports.push_back(std::make_unique<Port_Class>(*this, index, arguments...));
-        } catch (...) {
+        };
+        if (!run_guarded(make_port))
             portFailed(index);
-        }
     }
 }
 

@@ -6,6 +6,7 @@
 #ifndef DEVICE_CLEANUP_H
 #define DEVICE_CLEANUP_H
 
+#include "cimple/guard.h"
 #include "foundation/log.h"
 
 #include <memory>
@@ -23,13 +24,10 @@ struct Cleanup_Texts {
 // Deletes the object. False, after a line at level 3, if that failed.
 template <class T>
 bool delete_guarded(std::unique_ptr<T>& owned, const char* failure) noexcept {
-    try {
-        delete owned.release();
-        return true;
-    } catch (...) {
+    const bool complete = run_guarded([&] { delete owned.release(); });
+    if (!complete)
         VLN_LOG(VLN_ERR, "%s", failure);
-        return false;
-    }
+    return complete;
 }
 
 } // namespace cimple

@@ -1,5 +1,6 @@
 #include "device/data.h"
 
+#include "cimple/guard.h"
 #include "cimple/thread.h"
 #include "device/fcoe_adapter.h"
 #include "device/iscsi_adapter.h"
@@ -117,12 +118,12 @@ void VLN_Data::buildAdapterData() {
 void VLN_Data::buildSANData() {
     VLN_LOG(VLN_DBG, "buildSANData");
     for (const std::unique_ptr<Adapter>& adapter : adapters) {
-        try {
+        const bool complete = run_guarded([&] {
             VLN_LOG(VLN_DBG, "Target Scan from adapter: %s", adapter->getAdapterName().c_str());
             adapter->rescanTargets();
-        } catch (...) {
+        });
+        if (!complete)
             VLN_LOG(VLN_ERR, "Issue with Target Rescan with Adapter- moving to the next adapter");
-        }
     }
 }
 
@@ -190,13 +191,14 @@ bool VLN_Data::readRecord(Scan& scan, uint32 index, LocalHBAInfoV4& info) {
 
 void VLN_Data::createAdapter(const HBAIdentifier& identifier, uint32 index,
                              const LocalHBAInfoV4& info) {
-    try {
+    const bool complete = run_guarded([&] {
         const uint8* wwn = info.portWWN;
         VLN_LOG(VLN_DBG, "NIC/FCoE/iSCSI PortWWN : [%02X-%02X-%02X-%02X-%02X-%02X-%02X-%02X]",
                 wwn[0], wwn[1], wwn[2], wwn[3], wwn[4], wwn[5], wwn[6], wwn[7]);
         adapters.push_back(makeAdapter(identifier, index, info));
         ++adapterCount;
-    } catch (...) {
+    });
+    if (!complete) {
         VLN_LOG(VLN_ERR, "Catch ALL error during creating adapter..., Skipping Adapter# %d", index);
         --adapterCount;
     }

@@ -1,5 +1,6 @@
 #include "device/port.h"
 
+#include "cimple/guard.h"
 #include "device/target_mapping.h"
 #include "foundation/log.h"
 
@@ -30,11 +31,11 @@ void Port::makeTargets(Adapter& owner, const Target_Mapping& mapping) {
     if (mapping.status() != HBA_STATUS_OK)
         return;
     for (std::size_t unit = 0; unit < mapping.size(); ++unit) {
-        try {
+        const auto make_target = [&] {
             targets.push_back(std::make_unique<Target>(owner, mapping[unit]));
-        } catch (...) {
+        };
+        if (!run_guarded(make_target))
             VLN_LOG(VLN_ERR, "target creation failed - moving to the next target");
-        }
     }
 }
 

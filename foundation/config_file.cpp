@@ -1,5 +1,6 @@
 #include "foundation/config_file.h"
 
+#include "cimple/guard.h"
 #include "foundation/log.h"
 
 #include <cstdio>
@@ -78,11 +79,7 @@ struct VlnConfigFile::Keys_Seen {
 };
 
 VlnConfigFile::~VlnConfigFile() {
-    try {
-        save();
-    } catch (...) {
-        // Out of memory while the library is unloaded: the file stays as it was.
-    }
+    run_guarded([this] { save(); }); // out of memory at the end: the file stays as it was
 }
 
 void VlnConfigFile::load(const char* file) {

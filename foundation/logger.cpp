@@ -1,6 +1,7 @@
 #include "foundation/logger.h"
 
 #include "cimple/buffer.h"
+#include "cimple/thread.h"
 #include "foundation/common.h"
 #include "foundation/host_paths.h"
 
@@ -43,6 +44,7 @@ bool read_number(const char* token, sint32& value) {
 } // namespace
 
 void log_line(sint32 level, const char* file, uint32 line, const char* format, ...) noexcept {
+    const No_Cancellation whole_line;
     std::va_list arguments;
     va_start(arguments, format);
     try {

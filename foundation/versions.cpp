@@ -1,4 +1,5 @@
 // VLN_Common: firmware and product versions.
+#include "cimple/guard.h"
 #include "foundation/common.h"
 
 #include "foundation/log.h"
@@ -67,17 +68,16 @@ sint32 parse(const char* text, VLN_FirmwareVersion& out) {
 } // namespace
 
 sint32 VLN_Common::parseVersion(const char* text, VLN_FirmwareVersion& out) {
-    try {
-        if (!text) {
-            VLN_LOG(VLN_DBG, "parseVersion Error: Input FirmwareVersion is Null");
-            return VLN_GENERAL_ERROR;
-        }
-        VLN_LOG(VLN_DBG, "Input Version String: [%s]", text);
-        return parse(text, out);
-    } catch (...) {
-        VLN_LOG(VLN_ERR, "parseVersion: error occurred while parsing...");
+    if (!text) {
+        VLN_LOG(VLN_DBG, "parseVersion Error: Input FirmwareVersion is Null");
         return VLN_GENERAL_ERROR;
     }
+    VLN_LOG(VLN_DBG, "Input Version String: [%s]", text);
+    sint32 status = VLN_GENERAL_ERROR;
+    if (run_guarded([&] { status = parse(text, out); }))
+        return status;
+    VLN_LOG(VLN_ERR, "parseVersion: error occurred while parsing...");
+    return VLN_GENERAL_ERROR;
 }
 
 sint32 VLN_Common::versionFourNumbers(const char* text, uint16 (&out)[4]) {

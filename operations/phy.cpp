@@ -1,4 +1,5 @@
 // The speed settings of a physical port.
+#include "cimple/guard.h"
 #include "operations/method_wrapper.h"
 
 #include "device/library/attribute_buffer.h"
@@ -53,20 +54,21 @@ AX_STATUS VLN_MethodWrapper::GetPhyPortSpeedAttributesValues(const HBA_WWN* name
     if (!frame.given(settings))
         return frame.status();
     *settings = {};
-    try {
+    AX_STATUS status = AX_STATUS_ERROR;
+    const bool complete = run_guarded([&] {
         Attribute_Buffer buffer(AX_PORT_ATTRIBUTES_SIZE);
         uint32 size = buffer.size();
-        const AX_STATUS status = AX_GetPortAttributes(wwnOf(name), buffer.data(), &size);
+        status = AX_GetPortAttributes(wwnOf(name), buffer.data(), &size);
         if (status == AX_STATUS_OK)
             readSettings(buffer, *settings);
         else
             VLN_OPERATION_FAILED(
                 status, "GetPhyPortSpeedAttributesValues exited with the error code %d", status);
+    });
+    if (complete)
         return status;
-    } catch (...) {
-        VLN_LOG(VLN_ERR, "Unable to allocate the memory for the port attributes");
-        return AX_STATUS_ERROR;
-    }
+    VLN_LOG(VLN_ERR, "Unable to allocate the memory for the port attributes");
+    return AX_STATUS_ERROR;
 }
 
 } // namespace cimple

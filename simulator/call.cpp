@@ -88,6 +88,8 @@ std::uint64_t Call::take_faults() {
             continue;
         if (fault.kind == VLNSIM_DELAY) {
             delay += fault.value;
+        } else if (fault.kind == VLNSIM_HOLD) {
+            is_held = true;
         } else if (!taken) {
             taken = true;
             (fault.kind == VLNSIM_STATUS      ? forced_status

@@ -33,6 +33,7 @@ public:
     std::optional<std::uint64_t> forced_status;
     std::optional<std::uint64_t> forced_size; // buffer counts as too small; 0: tell the true need
     std::optional<std::uint64_t> missing;     // identifier, 0: any
+    bool is_held = false;
 
     Entry entry() const { return _entry; }
     void violation(const std::string& what) { sim.add_violation(_entry, what); }
@@ -102,6 +103,8 @@ Result answer(Entry entry, Body body, const Arguments&... arguments) noexcept {
             vlnsim_sleep(delay);
             lock.lock();
         }
+        if (call.is_held)
+            simulator.wait_for_clearance(lock);
         Result result{};
         if (call.forced_status && std::is_integral_v<Result>)
             result = detail::converted<Result>(*call.forced_status);

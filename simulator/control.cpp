@@ -151,7 +151,7 @@ const char* vlnsim_host_root(void) {
 }
 
 int vlnsim_fault(const char* function, unsigned nth, enum vlnsim_fault_kind kind, uint64_t value) {
-    if (!function || kind < VLNSIM_STATUS || kind > VLNSIM_ABSENT)
+    if (!function || kind < VLNSIM_STATUS || kind > VLNSIM_HOLD)
         return 1;
     const std::string name = function;
     if (name != "*" && !(kind == VLNSIM_ABSENT ? is_symbol_name(name) : is_entry_name(name)))
@@ -166,7 +166,13 @@ int vlnsim_fault(const char* function, unsigned nth, enum vlnsim_fault_kind kind
 void vlnsim_clear_faults(void) {
     Simulator& simulator = Simulator::instance();
     std::lock_guard lock(simulator.mutex);
-    simulator.faults.clear();
+    simulator.forget_faults();
+}
+
+size_t vlnsim_held(void) {
+    Simulator& simulator = Simulator::instance();
+    std::lock_guard lock(simulator.mutex);
+    return simulator.held;
 }
 
 unsigned long vlnsim_calls(const char* function) {

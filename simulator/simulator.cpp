@@ -43,9 +43,23 @@ void Simulator::replace_host(Host fresh, std::string text, std::string name) {
     initialised = false;
     hba_loaded = false;
     handles.clear();
+    forget_faults();
     faults = host.faults;
     violations.clear();
     forget_calls();
+}
+
+void Simulator::forget_faults() {
+    faults.clear();
+    ++clearances;
+    cleared.notify_all();
+}
+
+void Simulator::wait_for_clearance(std::unique_lock<std::mutex>& lock) {
+    const unsigned long before = clearances;
+    ++held;
+    cleared.wait(lock, [&] { return clearances != before; });
+    --held;
 }
 
 void Simulator::forget_calls() {

@@ -7,6 +7,7 @@
 #include "simulator/vlnsim.h"
 
 #include <array>
+#include <condition_variable>
 #include <cstdio>
 #include <map>
 #include <mutex>
@@ -36,6 +37,9 @@ struct Simulator {
     std::array<unsigned long, entry_count> calls{};
     std::map<std::string, unsigned long> lookups;
     std::vector<Fault> faults;
+    std::size_t held = 0;         // calls that wait for the rules to be cleared
+    unsigned long clearances = 0; // of the rules
+    std::condition_variable cleared;
     std::FILE* trace = nullptr;
     bool recording = false;
     std::vector<std::string> recorded;
@@ -48,6 +52,9 @@ struct Simulator {
     void choose_scenario();
     void replace_host(Host fresh, std::string text, std::string name);
     void forget_calls();
+    void forget_faults();
+    // Without the mutex meanwhile.
+    void wait_for_clearance(std::unique_lock<std::mutex>& lock);
     void add_violation(Entry entry, const std::string& what);
 
     Function* find_function(std::uint64_t wwpn);

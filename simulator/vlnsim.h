@@ -133,8 +133,10 @@ enum vlnsim_fault_kind {
     VLNSIM_TOO_SMALL =
         2, /* the buffer counts as too small; value: the needed count, 0: the true one */
     VLNSIM_MISSING = 3, /* value: the identifier that AX_GetAttributeValue does not find, 0: any */
-    VLNSIM_ABSENT = 4   /* the symbol is not exported; nth is ignored, and function may also be the
+    VLNSIM_ABSENT = 4,  /* the symbol is not exported; nth is ignored, and function may also be the
                            name of one symbol, such as "LAX_GetVPDV2" */
+    VLNSIM_HOLD = 5     /* the call stands still, before it does anything, until the rules are
+                           cleared; value is ignored */
 };
 
 #define VLNSIM_EVERY 0u
@@ -145,7 +147,10 @@ enum vlnsim_fault_kind {
  * for an unknown function or kind. */
 VLNSIM_API int vlnsim_fault(const char* function, unsigned nth, enum vlnsim_fault_kind kind,
                             uint64_t value);
+/* Lets the calls go that a rule holds, as does whatever replaces the host. */
 VLNSIM_API void vlnsim_clear_faults(void);
+/* Calls that stand still. */
+VLNSIM_API size_t vlnsim_held(void);
 
 /* ---- What was called
  * ------------------------------------------------------------------------------ */

@@ -11,6 +11,7 @@
 #include "agent/profiles/profile_maps.h"
 #include "agent/status/dynamic_status.h"
 #include "agent/text.h"
+#include "cimple/guard.h"
 #include "classes/CIM_ComputerSystem.h"
 #include "classes/VLNMPCA_ElementPFCThrottle.h"
 #include "classes/VLNMPCA_FCPortStatistics.h"
@@ -39,11 +40,10 @@ FC_Function function_of(Adapter& adapter, Port& port) {
 } // namespace
 
 uint32 FCoE_Map_Builder::run() {
-    try {
-        return createClasses();
-    } catch (...) {
-        VLN_LOG(VLN_DBG, " Exception in FCoE Card discovery");
-    }
+    uint32 status = MAP_OK;
+    if (run_guarded([&] { status = createClasses(); }))
+        return status;
+    VLN_LOG(VLN_DBG, " Exception in FCoE Card discovery");
     return MAP_OK;
 }
 

@@ -7,6 +7,7 @@
 #include "agent/profiles/profile_maps.h"
 #include "agent/software/software_identity.h"
 #include "agent/text.h"
+#include "cimple/guard.h"
 #include "classes/VLNMPCA_SCSIProtocolController.h"
 
 namespace cimple {
@@ -29,11 +30,8 @@ const iSCSIAdapterAttributes& attributes_of(iSCSIAdapter& adapter) {
 } // namespace
 
 uint32 ISCSI_Map_Builder::CreateISCSIClasses() {
-    try {
-        return createClasses();
-    } catch (...) {
-        return END_PASS;
-    }
+    uint32 status = END_PASS;
+    return run_guarded([&] { status = createClasses(); }) ? status : END_PASS;
 }
 
 uint32 ISCSI_Map_Builder::createClasses() {

@@ -4,6 +4,7 @@
 
 #include "agent/san/fc_san_maps.h"
 #include "agent/san/iscsi_san_maps.h"
+#include "cimple/guard.h"
 #include "classes/CIM_ComputerSystem.h"
 
 namespace cimple {
@@ -27,11 +28,12 @@ uint32 ProviderAgent::updateSANMaps() {
 
 uint32 SAN_Map_Builder::run() {
     VLN_LOG(VLN_DBG, "PERF: updateSANMaps: Entry");
-    try {
+    const bool complete = run_guarded([this] {
         clearMaps();
         createISCSIClasses();
         createFCClasses();
-    } catch (...) {
+    });
+    if (!complete) {
         VLN_LOG(VLN_ERR, "Error updating SAN maps");
         return PASS_FAILED;
     }

@@ -3,6 +3,7 @@
 #include "agent/provider_agent.h"
 #include "agent/status/dynamic_reading.h"
 #include "agent/status/dynamic_status.h"
+#include "cimple/guard.h"
 
 #include <algorithm>
 #include <exception>
@@ -57,12 +58,12 @@ bool poll(ProviderAgent& agent, Port_Rows& rows) {
     for (Dynamic_Port_Row& row : rows) {
         if (stopped(agent))
             return false;
-        try {
+        const bool complete = run_guarded([&] {
             Auto_Mutex data(agent.m_DataMutex);
             read_states(row);
-        } catch (...) {
+        });
+        if (!complete)
             VLN_LOG(VLN_DBG, "Error occurred while retrieving NicPort status...");
-        }
         Time::pause(SLEEP_BETWEEN_PORTS, agent.m_bStopDynamicThread);
     }
     return !stopped(agent);

@@ -6,6 +6,7 @@
 #include "agent/status/dynamic_status.h"
 #include "agent/store_search.h"
 #include "agent/text.h"
+#include "cimple/guard.h"
 #include "classes/VLNMPCA_FCPort.h"
 #include "classes/VLNMPCA_FCPortStatistics.h"
 
@@ -156,12 +157,13 @@ void update_statistics(const ProviderAgent& agent, Port& port) {
 } // namespace
 
 void readFCoEPortStatistics(Port& port, VLNMPCA_FCPortStatistics& statistics) {
-    try {
+    const bool complete = run_guarded([&] {
         if (const PortStatistics* counters = port.getPortStatistics()) {
             statistics.StatisticTime.set(Datetime::now());
             copy_counters(*counters, statistics);
         }
-    } catch (...) {
+    });
+    if (!complete) {
         VLN_LOG(VLN_ERR, "Error occurred while retrieving FCoEPort Statistics");
         VLN_LOG(VLN_ERR, "Error getting FCoE Port statistics");
     }
@@ -172,9 +174,7 @@ void UpdateFCoEPortStatus(ProviderAgent& agent) {
         return;
     VLN_LOG(VLN_DBG, "PERF: update driver map");
     for_each_fcoe_port(agent, [&agent](const Port& port) {
-        try {
-            update_port(agent, port.getPortName());
-        } catch (...) {
+        if (!run_guarded([&] { update_port(agent, port.getPortName()); })) {
             VLN_LOG(VLN_ERR, "Error occurred while retrieving FCoEPort status...");
             VLN_LOG(VLN_ERR, "Error getting FCoE Port status");
         }

@@ -6,6 +6,7 @@
 #include "agent/status/dynamic_reading.h"
 #include "agent/status/dynamic_status.h"
 #include "agent/store_search.h"
+#include "cimple/guard.h"
 #include "classes/VLNMPCA_Card.h"
 #include "classes/VLNMPCA_EthernetPort.h"
 #include "classes/VLNMPCA_PortController.h"
@@ -155,11 +156,8 @@ void UpdateDynamicEthernetPortStatus(ProviderAgent& agent) {
         return;
     }
     VLN_LOG(VLN_DBG, "Returning from m_DynamicPortThreadInitialized true condn");
-    try {
-        show_port_status(agent);
-    } catch (...) {
+    if (!run_guarded([&] { show_port_status(agent); }))
         VLN_LOG(VLN_ERR, "Error getting Nic Port status");
-    }
 }
 
 void UpdatePhyLinkDownReason(ProviderAgent& agent) {
@@ -177,11 +175,8 @@ void UpdateBoardTemp(ProviderAgent& agent) {
         return;
     const auto& cards = agent.m_VLNMPCA_Card_map;
     for (uint32 i = 0; i < cards.size(); ++i) {
-        try {
-            update_board_temperature(agent, *cards[i]);
-        } catch (...) {
+        if (!run_guarded([&] { update_board_temperature(agent, *cards[i]); }))
             VLN_LOG(VLN_ERR, "Error Updating Borad Temperature");
-        }
     }
     VLN_LOG(VLN_DBG, "UpdateBoardTemp(): Successful");
 }

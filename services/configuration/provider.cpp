@@ -1,6 +1,7 @@
 #include "services/configuration/provider.h"
 
 #include "agent/gates.h"
+#include "cimple/guard.h"
 
 namespace cimple {
 
@@ -73,11 +74,9 @@ Configuration_Setting_Provider::modify_instance(const VLNMPCA_ProviderConfigSett
     ProviderAgent* agent = ProviderAgent::current();
     if (!agent)
         return MODIFY_INSTANCE_FAILED;
-    try {
-        return modify(*agent, model, instance);
-    } catch (...) {
-        return MODIFY_INSTANCE_FAILED;
-    }
+    sint32 status = MODIFY_INSTANCE_FAILED;
+    return run_guarded([&] { status = modify(*agent, model, instance); }) ? status
+                                                                          : MODIFY_INSTANCE_FAILED;
 }
 
 } // namespace cimple

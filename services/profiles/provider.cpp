@@ -3,6 +3,7 @@
 #include "agent/associations.h"
 #include "agent/gates.h"
 #include "cimple/cimom.h"
+#include "cimple/guard.h"
 #include "classes/PG_RegisteredProfile.h"
 #include "classes/VLNMPCA_RegisteredProfile.h"
 
@@ -101,12 +102,12 @@ Ref<VLNMPCA_BaseServerReferencedProfile> find(ProviderAgent& agent,
 sint32 Base_Server_Profile_Provider::get_instance(const VLNMPCA_BaseServerReferencedProfile* model,
                                                   VLNMPCA_BaseServerReferencedProfile*& instance) {
     ProviderAgent* agent = ProviderAgent::current();
-    try {
+    const bool complete = run_guarded([&] {
         if (agent)
             instance = find(*agent, *model).release();
-    } catch (...) {
+    });
+    if (!complete)
         VLN_LOG(VLN_CRIT, "Exception in CIM Provider Enumeration - do nothing");
-    }
     return instance ? GET_INSTANCE_OK : GET_INSTANCE_NOT_FOUND;
 }
 
@@ -115,11 +116,8 @@ sint32 Base_Server_Profile_Provider::enum_instances(const VLNMPCA_BaseServerRefe
     ProviderAgent* agent = ProviderAgent::current();
     if (!agent)
         return ENUM_INSTANCES_OK;
-    try {
-        enumerate(*agent, handler);
-    } catch (...) {
+    if (!run_guarded([&] { enumerate(*agent, handler); }))
         VLN_LOG(VLN_CRIT, "Exception in CIM Provider Enumeration - do nothing");
-    }
     return ENUM_INSTANCES_OK;
 }
 

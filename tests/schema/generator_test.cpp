@@ -7,7 +7,6 @@
 
 #include <algorithm>
 #include <cstdio>
-#include <set>
 
 namespace {
 
@@ -37,27 +36,6 @@ protected:
                   (std::pair<std::string, int>("", 0)));
     }
 };
-
-TEST_F(Generated, ExportsTheFactoriesAndTheModule) {
-    const std::string map = contents("out/export.map");
-    const std::size_t local = map.find("local:\n    *;\n");
-    ASSERT_NE(local, std::string::npos);
-    std::set<std::string> symbols;
-    std::size_t count = 0;
-    for (std::size_t at = 0; (at = map.find(";\n", at)) < local; at++) {
-        const std::size_t begin = map.rfind(' ', at) + 1;
-        symbols.insert(map.substr(begin, at - begin));
-        count++;
-    }
-    EXPECT_EQ(count, 1591u);
-    EXPECT_EQ(symbols.size(), count);
-    for (const char* symbol :
-         {"cimple_module", "VLNMPCA_Card_Create_InstanceMI",
-          "VLNMPCA_Card_Provider_Create_MethodMI", "VLNMPCA_Realizes_Create_AssociationMI"})
-        EXPECT_TRUE(symbols.count(symbol)) << symbol;
-    EXPECT_FALSE(symbols.count("VLNMPCA_Card_Create_AssociationMI"));
-    EXPECT_FALSE(symbols.count("CIM_Card_Create_InstanceMI"));
-}
 
 TEST_F(Generated, RegistrationStanzas) {
     const std::string text = contents("share/vorlan_mpca_provider.reg");
@@ -106,23 +84,6 @@ TEST_F(Generated, SharedMofReadsInOnePass) {
     }
 }
 
-TEST_F(Generated, StructuresAddNewMembersOnly) {
-    const std::string port = contents("out/classes/VLNMPCA_EthernetPort.h");
-    EXPECT_NE(port.find("struct VLNMPCA_EthernetPort : CIM_EthernetPort {\n"
-                        "    Property<String> FunctionalQosBandwidth;\n"),
-              std::string::npos);
-    const std::string realizes = contents("out/classes/VLNMPCA_Realizes.h");
-    EXPECT_EQ(realizes.find("Antecedent;"), std::string::npos);
-    const std::string dependency = contents("out/classes/CIM_Dependency.h");
-    EXPECT_NE(dependency.find("    CIM_ManagedElement* Antecedent;\n"), std::string::npos);
-    const std::string job = contents("out/classes/CIM_ConcreteJob.h");
-    EXPECT_NE(job.find("    Instance* JobInParameters;\n"), std::string::npos);
-    EXPECT_NE(job.find("struct CIM_ConcreteJob_GetErrors_method : Instance {\n"
-                       "    Property<Array<CIM_Error*>> Errors;\n"
-                       "    Property<uint32> return_value;\n"),
-              std::string::npos);
-}
-
 TEST_F(Generated, ASecondRunTouchesNothing) {
     // An age that a rewritten file would not have.
     const fs::file_time_type old = fs::file_time_type::clock::now() - std::chrono::hours(48);
@@ -150,17 +111,80 @@ TEST(Generator, EndsWithThePlaceOfTheFault) {
               (std::pair<std::string, int>(
                   "mof/part.mof:4:1: expected ';' after the feature, found '}'\n", 1)));
     EXPECT_FALSE(fs::exists("bad_out"));
-    EXPECT_EQ(run("--check mof/main.mof").second, 1);
     EXPECT_EQ(run("--check " MOF_FOLDER "/catalogue.mof").second, 0);
     EXPECT_EQ(run("none.mof bad_out bad_share 1 1 1"),
               (std::pair<std::string, int>("none.mof:1:1: cannot read the file\n", 1)));
     here.write("mof/part.mof", "class CIM_A { };\n");
-    EXPECT_EQ(run("mof/main.mof bad_out bad_share 1 1 1").second, 1);
+    EXPECT_EQ(run("mof/main.mof bad_out bad_share 1 1 1").second, 1) << "nothing to provide";
     here.write("mof/part.mof", "class VLNMPCA_A { [Key] string Id; };\n");
     EXPECT_EQ(run("mof/main.mof /proc/nowhere share2 1 1 1").second, 1);
     for (const char* wrong :
          {"", "mof/main.mof", "mof/main.mof o s 0 1 1", "mof/main.mof o s 1 x 1"})
         EXPECT_EQ(run(wrong).second, 2) << wrong;
+}
+
+// What reads well, and the tables or the engine could not hold.
+TEST(Generator, RefusesWhatTheTablesCannotHold) {
+    const struct {
+        const char* text;
+        const char* reason;
+    } cases[] = {
+        // Names that C++ or the engine minds.
+        {"class A { uint8 default; };", ":1:17: 'default' is a word of C++"},
+        {"class A { uint8 f(uint8 Return_Value); };",
+         ":1:25: 'Return_Value' is a name of the engine"},
+        {"class A { uint32 String; }; class B : A { string Name; };",
+         ":1:18: 'String' is a name of the engine"},
+        {"class A { uint8 Property(); };", ":1:17: 'Property' is a name of the engine"},
+        {"class A { uint8 f(string Array[]); };", ":1:26: 'Array' is a name of the engine"},
+        {"class A { uint8 A; };", ":1:17: 'A' cannot be the name of a member"},
+        {"class A { uint8 b; }; class B {};", ":1:17: 'b' cannot be the name of a member"},
+        {"class A { uint8 __refs; };", ":1:17: '__refs' cannot be the name of a member"},
+        {"class Instance {};", ":1:7: 'Instance' cannot be the name of a class"},
+        {"class Datetime {};", ":1:7: 'Datetime' cannot be the name of a class"},
+        {"class A { a ref x; };", ":1:17: 'a' is spelled 'A' elsewhere"},
+        {"class A { uint8 x; }; class B : A { [Override(\"x\")] uint8 X; };",
+         ":1:59: 'X' is spelled 'x' elsewhere"},
+        // Values
+        {"class A { uint8 v[3]; };", ":1:17: an array of fixed length is not supported"},
+        {"class A { uint8 f(uint8 v[3]); };", ":1:25: an array of fixed length is not supported"},
+        {"class A { uint8 v[] = {1, null}; };", ":1:27: null inside an array"},
+        // Keys and ends
+        {"[Abstract] class VLNMPCA_A { [Key] uint8 x; };",
+         ":1:18: a provided class cannot be abstract"},
+        {"class A { uint8 x; }; class VLNMPCA_A : A { uint8 y; };",
+         ":1:29: a provided class has a key at least"},
+        {"[Association] class A { [Key] A ref x; };",
+         ":1:21: an association has two references at least"},
+        {"class A { [Key] uint8 x; }; class B : A { [Key] uint8 y; };",
+         ":1:55: 'y' is a key below A, which has its keys"},
+        {"class A { [Key] uint8 x; uint8 y; }; class B : A { [Override(\"y\"), Key] uint8 y; };",
+         ":1:79: 'y' is a key below A, which has its keys"},
+        // Overrides of methods
+        {"class A { uint8 f(uint8 x); }; class B : A { [Override(\"f\")] uint8 f(uint8 z); };",
+         ":1:68: 'f' has not the parameters that A gives it"},
+        {"class A { uint8 f(uint8 x); }; class B : A { [Override(\"f\")] uint8 f(uint16 x); };",
+         ":1:68: 'f' has not the parameters that A gives it"},
+        {"class A { uint8 f(uint8 x); }; class B : A { [Override(\"f\")] uint8 f(uint8 x[]); };",
+         ":1:68: 'f' has not the parameters that A gives it"},
+        {"class A { uint8 f(uint8 x); }; class B : A { [Override(\"f\")] uint8 f([Out] uint8 x); "
+         "};",
+         ":1:68: 'f' has not the parameters that A gives it"},
+        {"class A { uint8 f(A ref x); }; class B : A { [Override(\"f\")] uint8 f(B ref x); };",
+         ":1:68: 'f' has not the parameters that A gives it"},
+        {"class A { uint8 f(uint8 x); }; class B : A { [Override(\"f\")] uint8 f(); };",
+         ":1:68: 'f' has not the parameters that A gives it"},
+    };
+    const std::string path = "bad.mof";
+    for (const auto& bad : cases) {
+        generator::Output(".").write(path, bad.text);
+        try {
+            generator::load_catalogue(path);
+            ADD_FAILURE() << "accepted: " << bad.text;
+        } catch (const mof::Error& error) {
+            EXPECT_EQ(error.what(), path + bad.reason) << bad.text;
+        }
+    }
 }
 
 } // namespace

@@ -2,9 +2,6 @@
 #include "cimple/instance.h"
 #include "classes/VLNMPCA_Card.h"
 #include "classes/VLNMPCA_ConcreteJob.h"
-#include "classes/VLNMPCA_EthernetPort.h"
-#include "classes/VLNMPCA_Realizes.h"
-#include "classes/VLNMPCA_iSCSISession.h"
 #include "meta_repository.h"
 
 #include <gtest/gtest.h>
@@ -133,46 +130,17 @@ TEST(MetaTables, EveryClassLivesADay) {
     }
 }
 
+// The table of the catalogue tells what the records say; this, that a structure's members are where
+// they say.
 TEST(MetaTables, StructuresAndRecordsAgree) {
-    Ref<VLNMPCA_iSCSISession> session(create<VLNMPCA_iSCSISession>(true));
-    ASSERT_TRUE(session);
-    EXPECT_EQ(session->RequestedState.value, 5u);
-    EXPECT_EQ(session->EnabledState.value, 5u);
-    EXPECT_EQ(session->Directionality.value, 2u);
-    EXPECT_EQ(session->Directionality.null, 0u);
-    EXPECT_NE(session->iSCSIBoot.null, 0u);
-
-    Ref<VLNMPCA_ConcreteJob> job(create<VLNMPCA_ConcreteJob>(true));
-    EXPECT_STREQ(job->TimeBeforeRemoval.value.ascii().c_str(), "00000000000500.000000:000");
-    EXPECT_EQ(job->JobInParameters, nullptr);
-    const Meta_Reference* embedded = find_reference(job->__meta_class, "JobInParameters");
-    ASSERT_NE(embedded, nullptr);
-    EXPECT_EQ(embedded->meta_class, &Instance::static_meta_class);
-    EXPECT_TRUE(embedded->flags & FLAG_EMBEDDED_OBJECT);
-
     const Meta_Property* temperature =
         find_property(&VLNMPCA_Card::static_meta_class, "boardtemperature");
     ASSERT_NE(temperature, nullptr);
-    EXPECT_EQ(temperature->type, TYPE_SINT32);
     Ref<VLNMPCA_Card> card(create<VLNMPCA_Card>());
     card->BoardTemperature.set(-7);
     EXPECT_EQ(*static_cast<const sint32*>(member(card.get(), temperature->offset)), -7);
-}
-
-TEST(MetaTables, FlagsFollowTheMof) {
-    const Meta_Class& realizes = VLNMPCA_Realizes::static_meta_class;
-    EXPECT_EQ(realizes.flags, FLAG_ASSOCIATION);
-    const Meta_Reference* antecedent = find_reference(&realizes, "Antecedent");
-    EXPECT_EQ(antecedent->flags, FLAG_REFERENCE | FLAG_KEY);
-    EXPECT_STREQ(antecedent->meta_class->name, "VLNMPCA_PhysicalConnector");
-    EXPECT_EQ(VLNMPCA_EthernetPort::static_meta_class.flags, FLAG_CLASS);
-    const Meta_Property* state =
-        find_property(&VLNMPCA_EthernetPort::static_meta_class, "EnabledDefault");
-    EXPECT_EQ(state->flags, FLAG_PROPERTY | FLAG_READ | FLAG_WRITE);
-    const Meta_Method* change =
-        find_method(&VLNMPCA_EthernetPort::static_meta_class, "RequestStateChange");
-    EXPECT_EQ(find_property(change, "RequestedState")->flags, FLAG_PROPERTY | FLAG_IN);
-    EXPECT_EQ(find_reference(change, "Job")->flags, FLAG_REFERENCE | FLAG_OUT);
+    Ref<VLNMPCA_ConcreteJob> job(create<VLNMPCA_ConcreteJob>(true));
+    EXPECT_STREQ(job->TimeBeforeRemoval.value.ascii().c_str(), "00000000000500.000000:000");
 }
 
 } // namespace

@@ -11,7 +11,7 @@ struct Bad_Case {
     const char* message;
 };
 
-std::string message_of(const char* text) {
+std::string message_of(const std::string& text) {
     try {
         mof::Schema schema(mof::parse_text(text, "t.mof"));
         return "no error";
@@ -203,6 +203,20 @@ TEST(MofParser, FaultsOfIncludesNameTheRightFile) {
     for (int i = 0; i < 40; i++)
         deep[std::to_string(i)] = "#pragma include (\"" + std::to_string(i + 1) + "\")";
     EXPECT_EQ(message(deep), "14:1:18: includes are nested too deep");
+}
+
+TEST(MofParser, NoDepthOfNestingExhaustsTheStack) {
+    for (const char* opening : {"{", "[", "(", "[a(", "class A {", "/*", "#pragma include (\""}) {
+        std::string text;
+        for (int i = 0; i < 200000; i++)
+            text += opening;
+        EXPECT_NE(message_of(text), "no error") << opening;
+        EXPECT_NE(message_of("class A { uint8 a[] = " + text), "no error") << opening;
+    }
+    std::string chain = "class C0 {};";
+    for (int i = 1; i < 20000; i++)
+        chain += "class C" + std::to_string(i) + " : C" + std::to_string(i - 1) + " {};";
+    EXPECT_EQ(message_of(chain), "no error");
 }
 
 } // namespace

@@ -202,6 +202,7 @@ Instance* clone(const Instance* instance) {
         release(copy, done);
         throw;
     }
+    ref(meta_class); // last, as nothing can fail any more
     return copy;
 }
 

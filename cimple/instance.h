@@ -64,9 +64,8 @@ struct Instance {
 // A new instance. Without defaults every member is zero or empty and not null; with defaults a
 // property takes its default, and is null without one. Counts the class. Throws std::bad_alloc.
 Instance* create(const Meta_Class* meta_class, bool defaults = false);
-// Deep copy with a count of its own; references are cloned, nulls stay null. A clone does not count
-// its class, though its end releases it: whoever clones an instance of a class made at run time
-// calls ref(class) for it. Generated classes are not counted at all. Throws std::bad_alloc.
+// Deep copy with a count of its own; references are cloned, nulls stay null. Counts the class.
+// Throws std::bad_alloc.
 Instance* clone(const Instance* instance);
 void ref(const Instance* instance) noexcept;
 // Drops one count and destroys at zero. A null pointer is allowed here and in destroy.

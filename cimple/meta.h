@@ -2,7 +2,8 @@
 //
 // One Meta_Class per class, with its features and qualifiers, written by the generator into
 // constant tables. All handling of instances (create, copy, compare, convert) is driven by these
-// records. Static records hold refs 0 and are neither counted nor freed; heap copies start at 1.
+// records. Static records hold refs 0, are neither counted nor freed, and lie in read-only memory;
+// heap copies start at 1.
 #ifndef CIMPLE_META_H
 #define CIMPLE_META_H
 
@@ -77,7 +78,7 @@ union Meta_Value {
 };
 
 struct Meta_Qualifier {
-    mutable Atomic refs;
+    Atomic refs;
     const char* name;
     uint8 type;
     uint8 array;
@@ -86,7 +87,7 @@ struct Meta_Qualifier {
 
 // Head of every feature record; bit 0, 1 or 2 of flags tells which record it is.
 struct Meta_Feature {
-    mutable Atomic refs;
+    Atomic refs;
     uint32 flags;
     const char* name;
     const Meta_Qualifier* const* meta_qualifiers;

@@ -22,11 +22,20 @@ void release_record(const T* record) {
     ::operator delete(const_cast<T*>(record));
 }
 
-// False for a static record, which is neither counted nor freed.
+// Only heap records are counted: a static one is never written to.
+template <class T>
+bool is_counted(const T* record) {
+    return record && record->refs.load(std::memory_order_relaxed) != 0;
+}
+
+template <class T>
+Atomic& count_of(const T* record) {
+    return const_cast<T*>(record)->refs;
+}
+
 template <class T>
 bool drop_count(const T* record) {
-    return record && record->refs.load(std::memory_order_relaxed) != 0 &&
-           record->refs.fetch_sub(1, std::memory_order_acq_rel) == 1;
+    return is_counted(record) && count_of(record).fetch_sub(1, std::memory_order_acq_rel) == 1;
 }
 
 // Makes a record with fill(record). The free functions take records that are filled in part, so a
@@ -285,7 +294,7 @@ void derive(Meta_Class* to, const Meta_Class* base) {
 }
 
 bool is_named(const Meta_Qualifier* qualifier, const char* const* names, uint32 count) {
-    for (uint32 i = 0; i < count; ++i) {
+    for (uint32 i = 0; names && i < count; ++i) {
         if (name_equal(qualifier->name, names[i]))
             return true;
     }
@@ -323,8 +332,8 @@ void remove_recursively(Meta_Features* features, const char* const* names, uint3
 } // namespace
 
 void ref(const Meta_Class* meta_class) {
-    if (meta_class && meta_class->refs.load(std::memory_order_relaxed) != 0)
-        meta_class->refs.fetch_add(1, std::memory_order_relaxed);
+    if (is_counted(meta_class))
+        count_of(meta_class).fetch_add(1, std::memory_order_relaxed);
 }
 
 void unref(const Meta_Class* meta_class) {
@@ -353,7 +362,7 @@ Meta_Class* create_meta_class(const char* name, const Meta_Class* base, uint32 f
 }
 
 void remove_qualifiers(Meta_Class* meta_class, const char* const* names, uint32 count) {
-    if (meta_class->refs.load(std::memory_order_relaxed) != 0)
+    if (is_counted(meta_class))
         remove_recursively(meta_class, names, count);
 }
 

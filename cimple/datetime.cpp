@@ -16,6 +16,7 @@ namespace {
 constexpr std::size_t TEXT_SIZE = 25;
 constexpr std::size_t POINT = 14;
 constexpr std::size_t SIGN = 21;
+constexpr int LAST_YEAR = 9999;
 
 // Decimal digits only; false leaves value alone.
 bool read_digits(std::string_view digits, uint32& value) {
@@ -29,11 +30,16 @@ bool read_digits(std::string_view digits, uint32& value) {
     return true;
 }
 
+bool is_time_of_day(uint32 hours, uint32 minutes, uint32 seconds) {
+    return hours < 24 && minutes < 60 && seconds < 60;
+}
+
 bool parse_interval(std::string_view text, Datetime& out) {
     uint32 days, hours, minutes, seconds, usec;
     if (text.substr(SIGN + 1) != "000" || !read_digits(text.substr(0, 8), days) ||
         !read_digits(text.substr(8, 2), hours) || !read_digits(text.substr(10, 2), minutes) ||
-        !read_digits(text.substr(12, 2), seconds) || !read_digits(text.substr(15, 6), usec))
+        !read_digits(text.substr(12, 2), seconds) || !read_digits(text.substr(15, 6), usec) ||
+        !is_time_of_day(hours, minutes, seconds))
         return false;
     out = Datetime(days * Datetime::DAY + hours * Datetime::HOUR + minutes * Datetime::MINUTE +
                        seconds * Datetime::SECOND + usec,
@@ -46,7 +52,8 @@ bool parse_timestamp(std::string_view text, Datetime& out) {
     if (!read_digits(text.substr(0, 4), year) || !read_digits(text.substr(4, 2), month) ||
         !read_digits(text.substr(6, 2), day) || !read_digits(text.substr(8, 2), hour) ||
         !read_digits(text.substr(10, 2), minute) || !read_digits(text.substr(12, 2), second) ||
-        !read_digits(text.substr(15, 6), usec) || !read_digits(text.substr(22, 3), utc))
+        !read_digits(text.substr(15, 6), usec) || !read_digits(text.substr(22, 3), utc) ||
+        month == 0 || day == 0 || !is_time_of_day(hour, minute, second))
         return false;
 
     std::tm fields{};
@@ -59,7 +66,8 @@ bool parse_timestamp(std::string_view text, Datetime& out) {
     fields.tm_isdst = -1;
     fields.tm_wday = -1; // mktime sets it when it succeeds, also for the second before the epoch
     const std::time_t seconds = std::mktime(&fields);
-    if (fields.tm_wday == -1)
+    // A month or day beyond its end is carried over, but not into years that the form cannot tell.
+    if (fields.tm_wday == -1 || fields.tm_year > LAST_YEAR - 1900)
         return false;
 
     const sint32 offset = static_cast<sint32>(utc);

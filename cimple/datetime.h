@@ -49,7 +49,9 @@ public:
     void utc(sint32 minutes);
     void set_timestamp(bool value);
 
-    // Accepts exactly the 25-character forms; anything else answers false and changes nothing.
+    // Accepts exactly the 25-character forms, with no hour, minute or second beyond its end, month
+    // or day 0, or year beyond 9999; anything else answers false and changes nothing. What ascii
+    // makes of an accepted text reads as the same value.
     bool set(const char* text);
     void clear() noexcept { Datetime().swap(*this); } // the all-zero interval
 

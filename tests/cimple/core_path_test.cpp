@@ -139,8 +139,7 @@ TEST(Path, SurvivesDamagedText) {
                 std::string bad = good;
                 bad[i] = c;
                 const Ref<Instance> read_back = read(*instance->__meta_class, bad);
-                // A timestamp before the year 0 is accepted, but has no text of its own.
-                if (!read_back || i > good.find("Date="))
+                if (!read_back)
                     continue;
                 const Ref<Instance> again = read(*instance->__meta_class, path_of(read_back.get()));
                 ASSERT_TRUE(again) << bad;

@@ -215,6 +215,9 @@ TEST(Datetime, ReadsAndWritesBothForms) {
         EXPECT_STREQ(value.ascii().c_str(), c.text);
         EXPECT_STREQ(value.readable().c_str(), c.readable);
     }
+    Datetime carried;
+    EXPECT_TRUE(carried.set("20239931000000.000000+000"));
+    EXPECT_STREQ(carried.ascii().c_str(), "20310331000000.000000+000");
 }
 
 TEST(Datetime, RefusesEverythingElseAndKeepsItsValue) {
@@ -230,6 +233,15 @@ TEST(Datetime, RefusesEverythingElseAndKeepsItsValue) {
         "20240229123456.000007+06x",
         "2024-02-29123456.00007+060",
         "20240229123456,000007+060",
+        "20240029123456.000007+060", // fields beyond their ends
+        "20240200123456.000007+060",
+        "20240229243456.000007+060",
+        "20240229126056.000007+060",
+        "20240229123460.000007+060",
+        "99999931235959.000000+000",
+        "00000001240304.000005:000",
+        "00000001026004.000005:000",
+        "00000001020360.000005:000",
         "             .      +   ",
         "\xff\xff\xff\xff\xff\xff\xff\xff\xff\xff\xff\xff\xff\xff.000000+\xff\xff\xff",
     };

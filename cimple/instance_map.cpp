@@ -8,51 +8,68 @@ namespace cimple {
 
 using detail::Key_Signature;
 
-// An open hash table of member positions, so that filling or copying a store stays linear.
+// An open hash table of members, so that filling or copying a store stays linear.
+//
+// The table knows a member by a number that it keeps when others before it go, and not by its
+// position: taking one out moves no other. Numbers ascend in the order of the members, so that the
+// position is found by bisection, at once while nothing was ever taken out.
 struct Instance_Map_Base::Key_Index {
+    struct Entry {
+        Key_Signature signature;
+        uint32 number;
+    };
+    struct Slot {
+        uint32 number;
+        uint32 hash; // of the bits that the place in the table comes from
+    };
     static constexpr uint32 FREE = 0xFFFFFFFF;
     static constexpr std::size_t SMALLEST_TABLE = 16;
 
-    std::vector<Key_Signature> signatures;      // one per member
-    std::vector<uint32> table;                  // positions; a power of two, at most half full
+    std::vector<Entry> entries;                 // one per member
+    std::vector<Slot> table;                    // a power of two, at most half full
     detail::Key_Shapes<const Instance*> shapes; // the sample: any member of that shape
+    uint32 next_number = 0;
 
     // Makes the next add succeed without allocating.
     void reserve_one() {
-        const std::size_t count = signatures.size() + 1;
-        signatures.reserve(std::bit_ceil(count));
+        const std::size_t count = entries.size() + 1;
+        entries.reserve(std::bit_ceil(count));
         shapes.reserve_one();
-        if (2 * count > table.size()) {
-            std::vector<uint32> grown(std::max(SMALLEST_TABLE, std::bit_ceil(2 * count)), FREE);
-            table.swap(grown);
-            place_all();
+        if (2 * count <= table.size() && next_number != FREE)
+            return;
+        std::vector<Slot> grown(std::max(SMALLEST_TABLE, std::bit_ceil(2 * count)), {FREE, 0});
+        table.swap(grown);
+        next_number = 0;
+        for (Entry& entry : entries) {
+            entry.number = next_number++;
+            place(entry);
         }
     }
 
     void add(const Instance* instance, const Key_Signature& signature) noexcept {
-        place(static_cast<uint32>(signatures.size()), signature.hash);
-        signatures.push_back(signature);
+        entries.push_back({signature, next_number++});
+        place(entries.back());
         shapes.add(signature.shape, instance);
     }
 
     // Forgets a member that has left the list already.
     void remove(uint32 position, const Array<Instance*>& members) noexcept {
-        const uint64 shape = signatures[position].shape;
-        signatures.erase(signatures.begin() + static_cast<std::ptrdiff_t>(position));
-        std::fill(table.begin(), table.end(), FREE);
-        place_all();
-        shapes.remove(shape, [&]() noexcept -> const Instance* {
-            const auto heir =
-                std::find_if(signatures.begin(), signatures.end(),
-                             [&](const Key_Signature& s) { return s.shape == shape; });
-            return members[static_cast<uint32>(heir - signatures.begin())];
+        const Entry entry = entries[position];
+        entries.erase(entries.begin() + static_cast<std::ptrdiff_t>(position));
+        vacate(entry);
+        shapes.remove(entry.signature.shape, [&]() noexcept -> const Instance* {
+            const auto heir = std::find_if(entries.begin(), entries.end(), [&](const Entry& e) {
+                return e.signature.shape == entry.signature.shape;
+            });
+            return members[static_cast<uint32>(heir - entries.begin())];
         });
     }
 
     void clear() noexcept {
-        signatures.clear();
+        entries.clear();
         table.clear();
         shapes.clear();
+        next_number = 0;
     }
 
     // First position with that signature that match accepts, or -1.
@@ -61,30 +78,59 @@ struct Instance_Map_Base::Key_Index {
         uint32 first = FREE;
         if (table.empty())
             return -1;
-        const std::size_t mask = table.size() - 1;
-        for (std::size_t i = start(signature.hash); table[i] != FREE; i = (i + 1) & mask) {
-            const uint32 position = table[i];
-            if (position < first && signatures[position].hash == signature.hash && match(position))
+        const uint32 hash = folded(signature);
+        for (std::size_t i = home(hash); table[i].number != FREE; i = next(i)) {
+            if (table[i].hash != hash)
+                continue;
+            const uint32 position = position_of(table[i].number);
+            if (position < first && entries[position].signature.hash == signature.hash &&
+                match(position))
                 first = position;
         }
         return first == FREE ? -1 : static_cast<sint32>(first);
     }
 
 private:
-    std::size_t start(uint64 hash) const {
-        return static_cast<std::size_t>(hash ^ hash >> 32) & (table.size() - 1);
+    static uint32 folded(const Key_Signature& signature) {
+        return static_cast<uint32>(signature.hash ^ signature.hash >> 32);
+    }
+    std::size_t home(uint32 hash) const { return hash & (table.size() - 1); }
+    std::size_t next(std::size_t slot) const { return (slot + 1) & (table.size() - 1); }
+
+    // Of a member that is there. As many numbers as were taken out lie between it and its position.
+    uint32 position_of(uint32 number) const {
+        const std::size_t most =
+            std::min<std::size_t>(number - entries[0].number, entries.size() - 1);
+        if (entries[most].number == number)
+            return static_cast<uint32>(most);
+        const auto end = entries.begin() + static_cast<std::ptrdiff_t>(most);
+        const auto found = std::lower_bound(entries.begin(), end, number,
+                                            [](const Entry& e, uint32 n) { return e.number < n; });
+        return static_cast<uint32>(found - entries.begin());
     }
 
-    void place(uint32 position, uint64 hash) noexcept {
-        std::size_t i = start(hash);
-        while (table[i] != FREE)
-            i = (i + 1) & (table.size() - 1);
-        table[i] = position;
+    void place(const Entry& entry) noexcept {
+        const uint32 hash = folded(entry.signature);
+        std::size_t i = home(hash);
+        while (table[i].number != FREE)
+            i = next(i);
+        table[i] = {entry.number, hash};
     }
 
-    void place_all() noexcept {
-        for (uint32 i = 0; i < signatures.size(); ++i)
-            place(i, signatures[i].hash);
+    // Frees the entry's slot, and moves up those behind it that a search would not reach any more.
+    void vacate(const Entry& entry) noexcept {
+        const std::size_t mask = table.size() - 1;
+        std::size_t hole = home(folded(entry.signature));
+        while (table[hole].number != entry.number)
+            hole = next(hole);
+        for (std::size_t i = next(hole); table[i].number != FREE; i = next(i)) {
+            const std::size_t way = (i - home(table[i].hash)) & mask;
+            if (way >= ((i - hole) & mask)) {
+                table[hole] = table[i];
+                hole = i;
+            }
+        }
+        table[hole].number = FREE;
     }
 };
 
@@ -108,7 +154,7 @@ sint32 Instance_Map_Base::find_match(const Key_Index& index, const Instance* key
     const auto matches = [&](uint32 position) { return key_eq(keys, _members[position]); };
     if (!index.shapes.others_may_match(keys, signature, [](const Instance* s) { return s; }))
         return index.find(signature, matches);
-    for (uint32 i = 0; i < index.signatures.size(); ++i) {
+    for (uint32 i = 0; i < index.entries.size(); ++i) {
         if (matches(i))
             return static_cast<sint32>(i);
     }
@@ -167,7 +213,8 @@ sint32 Instance_Map_Base::modify_instance(const Instance* model, const Instance*
     Instance* member = _members[static_cast<uint32>(index)];
     copy(member, instance, model);
     // A key reference may now lead to an instance with more keys than the one that it matched.
-    if (!(detail::key_signature(member) == _index->signatures[static_cast<std::size_t>(index)]))
+    if (!(detail::key_signature(member) ==
+          _index->entries[static_cast<std::size_t>(index)].signature))
         reindex();
     changed();
     return MODIFY_INSTANCE_OK;
@@ -191,7 +238,10 @@ void Instance_Map_Base::remove(uint32 index) {
         return;
     _members.remove(index);
     _index->remove(index, _members);
+    const bool distinct = _keys == Keys::DISTINCT;
     changed();
+    if (distinct)
+        _keys = Keys::DISTINCT;
 }
 
 // Does to the members' keys what a copy of the store does: whether each of them would go in.

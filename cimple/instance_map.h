@@ -3,8 +3,9 @@
 // The store owns its members, one count of each. Its operations answer the status numbers of
 // providers directly. Not locked: the owner's mutex guards it. Whoever holds that may change a
 // member in place, but not its keys: the store looks members up by the keys they came with. Filling
-// a store and copying it are linear in its size, a look-up is constant, taking a member out is
-// linear. narrow takes linear time once after a change of the store, and then as much as it finds.
+// a store and copying it are linear in its size, a look-up is constant, taking a member out closes
+// the gap in the list and no more. narrow takes linear time once after a change of the store, and
+// then as much as it finds.
 #ifndef CIMPLE_INSTANCE_MAP_H
 #define CIMPLE_INSTANCE_MAP_H
 

@@ -176,14 +176,16 @@ TEST(InstanceMap, EnumeratesClonesInOrderUntilToldToStop) {
     EXPECT_EQ(some.ids, "ca");
 }
 
-// Against a plain walk over the members, through inserts and removals.
+// Against a plain list, through inserts and removals: phases in which it grows, and shrinks.
 TEST(InstanceMap, IndexFollowsEveryChange) {
     Instance_Map<Test_Base> map;
     std::vector<std::string> ids;
     uint32 random = 1;
-    for (int step = 0; step < 3000; ++step) {
+    for (int step = 0; step < 20000; ++step) {
         random = random * 1664525 + 1013904223;
-        const std::string id = "id" + std::to_string((random >> 16) % 300);
+        std::string id = "id" + std::to_string((random >> 16) % 1000);
+        if (step / 2000 % 2 && !ids.empty())
+            id = ids[(random >> 16) % ids.size()];
         const Ref<Test_Base> keys(make_base(id.c_str(), 7));
         const auto at = std::find(ids.begin(), ids.end(), id);
         ASSERT_EQ(map.find(keys.get()),
@@ -200,7 +202,10 @@ TEST(InstanceMap, IndexFollowsEveryChange) {
             map.remove(index);
             ids.erase(at);
         }
+        ASSERT_EQ(map.size(), ids.size());
     }
+    for (uint32 i = 0; i < map.size(); ++i)
+        EXPECT_STREQ(map[i]->Id.value.c_str(), ids[i].c_str()) << "in the order of insertion";
     map.remove(map.size());
     EXPECT_EQ(map.size(), ids.size());
     map.clear();

@@ -11,18 +11,6 @@ using namespace detail;
 
 namespace {
 
-void copy_value(Instance* dest, const Instance* src, const Meta_Property* p) {
-    if (p->subscript != 0)
-        member_as<Array_Base>(dest, p->offset) = member_as<Array_Base>(src, p->offset);
-    else if (p->type == TYPE_STRING)
-        member_as<String>(dest, p->offset) = member_as<String>(src, p->offset);
-    else if (p->type == TYPE_DATETIME)
-        member_as<Datetime>(dest, p->offset) = member_as<Datetime>(src, p->offset);
-    else
-        std::memcpy(member(dest, p->offset), member(src, p->offset), type_size(p->type));
-    *null_flag(dest, p) = *null_flag(src, p);
-}
-
 void copy_reference(Instance* dest, const Instance* src, const Meta_Reference* r) {
     if (r->subscript != 0) {
         Array<Instance*> clones = clone_all(references(src, r));
@@ -45,7 +33,7 @@ void copy_features(Instance* dest, const Instance* src, const Instance* model, u
         if ((feature->flags & mask) != mask || (model && is_null(model, feature)))
             continue;
         if (feature->flags & FLAG_PROPERTY)
-            copy_value(dest, src, as_property(feature));
+            copy_value(dest, as_property(feature), src, as_property(feature));
         else if (feature->flags & FLAG_REFERENCE)
             copy_reference(dest, src, as_reference(feature));
     }
@@ -97,6 +85,20 @@ void set_name_space(Instance* instance, const String& name_space, bool overwrite
 }
 
 } // namespace
+
+void detail::copy_value(Instance* to, const Meta_Property* in_to, const Instance* from,
+                        const Meta_Property* in_from) {
+    if (in_to->subscript != 0)
+        member_as<Array_Base>(to, in_to->offset) = member_as<Array_Base>(from, in_from->offset);
+    else if (in_to->type == TYPE_STRING)
+        member_as<String>(to, in_to->offset) = member_as<String>(from, in_from->offset);
+    else if (in_to->type == TYPE_DATETIME)
+        member_as<Datetime>(to, in_to->offset) = member_as<Datetime>(from, in_from->offset);
+    else
+        std::memcpy(member(to, in_to->offset), member(from, in_from->offset),
+                    type_size(in_to->type));
+    *null_flag(to, in_to) = *null_flag(from, in_from);
+}
 
 void copy(Instance* dest, const Instance* src, const Instance* model) {
     copy_features(dest, src, model, 0);

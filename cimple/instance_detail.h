@@ -40,6 +40,11 @@ inline const Array<Instance*>& references(const Instance* instance, const Meta_R
     return member_as<Array<Instance*>>(instance, feature->offset);
 }
 
+// Copies the value and the null flag of a property into one of the same type and subscript, which
+// may stand at another offset.
+void copy_value(Instance* to, const Meta_Property* in_to, const Instance* from,
+                const Meta_Property* in_from);
+
 // Clones of all elements; null elements stay null.
 Array<Instance*> clone_all(const Array<Instance*>& instances);
 void unref_all(Array<Instance*>& instances) noexcept;

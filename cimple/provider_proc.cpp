@@ -1,5 +1,7 @@
 #include "cimple/provider_proc.h"
 
+#include "cimple/instance_detail.h"
+
 namespace cimple {
 
 namespace {
@@ -21,22 +23,6 @@ Instance_Handler handler_of(Provider_Word proc, Provider_Word client_data) {
 sint32 close_stream(Provider_Word proc, Provider_Word client_data, sint32 status) {
     reinterpret_cast<Instance_Proc>(proc)(nullptr, status, pointer<void>(client_data));
     return status;
-}
-
-// Copies one member between two classes that both have it.
-void copy_member(Instance* to, const Meta_Property* to_property, const Instance* from,
-                 const Meta_Property* from_property) {
-    void* target = member(to, to_property->offset);
-    const void* source = member(from, from_property->offset);
-    if (to_property->subscript != 0)
-        *static_cast<Array_Base*>(target) = *static_cast<const Array_Base*>(source);
-    else if (to_property->type == TYPE_STRING)
-        *static_cast<String*>(target) = *static_cast<const String*>(source);
-    else if (to_property->type == TYPE_DATETIME)
-        *static_cast<Datetime*>(target) = *static_cast<const Datetime*>(source);
-    else
-        __builtin_memcpy(target, source, type_size(to_property->type));
-    *null_flag(to, to_property) = *null_flag(from, from_property);
 }
 
 // An instance as a provider sees it: of the provider's class or a subclass.
@@ -68,7 +54,7 @@ private:
             const auto* mine = static_cast<const Meta_Property*>(feature);
             const auto* theirs = static_cast<const Meta_Property*>(other);
             if (mine->type == theirs->type && mine->subscript == theirs->subscript)
-                copy_member(_instance, mine, source, theirs);
+                detail::copy_value(_instance, mine, source, theirs);
             return;
         }
         const auto* mine = static_cast<const Meta_Reference*>(feature);

@@ -261,10 +261,10 @@ const Meta_Repository* Call::repository() const {
 }
 
 const Meta_Class* Call::find_class(const CMPIObjectPath* path) const {
-    const char* name = cmpi::class_name(path);
-    if (name && adapter.meta_class && name_equal(adapter.meta_class->name, name))
+    const String name = cmpi::class_name(path);
+    if (adapter.meta_class && name_equal(adapter.meta_class->name, name.c_str()))
         return adapter.meta_class; // as the search would find, but at once
-    return find_meta_class(repository(), name);
+    return find_meta_class(repository(), name.c_str());
 }
 
 Converter Call::converter(const CMPIObjectPath* path) const {

@@ -8,6 +8,7 @@
 //
 // No function here calls CMReturnDone: the object manager closes the result at the end of the call.
 #include "cimple/cmpi_frame.h"
+#include "cimple/log.h"
 
 namespace cimple {
 
@@ -25,8 +26,8 @@ constexpr Status_Row REFERENCES_STATUS[] = {
     {ENUM_REFERENCES_ACCESS_DENIED, CMPI_RC_ERR_ACCESS_DENIED},
 };
 
-// A source class that the library does not know has no associations: the answer is OK. The trace
-// of three of the functions shows 5 for it all the same, which is meant.
+// A source that cannot stand at any end has no associations: the answer is OK. The trace of three
+// of the functions shows 5 for it all the same, which is meant.
 constexpr Answer UNKNOWN_SOURCE(CMPI_RC_OK, CMPI_RC_ERR_INVALID_CLASS);
 
 // What an association operation is asked for; absent texts are "".
@@ -195,11 +196,11 @@ sint32 enum_references_with_fallback(const Call& call, const Instance* source,
 // ---- Delivery ----
 
 bool deliver_associator_name(Delivery& delivery, Instance* instance) {
-    return deliver_path(delivery, instance, own_name_space(instance, delivery.name_space));
+    return deliver_path(delivery, instance, own_name_space(instance, delivery.name_space.c_str()));
 }
 
 bool deliver_associator(Delivery& delivery, Instance* instance) {
-    return deliver_instance(delivery, instance, delivery.name_space);
+    return deliver_instance(delivery, instance, delivery.name_space.c_str());
 }
 
 // An association holds no more of its ends than their keys are sure to be: the object manager is
@@ -208,49 +209,58 @@ bool deliver_fetched_associator(Delivery& delivery, Instance* instance) {
     const CMPIBroker* broker = delivery.call.broker;
     cmpi::Scoped<CMPIObjectPath> path;
     delivery.error = make_cmpi_object_path(
-        broker, instance, own_name_space(instance, delivery.name_space), path.out());
+        broker, instance, own_name_space(instance, delivery.name_space.c_str()), path.out());
     if (delivery.error != CMPI_RC_OK)
         return false;
-    CMPIStatus status = cmpi::GOOD_STATUS;
-    const CMPIInstance* found = broker->bft->getInstance(broker, delivery.call.context, path.get(),
-                                                         delivery.properties, &status);
-    if (found && cmpi::good(status))
-        cmpi::return_instance(delivery.result, found);
+    cmpi::Status status;
+    const cmpi::Scoped<CMPIInstance> found(broker->bft->getInstance(
+        broker, delivery.call.context, path.get(), delivery.properties, status.out()));
+    if (found && status)
+        cmpi::return_instance(delivery.result, found.get());
+    else
+        CIMPLE_WARN("an associator of class %s was not found: %d", instance->__meta_class->name,
+                    status.rc());
     return true;
 }
 
 bool deliver_reference(Delivery& delivery, Instance* instance) {
-    if (delivery.properties)
-        filter_properties(instance, delivery.properties, true);
-    return deliver_instance(delivery, instance, delivery.name_space);
+    return deliver_instance(delivery, instance, delivery.name_space.c_str());
 }
 
 bool deliver_reference_name(Delivery& delivery, Instance* instance) {
     nullify_non_keys(instance);
-    return deliver_path(delivery, instance, delivery.name_space);
+    return deliver_path(delivery, instance, delivery.name_space.c_str());
 }
 
 // ---- The functions ----
 
-// The source instance of a request. Keys that the path lacks are null.
-int make_source(const Call& call, const Meta_Class* meta_class, const CMPIObjectPath* path,
-                Ref<Instance>& source) {
-    Instance* instance = nullptr;
-    const int rc = make_cimple_reference(call.converter(path), meta_class, path, instance);
-    source.reset(instance);
-    return rc;
+// The source of a request by its path; keys that the path lacks are null. A class that the library
+// does not know is some platform's: it is taken as derived from the first end that it could stand
+// at, and null if there is none.
+Ref<Instance> make_source(const Call& call, const CMPIObjectPath* path, const char* role) {
+    const Converter converter = call.converter(path);
+    if (const Meta_Class* meta_class = call.find_class(path))
+        return make_cimple_reference(converter, meta_class, path);
+    const Meta_Class* association = call.adapter.meta_class;
+    for (uint32 i = 0; path && association && i < association->num_meta_features; i++) {
+        if (!(association->meta_features[i]->flags & FLAG_REFERENCE))
+            continue;
+        const auto* end = static_cast<const Meta_Reference*>(association->meta_features[i]);
+        if (end->subscript != 0 || !name_accepted(role, end->name))
+            continue;
+        if (Ref<Instance> source = make_foreign_reference(converter, end->meta_class, path))
+            return source;
+    }
+    return {};
 }
 
 CMPIStatus associator_names(CMPIAssociationMI* mi, const CMPIContext* context,
                             const CMPIResult* result, const CMPIObjectPath* path, const char*,
                             const char* result_class, const char* role, const char* result_role) {
     return run_call(mi, context, "associatorNames", [&](const Call& call) -> Answer {
-        const Meta_Class* meta_class = call.find_class(path);
-        if (!meta_class)
+        const Ref<Instance> source = make_source(call, path, text(role));
+        if (!source)
             return UNKNOWN_SOURCE;
-        Ref<Instance> source;
-        if (const int rc = make_source(call, meta_class, path, source); rc != CMPI_RC_OK)
-            return rc;
         Delivery delivery = {call, result, path, nullptr, cmpi::name_space(path)};
         const Request request = {source.get(), text(result_class), text(role), text(result_role)};
         return map_status(ASSOCIATOR_NAMES_STATUS,
@@ -263,12 +273,9 @@ CMPIStatus associators(CMPIAssociationMI* mi, const CMPIContext* context, const 
                        const CMPIObjectPath* path, const char*, const char* result_class,
                        const char* role, const char* result_role, const char** properties) {
     return run_call(mi, context, "associators", [&](const Call& call) -> Answer {
-        const Meta_Class* meta_class = call.find_class(path);
-        if (!meta_class)
+        const Ref<Instance> source = make_source(call, path, text(role));
+        if (!source)
             return CMPI_RC_OK; // here the trace shows the answer, unlike in the other functions
-        Ref<Instance> source;
-        if (const int rc = make_source(call, meta_class, path, source); rc != CMPI_RC_OK)
-            return rc;
         Delivery delivery = {call, result, path, properties, cmpi::name_space(path)};
         const Request request = {source.get(), text(result_class), text(role), text(result_role)};
         const sint32 status =
@@ -295,12 +302,9 @@ CMPIStatus run_references(CMPIAssociationMI* mi, const CMPIContext* context, con
                           const CMPIResult* result, const CMPIObjectPath* path, const char* role,
                           const char** properties, Instance_Proc handler) {
     return run_call(mi, context, function, [&](const Call& call) -> Answer {
-        const Meta_Class* meta_class = call.find_class(path);
-        if (!meta_class)
+        const Ref<Instance> source = make_source(call, path, text(role));
+        if (!source)
             return UNKNOWN_SOURCE;
-        Ref<Instance> source;
-        if (const int rc = make_source(call, meta_class, path, source); rc != CMPI_RC_OK)
-            return rc;
         const Ref<Instance> model = make_association_model(call);
         if (properties)
             filter_properties(model.get(), properties, true);

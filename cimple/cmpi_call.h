@@ -1,11 +1,15 @@
 // Thin wrappers over the function tables of the object manager.
 //
 // Every call goes through its slot, and every status is preset: some brokers leave it untouched. A
-// wrapper answers null, or a bad status, for a null object; nothing here throws. What a call
-// returns belongs to the broker until the MI function ends, unless release gives it back earlier.
+// wrapper answers null, or a bad status, for a null object. What a call returns belongs to the
+// broker until the MI function ends, unless release gives it back earlier: all that is made here
+// while a request is answered is given back as soon as it was handed over, so that a large answer
+// holds no more than a small one. What an object contains (the value of a property or a key, an
+// element) goes with it, and is never given back alone: some brokers would free it twice.
 #ifndef CIMPLE_CMPI_CALL_H
 #define CIMPLE_CMPI_CALL_H
 
+#include "cimple/string.h"
 #include "cmpi/cmpi.h"
 
 namespace cimple::cmpi {
@@ -39,10 +43,46 @@ public:
     Object* get() const noexcept { return _object; }
     Object*& out() noexcept { return _object; } // for a function that makes the object
     explicit operator bool() const noexcept { return _object != nullptr; }
+    Object* keep() noexcept { // hands the object to the caller
+        Object* object = _object;
+        _object = nullptr;
+        return object;
+    }
 
 private:
     Object* _object;
 };
+
+// The status of an up-call. Its text passes to the caller, and is given back with it.
+class Status {
+public:
+    Status() noexcept : _status(GOOD_STATUS) {}
+    explicit Status(CMPIStatus status) noexcept : _status(status) {}
+    ~Status() { release(_status.msg); }
+    Status(const Status&) = delete;
+    Status& operator=(const Status&) = delete;
+
+    CMPIStatus* out() noexcept { return &_status; }
+    int rc() const noexcept { return _status.rc; }
+    explicit operator bool() const noexcept { return good(_status); }
+
+private:
+    CMPIStatus _status;
+};
+
+// Gives back an object in a value that was handed over; other values are none.
+inline void release(const CMPIValue& value, CMPIType type) {
+    if (type & CMPI_ARRAY)
+        release(value.array);
+    else if (type == CMPI_string)
+        release(value.string);
+    else if (type == CMPI_dateTime)
+        release(value.dateTime);
+    else if (type == CMPI_ref)
+        release(value.ref);
+    else if (type == CMPI_instance)
+        release(value.inst);
+}
 
 // ---- Strings ----
 
@@ -53,6 +93,13 @@ inline const char* chars(const CMPIString* string) {
     CMPIStatus status = GOOD_STATUS;
     const char* text = string->ft->getCharPtr(string, &status);
     return good(status) ? text : nullptr;
+}
+
+// The text of a string object that is given back, "" on failure. Throws std::bad_alloc.
+inline String take_text(CMPIString* string, CMPIStatus status) {
+    const Scoped<CMPIString> owner(string);
+    const char* text = good(status) ? chars(string) : nullptr;
+    return text ? String(text) : String();
 }
 
 inline CMPIString* new_string(const CMPIBroker* broker, const char* text) {
@@ -112,22 +159,22 @@ inline CMPIObjectPath* new_path(const CMPIBroker* broker, const char* name_space
     return good(status) ? path : nullptr;
 }
 
-inline const char* class_name(const CMPIObjectPath* path) {
+// The class of a path, "" if it cannot be told.
+inline String class_name(const CMPIObjectPath* path) {
     if (!path)
-        return nullptr;
+        return {};
     CMPIStatus status = GOOD_STATUS;
-    const CMPIString* name = path->ft->getClassName(path, &status);
-    return good(status) ? chars(name) : nullptr;
+    CMPIString* name = path->ft->getClassName(path, &status);
+    return take_text(name, status);
 }
 
 // The namespace of a path, "" if it has none.
-inline const char* name_space(const CMPIObjectPath* path) {
+inline String name_space(const CMPIObjectPath* path) {
     if (!path)
-        return "";
+        return {};
     CMPIStatus status = GOOD_STATUS;
-    const CMPIString* name = path->ft->getNameSpace(path, &status);
-    const char* text = good(status) ? chars(name) : nullptr;
-    return text ? text : "";
+    CMPIString* name = path->ft->getNameSpace(path, &status);
+    return take_text(name, status);
 }
 
 // ---- Instances ----

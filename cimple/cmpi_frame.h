@@ -109,8 +109,8 @@ struct Delivery {
     const CMPIResult* result;
     const CMPIObjectPath* path; // of the request
     const char** properties;    // null: all
-    const char* name_space = "";
-    int error = CMPI_RC_OK; // the first; nothing is forwarded after it
+    String name_space;          // of the path
+    int error = CMPI_RC_OK;     // the first; nothing is forwarded after it
 };
 
 // Returns the path of the instance, or the instance, in this namespace. An error is kept; false

@@ -44,10 +44,10 @@ bool _indication_proc(Instance* instance, void* client_data) {
 }
 
 std::vector<Indication_Filter>::iterator find_filter(CMPI_Adapter& adapter,
-                                                     const char* name_space) {
+                                                     const String& name_space) {
     return std::find_if(
         adapter.filters.begin(), adapter.filters.end(),
-        [name_space](const Indication_Filter& filter) { return filter.name_space == name_space; });
+        [&](const Indication_Filter& filter) { return filter.name_space == name_space; });
 }
 
 CMPIStatus authorize_filter(CMPIIndicationMI* mi, const CMPIContext* context, const CMPISelectExp*,
@@ -63,7 +63,7 @@ CMPIStatus must_poll(CMPIIndicationMI* mi, const CMPIContext* context, const CMP
 CMPIStatus activate_filter(CMPIIndicationMI* mi, const CMPIContext* context, const CMPISelectExp*,
                            const char*, const CMPIObjectPath* class_path, CMPIBoolean) {
     return run_call(mi, context, "activateFilter", [&](const Call& call) -> int {
-        const char* name_space = cmpi::name_space(class_path);
+        const String name_space = cmpi::name_space(class_path);
         const auto filter = find_filter(call.adapter, name_space);
         if (filter != call.adapter.filters.end())
             filter->count++;

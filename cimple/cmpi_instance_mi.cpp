@@ -50,10 +50,8 @@ int make_keys(const Call& call, const CMPIObjectPath* path, Ref<Instance>& keys)
     const Meta_Class* meta_class = call.find_class(path);
     if (!meta_class)
         return CMPI_RC_ERR_FAILED;
-    Instance* instance = nullptr;
-    const int rc = make_cimple_reference(call.converter(path), meta_class, path, instance);
-    keys.reset(instance);
-    return rc;
+    keys = make_cimple_reference(call.converter(path), meta_class, path);
+    return CMPI_RC_OK;
 }
 
 int make_instance(const Call& call, const CMPIObjectPath* path, const CMPIInstance* source,
@@ -61,20 +59,18 @@ int make_instance(const Call& call, const CMPIObjectPath* path, const CMPIInstan
     const Meta_Class* meta_class = call.find_class(path);
     if (!meta_class)
         return CMPI_RC_ERR_FAILED;
-    Instance* made = nullptr;
-    const int rc = make_cimple_instance(call.converter(path), meta_class, source, made);
-    instance.reset(made);
-    return rc;
+    instance = make_cimple_instance(call.converter(path), meta_class, source);
+    return CMPI_RC_OK;
 }
 
 // ---- enumInstanceNames, enumInstances ----
 
 bool deliver_enumerated_path(Delivery& delivery, Instance* instance) {
-    return deliver_path(delivery, instance, delivery.name_space);
+    return deliver_path(delivery, instance, delivery.name_space.c_str());
 }
 
 bool deliver_enumerated_instance(Delivery& delivery, Instance* instance) {
-    return deliver_instance(delivery, instance, cmpi::name_space(delivery.path));
+    return deliver_instance(delivery, instance, delivery.name_space.c_str());
 }
 
 sint32 enumerate(const Call& call, const Instance* model, Instance_Proc handler,
@@ -106,7 +102,7 @@ CMPIStatus enum_instances(CMPIInstanceMI* mi, const CMPIContext* context, const 
             return rc;
         if (properties)
             filter_properties(model.get(), properties, true);
-        Delivery delivery = {call, result, path, properties};
+        Delivery delivery = {call, result, path, properties, cmpi::name_space(path)};
         const sint32 status =
             enumerate(call, model.get(), delivery_handler<deliver_enumerated_instance>, delivery);
         const int rc = map_status(ENUM_INSTANCES_STATUS, status);
@@ -163,8 +159,8 @@ CMPIStatus get_instance(CMPIInstanceMI* mi, const CMPIContext* context, const CM
         const sint32 status = get_instance_with_fallback(call, model.get(), found);
         if (status != GET_INSTANCE_OK)
             return map_status(GET_INSTANCE_STATUS, status);
-        Delivery delivery = {call, result, path, properties};
-        if (!deliver_instance(delivery, found.get(), cmpi::name_space(path)))
+        Delivery delivery = {call, result, path, properties, cmpi::name_space(path)};
+        if (!deliver_instance(delivery, found.get(), delivery.name_space.c_str()))
             return delivery.error;
         cmpi::return_done(result);
         return CMPI_RC_OK;
@@ -182,8 +178,8 @@ CMPIStatus create_instance(CMPIInstanceMI* mi, const CMPIContext* context, const
         const sint32 status = call.provider(OP_CREATE_INSTANCE, instance.get());
         if (status != CREATE_INSTANCE_OK)
             return map_status(CREATE_INSTANCE_STATUS, status);
-        Delivery delivery = {call, result, path, nullptr};
-        if (!deliver_path(delivery, instance.get(), cmpi::name_space(path)))
+        Delivery delivery = {call, result, path, nullptr, cmpi::name_space(path)};
+        if (!deliver_path(delivery, instance.get(), delivery.name_space.c_str()))
             return delivery.error;
         cmpi::return_done(result);
         return CMPI_RC_OK;

@@ -1,8 +1,6 @@
 // The method interface.
 #include "cimple/cmpi_frame.h"
 
-#include <strings.h>
-
 namespace cimple {
 
 namespace {
@@ -18,7 +16,8 @@ int return_outputs(const Call& call, const CMPIResult* result, const CMPIObjectP
                    const Instance* method, CMPIArgs* out) {
     CMPIValue value;
     CMPIType type;
-    const int rc = make_method_out(call.broker, cmpi::name_space(path), method, out, value, type);
+    const int rc =
+        make_method_out(call.broker, cmpi::name_space(path).c_str(), method, out, value, type);
     if (rc != CMPI_RC_OK)
         return rc;
     if (type != CMPI_null) // the interface has no way to return a null value
@@ -40,22 +39,14 @@ CMPIStatus invoke_method(CMPIMethodMI* mi, const CMPIContext* context, const CMP
             return {CMPI_RC_ERR_METHOD_NOT_FOUND, name ? name : ""};
         // The class's name against the method's own: only a method named like its class is refused.
         // It has always been so, and is meant to stay.
-        if (strcasecmp(cmpi::class_name(path), meta_method->name) == 0)
+        if (name_equal(cmpi::class_name(path).c_str(), meta_method->name))
             return CMPI_RC_ERR_INVALID_CLASS;
 
         const Converter converter = call.converter(path);
-        Instance* made = nullptr;
-        int rc = make_cimple_reference(converter, meta_class, path, made);
-        const Ref<Instance> self(made);
-        if (rc != CMPI_RC_OK)
-            return {rc, "CIMPLE reference creation failed"};
-        rc = make_method_instance(converter, meta_method, in, made);
-        const Ref<Instance> method(made);
-        if (rc != CMPI_RC_OK)
-            return {rc, "CIMPLE make_cimple_method function failed"};
-
+        const Ref<Instance> self = make_cimple_reference(converter, meta_class, path);
+        const Ref<Instance> method = make_method_instance(converter, meta_method, in);
         const sint32 status = call.provider(OP_INVOKE_METHOD, self.get(), method.get());
-        rc = map_status(INVOKE_METHOD_STATUS, status);
+        const int rc = map_status(INVOKE_METHOD_STATUS, status);
         return rc != CMPI_RC_OK ? rc : return_outputs(call, result, path, method.get(), out);
     });
 }

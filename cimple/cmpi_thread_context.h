@@ -7,6 +7,10 @@
 
 namespace cimple {
 
+struct CMPI_Enumerator;
+
+// All that an up-call hands out is given back on the thread that got it, at the latest when the
+// context ends or its thread detaches: some brokers do not survive what is left then.
 class CMPI_Thread_Context : public Thread_Context {
 public:
     // Borrows all three. adapter is null until a provider's is built.
@@ -14,6 +18,8 @@ public:
                         CMPI_Adapter* adapter) noexcept
         : _broker(broker), _context(context), _adapter(adapter) {}
     ~CMPI_Thread_Context() override;
+    CMPI_Thread_Context(const CMPI_Thread_Context&) = delete;
+    CMPI_Thread_Context& operator=(const CMPI_Thread_Context&) = delete;
 
     const CMPIBroker* broker() const { return _broker; }
     const CMPIContext* context() const { return _context; }
@@ -37,10 +43,14 @@ public:
     bool get_username(String& user) override;
 
 private:
+    friend struct CMPI_Enumerator;
+    void end_enumerations() noexcept;
+
     const CMPIBroker* _broker;
     const CMPIContext* _context;
     CMPI_Adapter* _adapter;
     CMPIContext* _prepared = nullptr; // made for a thread that has not attached; ours till it does
+    CMPI_Enumerator* _enumerators = nullptr; // that hold an enumeration of this context
 };
 
 } // namespace cimple

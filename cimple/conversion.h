@@ -2,8 +2,8 @@
 //
 // Members are written straight from the instance to the broker and back: there is no value in
 // between. A member that cannot be converted is left out with a warning in the engine's log; it
-// never fails the rest. Functions answer CMPI_RC_OK or CMPI_RC_ERR_FAILED. Nothing here locks; all
-// may throw std::bad_alloc.
+// never fails the rest. Functions that answer an int answer CMPI_RC_OK or CMPI_RC_ERR_FAILED.
+// Nothing here locks; all may throw std::bad_alloc.
 #ifndef CIMPLE_CONVERSION_H
 #define CIMPLE_CONVERSION_H
 
@@ -16,7 +16,7 @@ namespace cimple {
 struct Converter {
     const CMPIBroker* broker;
     const Meta_Repository* repository; // where classes of references are looked up
-    const char* name_space;            // of what is converted; "" for none
+    String name_space;                 // of what is converted; "" for none
 };
 
 // ---- Types: one table, conversion_to_cmpi.cpp ----
@@ -28,15 +28,21 @@ sint32 from_cmpi_type(CMPIType type);
 // "UINT8", "STRING_ARRAY", "NONE".
 const char* type_word(sint32 type);
 
-// ---- From CMPI; the caller owns what out receives, null on failure ----
+// ---- From CMPI. What the carrier does not give is null, and so is all of a null carrier. ----
 
-int make_cimple_reference(const Converter& converter, const Meta_Class* meta_class,
-                          const CMPIObjectPath* path, Instance*& out);
-int make_cimple_instance(const Converter& converter, const Meta_Class* meta_class,
-                         const CMPIInstance* instance, Instance*& out);
+// An instance of the class with the keys of the path.
+Ref<Instance> make_cimple_reference(const Converter& converter, const Meta_Class* meta_class,
+                                    const CMPIObjectPath* path);
+// The same for a path of a class that the repository does not have, which is some platform's. Its
+// instances are known by their keys: it is taken as derived from the base, in a class made at run
+// time. Null unless the path has the keys of the base.
+Ref<Instance> make_foreign_reference(const Converter& converter, const Meta_Class* base,
+                                     const CMPIObjectPath* path);
+Ref<Instance> make_cimple_instance(const Converter& converter, const Meta_Class* meta_class,
+                                   const CMPIInstance* instance);
 // A method instance with its In parameters.
-int make_method_instance(const Converter& converter, const Meta_Method* method,
-                         const CMPIArgs* args, Instance*& out);
+Ref<Instance> make_method_instance(const Converter& converter, const Meta_Method* method,
+                                   const CMPIArgs* args);
 // Reads the Out parameters of a method that was called, and its return value, into the instance.
 int read_method_out(const Converter& converter, const CMPIArgs* args, const CMPIData& return_value,
                     Instance* method);
@@ -45,7 +51,7 @@ int read_method_out(const Converter& converter, const CMPIArgs* args, const CMPI
 
 int make_cmpi_object_path(const CMPIBroker* broker, const Instance* instance,
                           const char* name_space, CMPIObjectPath*& out);
-// With a list only the properties it names, and the keys, reach the CMPI instance.
+// With a list only the properties it names, and the keys, are converted.
 int make_CMPI_instance(const CMPIBroker* broker, const Instance* instance, const char* name_space,
                        CMPIObjectPath* path, const char** properties, CMPIInstance*& out);
 // Fills args with the parameters of a method instance that have the flag (In or Out).

@@ -120,10 +120,6 @@ struct From_Args {
     }
 };
 
-template <class Carrier>
-int convert_to_instance(const Converter& converter, const Meta_Features* meta, uint32 flags,
-                        Carrier carrier, Instance* out);
-
 // ---- Values ----
 
 bool read_string(const CMPIString* string, String& out) {
@@ -142,12 +138,12 @@ bool read_string(const CMPIString* string, String& out) {
 }
 
 bool read_datetime(const CMPIDateTime* datetime, Datetime& out) {
-    const CMPIString* string = cmpi::string_format(datetime);
+    const cmpi::Scoped<CMPIString> string(cmpi::string_format(datetime));
     if (!string) {
         CIMPLE_WARN("CMGetStringFormat() failed");
         return false;
     }
-    const char* text = cmpi::chars(string);
+    const char* text = cmpi::chars(string.get());
     if (!text) {
         CIMPLE_WARN("CMGetCharsPtr() failed");
         return false;
@@ -159,42 +155,48 @@ bool read_datetime(const CMPIDateTime* datetime, Datetime& out) {
     return true;
 }
 
-// The object path that tells the class of a reference or an embedded object.
-const CMPIObjectPath* path_of(const CMPIValue& value, bool is_path) {
-    if (is_path ? !value.ref : !value.inst) {
-        CIMPLE_WARN("null instance");
-        return nullptr;
+// An instance of the class of the path, or of a class derived from the expected one that a path may
+// have though the repository does not; null, with a warning, when the class cannot be told.
+template <class Make>
+Ref<Instance> read_object(const Converter& converter, const CMPIObjectPath* path,
+                          const Meta_Class* foreign_base, Make make) {
+    const String name = cmpi::class_name(path);
+    if (name.empty()) {
+        CIMPLE_WARN("CMGetClassName() failed");
+        return {};
     }
-    if (is_path)
-        return value.ref;
-    const CMPIObjectPath* path = cmpi::object_path(value.inst);
-    if (!path)
-        CIMPLE_WARN("CMGetObjectPath() failed");
-    return path;
+    const Converter own = {converter.broker, converter.repository, cmpi::name_space(path)};
+    if (const Meta_Class* meta_class = find_meta_class(converter.repository, name.c_str()))
+        return make(own, meta_class);
+    Ref<Instance> foreign;
+    if (foreign_base)
+        foreign = make_foreign_reference(own, foreign_base, path);
+    if (!foreign)
+        CIMPLE_WARN("failed to find meta class: %s", name.c_str());
+    return foreign;
 }
 
 // A new instance of the object's own class, with its own namespace if it has one; null on failure.
-Instance* read_instance(const Converter& converter, const CMPIValue& value, bool is_path) {
-    const CMPIObjectPath* path = path_of(value, is_path);
-    if (!path)
-        return nullptr;
-    const char* name = cmpi::class_name(path);
-    if (!name) {
-        CIMPLE_WARN("CMGetClassName() failed");
-        return nullptr;
+Ref<Instance> read_instance(const Converter& converter, const Meta_Class* expected,
+                            const CMPIValue& value, bool is_path) {
+    if (is_path ? !value.ref : !value.inst) {
+        CIMPLE_WARN("null instance");
+        return {};
     }
-    const Meta_Class* meta_class = find_meta_class(converter.repository, name);
-    if (!meta_class) {
-        CIMPLE_WARN("failed to find meta class: %s", name);
-        return nullptr;
+    if (is_path)
+        return read_object(converter, value.ref, expected,
+                           [&](const Converter& own, const Meta_Class* meta_class) {
+                               return make_cimple_reference(own, meta_class, value.ref);
+                           });
+    const cmpi::Scoped<CMPIObjectPath> path(cmpi::object_path(value.inst));
+    if (!path) {
+        CIMPLE_WARN("CMGetObjectPath() failed");
+        return {};
     }
-    const Converter inner = {converter.broker, converter.repository, cmpi::name_space(path)};
-    Instance* instance = nullptr;
-    const int rc = is_path ? make_cimple_reference(inner, meta_class, value.ref, instance)
-                           : make_cimple_instance(inner, meta_class, value.inst, instance);
-    if (rc != CMPI_RC_OK)
-        CIMPLE_WARN("failed to create CIMPLE instance");
-    return instance;
+    return read_object(converter, path.get(), nullptr,
+                       [&](const Converter& own, const Meta_Class* meta_class) {
+                           return make_cimple_instance(own, meta_class, value.inst);
+                       });
 }
 
 bool accepts(const Meta_Features* meta, const Meta_Reference* feature, const Instance* instance) {
@@ -279,9 +281,12 @@ bool read_instance_array(const Converter& converter, const Meta_Features* meta,
             CIMPLE_WARN("array element type mismatch");
             return false;
         }
-        Instance* instance = read_instance(converter, element.value, element_type == CMPI_ref);
-        list.items[list.items.size() - 1] = instance;
-        return instance && accepts(meta, feature, instance);
+        Ref<Instance> instance =
+            read_instance(converter, feature->meta_class, element.value, element_type == CMPI_ref);
+        if (!instance || !accepts(meta, feature, instance.get()))
+            return false;
+        list.items[list.items.size() - 1] = instance.release();
+        return true;
     });
     if (complete)
         out.swap(list.items);
@@ -322,7 +327,8 @@ bool assign_reference(const Converter& converter, const Meta_Features* meta,
         *null_flag(instance, feature) = 0;
         return true;
     }
-    Ref<Instance> target(read_instance(converter, data.value, data.type == CMPI_ref));
+    Ref<Instance> target =
+        read_instance(converter, feature->meta_class, data.value, data.type == CMPI_ref);
     if (!target || !accepts(meta, feature, target.get()))
         return false;
     Instance*& slot = reference(instance, feature);
@@ -365,17 +371,17 @@ bool assign(const Converter& converter, const Meta_Features* meta, const Meta_Fe
 // afterwards. meta is the class, or the method, whose structure out has. Names that it does not
 // have are ignored: other subclasses of a common base may have them.
 template <class Carrier>
-int convert_to_instance(const Converter& converter, const Meta_Features* meta, uint32 flags,
-                        Carrier carrier, Instance* out) {
+void convert_to_instance(const Converter& converter, const Meta_Features* meta, uint32 flags,
+                         Carrier carrier, Instance* out) {
     nullify(out, true, true);
     CMPICount count = 0;
     if (!carrier.source || !carrier.count(count))
-        return CMPI_RC_ERR_FAILED;
+        return;
     for (CMPICount i = 0; i < count; i++) {
-        CMPIString* name = nullptr;
+        cmpi::Scoped<CMPIString> name;
         CMPIStatus status = cmpi::GOOD_STATUS;
-        CMPIData data = carrier.at(i, name, status);
-        const char* text = cmpi::good(status) ? cmpi::chars(name) : nullptr;
+        CMPIData data = carrier.at(i, name.out(), status);
+        const char* text = cmpi::good(status) ? cmpi::chars(name.get()) : nullptr;
         if (!text) {
             CIMPLE_WARN("get_name() failed: class=%s, index=%u", meta->name, i);
             continue;
@@ -391,51 +397,51 @@ int convert_to_instance(const Converter& converter, const Meta_Features* meta, u
         if (!assign(converter, meta, feature, data, out))
             CIMPLE_WARN("conversion error: %s.%s", meta->name, text);
     }
-    return CMPI_RC_OK;
 }
 
 template <class Carrier>
-int make_instance(const Converter& converter, const Meta_Class* meta_class, uint32 flags,
-                  Carrier carrier, Instance*& out) {
-    out = nullptr;
+Ref<Instance> make_instance(const Converter& converter, const Meta_Class* meta_class, uint32 flags,
+                            Carrier carrier) {
     Ref<Instance> instance(create(meta_class));
-    const int rc = convert_to_instance(converter, meta_class, flags, carrier, instance.get());
-    if (rc == CMPI_RC_OK) {
-        set_name_space_recursive(instance.get(), converter.name_space, false);
-        out = instance.release();
-    }
-    return rc;
+    convert_to_instance(converter, meta_class, flags, carrier, instance.get());
+    set_name_space_recursive(instance.get(), converter.name_space.c_str(), false);
+    return instance;
 }
 
 } // namespace
 
 // ---- Entry points ----
 
-int make_cimple_reference(const Converter& converter, const Meta_Class* meta_class,
-                          const CMPIObjectPath* path, Instance*& out) {
-    return make_instance(converter, meta_class, FLAG_KEY, From_Path{path}, out);
+Ref<Instance> make_cimple_reference(const Converter& converter, const Meta_Class* meta_class,
+                                    const CMPIObjectPath* path) {
+    return make_instance(converter, meta_class, FLAG_KEY, From_Path{path});
 }
 
-int make_cimple_instance(const Converter& converter, const Meta_Class* meta_class,
-                         const CMPIInstance* instance, Instance*& out) {
-    return make_instance(converter, meta_class, 0, From_Instance{instance}, out);
+Ref<Instance> make_foreign_reference(const Converter& converter, const Meta_Class* base,
+                                     const CMPIObjectPath* path) {
+    CMPICount count = 0;
+    if (base->num_keys == 0 || !From_Path{path}.count(count) || count != base->num_keys)
+        return {};
+    const Class_Handle foreign(create_meta_class(cmpi::class_name(path).c_str(), base, 0));
+    Ref<Instance> instance = make_cimple_reference(converter, foreign.get(), path);
+    return keys_all_set(instance.get()) ? instance : Ref<Instance>();
 }
 
-int make_method_instance(const Converter& converter, const Meta_Method* method,
-                         const CMPIArgs* args, Instance*& out) {
-    // A method stands in for the class of its instance; what both have is all that is read.
-    const Meta_Features* features = method;
-    return make_instance(converter, static_cast<const Meta_Class*>(features), FLAG_IN,
-                         From_Args{args}, out);
+Ref<Instance> make_cimple_instance(const Converter& converter, const Meta_Class* meta_class,
+                                   const CMPIInstance* instance) {
+    return make_instance(converter, meta_class, 0, From_Instance{instance});
+}
+
+Ref<Instance> make_method_instance(const Converter& converter, const Meta_Method* method,
+                                   const CMPIArgs* args) {
+    return make_instance(converter, as_class(method), FLAG_IN, From_Args{args});
 }
 
 int read_method_out(const Converter& converter, const CMPIArgs* args, const CMPIData& return_value,
                     Instance* method) {
     const Meta_Features* meta = method->__meta_class;
-    const int rc = convert_to_instance(converter, meta, FLAG_OUT, From_Args{args}, method);
-    if (rc != CMPI_RC_OK)
-        return rc;
-    set_name_space_recursive(method, converter.name_space, false);
+    convert_to_instance(converter, meta, FLAG_OUT, From_Args{args}, method);
+    set_name_space_recursive(method, converter.name_space.c_str(), false);
     const Meta_Feature* feature = find_feature(meta, "return_value", FLAG_PROPERTY);
     if (!usable(return_value))
         return CMPI_RC_OK;

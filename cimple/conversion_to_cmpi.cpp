@@ -63,13 +63,14 @@ const char* type_word(sint32 type) {
     return type & TYPE_ARRAY ? TYPES[element].array_word : TYPES[element].word;
 }
 
-// ---- Carriers: where a converted member goes ----
+// ---- Carriers: where a converted member goes. set copies the value, or takes it over and leaves a
+// null one. ----
 
 namespace {
 
 struct To_Instance {
     CMPIInstance* target;
-    bool set(const char* name, const CMPIValue& value, CMPIType type) {
+    bool set(const char* name, CMPIValue& value, CMPIType type) {
         if (cmpi::good(target->ft->setProperty(target, name, &value, type)))
             return true;
         CIMPLE_WARN("CMSetProperty() failed: %s", name);
@@ -79,7 +80,7 @@ struct To_Instance {
 
 struct To_Path {
     CMPIObjectPath* target;
-    bool set(const char* name, const CMPIValue& value, CMPIType type) {
+    bool set(const char* name, CMPIValue& value, CMPIType type) {
         if (cmpi::good(target->ft->addKey(target, name, &value, type)))
             return true;
         CIMPLE_WARN("CMAddKey() failed");
@@ -91,10 +92,11 @@ struct To_Args {
     CMPIArgs* target;
     CMPIValue* return_value; // the slot for the method's result
     CMPIType* return_type;
-    bool set(const char* name, const CMPIValue& value, CMPIType type) {
+    bool set(const char* name, CMPIValue& value, CMPIType type) {
         if (return_value && name_equal(name, "return_value")) {
             *return_value = value;
             *return_type = type;
+            value.string = nullptr;
             return true;
         }
         if (target && cmpi::good(target->ft->addArg(target, name, &value, type)))
@@ -112,8 +114,12 @@ struct Source {
     const char* name_space;
 };
 
-template <class Carrier>
-bool fill(const Source& source, const Instance* instance, uint32 flags, Carrier carrier);
+bool all_members(const Meta_Feature*) {
+    return true;
+}
+
+template <class Carrier, class Wanted>
+void fill(const Source& source, const Instance* instance, Carrier carrier, Wanted wanted);
 void fill_keys(const Source& source, const Instance* instance, CMPIObjectPath* path);
 
 // One value of a property's type, or one element of an array of them.
@@ -146,23 +152,35 @@ inline bool scalar_value(const Source& source, const void* from, uint32 type, CM
     return true;
 }
 
-bool array_value(const Source& source, const Array_Base& items, uint32 type, CMPIValue& value) {
-    const CMPIType element_type = to_cmpi_type(type);
-    value.array = cmpi::new_array(source.broker, items.size(), element_type);
-    if (!value.array)
+// An array of count elements, each made by make_element(index, element). An element that was set
+// goes with the array: some brokers keep the object itself.
+template <class Make>
+bool fill_array(const Source& source, uint32 count, CMPIType element_type, CMPIValue& value,
+                Make make_element) {
+    cmpi::Scoped<CMPIArray> array(cmpi::new_array(source.broker, count, element_type));
+    if (!array)
         return false;
-    const char* item = static_cast<const char*>(items.data());
-    const uint32 step = TYPES[type].size;
-    for (uint32 i = 0; i < items.size(); i++, item += step) {
+    for (uint32 i = 0; i < count; i++) {
         CMPIValue element;
-        if (!scalar_value(source, item, type, element))
+        if (!make_element(i, element))
             return false;
-        if (!cmpi::set_element(value.array, i, element, element_type)) {
+        if (!cmpi::set_element(array.get(), i, element, element_type)) {
             CIMPLE_WARN("CMSetArrayElementAt() failed");
+            cmpi::release(element, element_type);
             return false;
         }
     }
+    value.array = array.keep();
     return true;
+}
+
+bool array_value(const Source& source, const Array_Base& items, uint32 type, CMPIValue& value) {
+    const char* const first = static_cast<const char*>(items.data());
+    const uint32 step = TYPES[type].size;
+    return fill_array(source, items.size(), to_cmpi_type(type), value,
+                      [&](uint32 i, CMPIValue& element) {
+                          return scalar_value(source, first + std::size_t{i} * step, type, element);
+                      });
 }
 
 // A reference becomes an object path, an embedded object an instance. Each lies in its own
@@ -180,42 +198,35 @@ bool instance_value(const Source& source, const Instance* instance, bool embedde
         CIMPLE_WARN(own.name_space ? "null classname" : "null namespace");
         return false;
     }
-    CMPIObjectPath* path = cmpi::new_path(own.broker, own.name_space, instance->__meta_class->name);
+    cmpi::Scoped<CMPIObjectPath> path(
+        cmpi::new_path(own.broker, own.name_space, instance->__meta_class->name));
     if (!path) {
         CIMPLE_WARN("CMNewObjectPath() failed");
         return false;
     }
-    fill_keys(own, instance, path);
+    fill_keys(own, instance, path.get());
     if (!embedded) {
-        value.ref = path;
+        value.ref = path.keep();
         return true;
     }
-    value.inst = cmpi::new_instance(own.broker, path);
+    value.inst = cmpi::new_instance(own.broker, path.get());
     if (!value.inst) {
         CIMPLE_WARN("CMNewInstance() failed");
         return false;
     }
-    return fill(own, instance, 0, To_Instance{value.inst});
+    fill(own, instance, To_Instance{value.inst}, all_members);
+    return true;
 }
 
 bool instance_array_value(const Source& source, const Array_Base& items, bool embedded,
                           CMPIType element_type, CMPIValue& value) {
-    value.array = cmpi::new_array(source.broker, items.size(), element_type);
-    if (!value.array)
-        return false;
     const auto* item = static_cast<const Instance* const*>(items.data());
-    for (uint32 i = 0; i < items.size(); i++) {
-        CMPIValue element;
-        if (!instance_value(source, item[i], embedded, element)) {
+    return fill_array(source, items.size(), element_type, value, [&](uint32 i, CMPIValue& element) {
+        const bool converted = instance_value(source, item[i], embedded, element);
+        if (!converted)
             CIMPLE_WARN("element conversion failed");
-            return false;
-        }
-        if (!cmpi::set_element(value.array, i, element, element_type)) {
-            CIMPLE_WARN("CMSetArrayElementAt() failed");
-            return false;
-        }
-    }
-    return true;
+        return converted;
+    });
 }
 
 // The value of a property that is not null, with its CMPI type.
@@ -260,29 +271,34 @@ inline void pass_member(const Source& source, const Instance* instance, const Me
     } else {
         return;
     }
-    if (!converted)
+    if (!converted) {
         CIMPLE_WARN("_to_cmpi_data() failed: feature=%s", feature->name);
-    else
+    } else {
         converted = carrier.set(feature->name, value, type);
+        cmpi::release(value, type);
+    }
     if (!converted)
         CIMPLE_WARN("conversion error: %s.%s", instance->__meta_class->name, feature->name);
 }
 
-// Hands the members that share a bit with flags (0: all) and are not null to the carrier. Fails for
-// a null instance only.
-template <class Carrier>
-bool fill(const Source& source, const Instance* instance, uint32 flags, Carrier carrier) {
-    if (!instance) {
-        CIMPLE_WARN("ignored null instance arg");
-        return false;
-    }
+// Hands the members that are wanted and not null to the carrier.
+template <class Carrier, class Wanted>
+void fill(const Source& source, const Instance* instance, Carrier carrier, Wanted wanted) {
     const Meta_Features* meta = instance->__meta_class;
-    for (uint32 i = 0; i < meta->num_meta_features; i++) {
-        const Meta_Feature* feature = meta->meta_features[i];
-        if (flags == 0 || (feature->flags & flags))
-            pass_member(source, instance, feature, carrier);
+    for (uint32 i = 0; i < meta->num_meta_features; i++)
+        if (wanted(meta->meta_features[i]))
+            pass_member(source, instance, meta->meta_features[i], carrier);
+}
+
+// The parameters of a method instance that have the flag.
+int fill_args(const Source& source, const Instance* method, uint32 flag, const To_Args& carrier) {
+    if (!method) {
+        CIMPLE_WARN("ignored null instance arg");
+        return CMPI_RC_ERR_FAILED;
     }
-    return true;
+    fill(source, method, carrier,
+         [flag](const Meta_Feature* feature) { return (feature->flags & flag) != 0; });
+    return CMPI_RC_OK;
 }
 
 // The keys only. They are few and mostly first, so the walk ends with the last of them.
@@ -309,6 +325,13 @@ void set_property_filter(CMPIInstance* target, const Meta_Features* meta, const 
             keys[count++] = meta->meta_features[i]->name;
     keys[count] = nullptr;
     target->ft->setPropertyFilter(target, properties, keys);
+}
+
+bool is_listed(const char* const* names, const char* name) {
+    for (; *names; ++names)
+        if (name_equal(*names, name))
+            return true;
+    return false;
 }
 
 } // namespace
@@ -339,36 +362,40 @@ int make_CMPI_instance(const CMPIBroker* broker, const Instance* instance, const
         CIMPLE_WARN("ignored null instance arg");
         return CMPI_RC_ERR_FAILED;
     }
+    cmpi::Scoped<CMPIObjectPath> made;
     if (!path) {
         CIMPLE_WARN("No ObjectPath built before call to make_CMPI_instance");
-        if (make_cmpi_object_path(broker, instance, name_space, path) != CMPI_RC_OK)
+        if (make_cmpi_object_path(broker, instance, name_space, made.out()) != CMPI_RC_OK)
             return CMPI_RC_ERR_FAILED;
+        path = made.get();
     }
     CMPIInstance* target = cmpi::new_instance(broker, path);
     if (!target) {
         CIMPLE_WARN("CMNewInstance() failed");
         return CMPI_RC_ERR_FAILED;
     }
-    if (properties)
-        set_property_filter(target, instance->__meta_class, properties);
-    fill({broker, name_space}, instance, 0, To_Instance{target});
     out = target;
+    const Source source = {broker, name_space};
+    if (!properties) {
+        fill(source, instance, To_Instance{target}, all_members);
+        return CMPI_RC_OK;
+    }
+    set_property_filter(target, instance->__meta_class, properties);
+    fill(source, instance, To_Instance{target}, [properties](const Meta_Feature* feature) {
+        return (feature->flags & FLAG_KEY) || is_listed(properties, feature->name);
+    });
     return CMPI_RC_OK;
 }
 
 int make_method_args(const CMPIBroker* broker, const char* name_space, const Instance* method,
                      uint32 flag, CMPIArgs* args) {
-    return fill({broker, name_space}, method, flag, To_Args{args, nullptr, nullptr})
-               ? CMPI_RC_OK
-               : CMPI_RC_ERR_FAILED;
+    return fill_args({broker, name_space}, method, flag, To_Args{args, nullptr, nullptr});
 }
 
 int make_method_out(const CMPIBroker* broker, const char* name_space, const Instance* method,
                     CMPIArgs* args, CMPIValue& out_value, CMPIType& out_type) {
     out_type = CMPI_null;
-    return fill({broker, name_space}, method, FLAG_OUT, To_Args{args, &out_value, &out_type})
-               ? CMPI_RC_OK
-               : CMPI_RC_ERR_FAILED;
+    return fill_args({broker, name_space}, method, FLAG_OUT, To_Args{args, &out_value, &out_type});
 }
 
 } // namespace cimple

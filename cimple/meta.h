@@ -9,6 +9,8 @@
 
 #include "cimple/types.h"
 
+#include <memory>
+
 namespace cimple {
 
 struct Meta_Class;
@@ -191,6 +193,13 @@ bool name_equal(const char* a, const char* b);
 // super class and no local features. The caller owns one count, and is the only one who may change
 // the class. Throws std::bad_alloc.
 Meta_Class* create_meta_class(const char* name, const Meta_Class* base, uint32 flags);
+
+// The count of whoever makes a class.
+struct Class_Releaser {
+    void operator()(const Meta_Class* meta_class) const { unref(meta_class); }
+};
+using Class_Handle = std::unique_ptr<Meta_Class, Class_Releaser>;
+
 // Removes the named qualifiers, or all when names is null, from a class made at run time, from its
 // features and from the parameters of its methods. A static class is left alone.
 void remove_qualifiers(Meta_Class* meta_class, const char* const* names, uint32 count);

@@ -23,6 +23,7 @@ struct Attachment {
     void end() {
         if (!call)
             return;
+        core->end_thread(call->arena);
         call.reset();
         context = nullptr;
         --core->attached_threads;

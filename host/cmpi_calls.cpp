@@ -25,7 +25,7 @@ CMPIData get_named(const Object* object, Named_Values Body::*values, const char*
     const Named_Values* known = values_of(object, values, call, status);
     const Value* value = known && name ? find(*known, name) : nullptr;
     if (value)
-        return to_data(core_of(object), *value);
+        return to_data_in(object, *value);
     if (known)
         put(status, CMPI_RC_ERR_NOT_FOUND);
     return missing_data();
@@ -44,7 +44,7 @@ CMPIData get_at(const Object* object, Named_Values Body::*values, const char* ca
     }
     if (name)
         *name = new_string(core_of(object), (*known)[index].name);
-    return to_data(core_of(object), (*known)[index].value);
+    return to_data_in(object, (*known)[index].value);
 }
 
 template <class Body, class Object>
@@ -252,7 +252,10 @@ CMPIData enumeration_next(const CMPIEnumeration* enumeration, CMPIStatus* status
         put(status, CMPI_RC_ERR_NOT_FOUND);
         return missing_data(body->element_type);
     }
-    return to_data(core_of(enumeration), body->elements[body->next++]);
+    CMPIData data = to_data_in(enumeration, body->elements[body->next++]);
+    if (core_of(enumeration).options.elements_marked_null)
+        data.state = static_cast<CMPIValueState>(data.state | CMPI_nullValue);
+    return data;
 }
 
 CMPIBoolean enumeration_has_next(const CMPIEnumeration* enumeration, CMPIStatus* status) noexcept {

@@ -13,8 +13,9 @@ InstanceBody* use(const CMPIInstance* inst, const char* function, CMPIStatus* st
     return body;
 }
 
-CMPIData value_data(Core& core, const Property& property, const std::optional<Value>& value) {
-    CMPIData data = to_data(core, value ? *value : Value::null(property.type));
+CMPIData value_data(const CMPIInstance* inst, const Property& property,
+                    const std::optional<Value>& value) {
+    CMPIData data = to_data_in(inst, value ? *value : Value::null(property.type));
     if (property.key)
         data.state = static_cast<CMPIValueState>(data.state | CMPI_keyValue);
     return data;
@@ -30,7 +31,7 @@ CMPIData instance_property(const CMPIInstance* inst, const char* name,
         put(status, CMPI_RC_ERR_NO_SUCH_PROPERTY);
         return missing_data();
     }
-    return value_data(core_of(inst), body->known->properties[at], body->values[at]);
+    return value_data(inst, body->known->properties[at], body->values[at]);
 }
 
 // Indices count the properties that were set.
@@ -47,7 +48,7 @@ CMPIData instance_property_at(const CMPIInstance* inst, CMPICount index, CMPIStr
         const Property& property = body->known->properties[at];
         if (name)
             *name = new_string(core_of(inst), property.name);
-        return value_data(core_of(inst), property, body->values[at]);
+        return value_data(inst, property, body->values[at]);
     }
     put(status, CMPI_RC_ERR_NO_SUCH_PROPERTY);
     return missing_data();

@@ -87,7 +87,7 @@ CMPIData path_key(const CMPIObjectPath* op, const char* name, CMPIStatus* status
     const ObjectPathBody* body = use(op, "getKey", status);
     const Value* key = body && name ? body->path.key(name) : nullptr;
     if (key)
-        return to_key_data(core_of(op), *key);
+        return to_key_data_in(op, *key);
     if (body)
         put(status, CMPI_RC_ERR_NOT_FOUND);
     return missing_data();
@@ -107,7 +107,7 @@ CMPIData path_key_at(const CMPIObjectPath* op, CMPICount index, CMPIString** nam
     const Named_Value& key = body->path.keys[index];
     if (name)
         *name = new_string(core_of(op), key.name);
-    return to_key_data(core_of(op), key.value);
+    return to_key_data_in(op, key.value);
 }
 
 CMPICount path_key_count(const CMPIObjectPath* op, CMPIStatus* status) noexcept {

@@ -77,7 +77,7 @@ CMPIData array_element(const CMPIArray* array, CMPICount index, CMPIStatus* stat
         put(status, CMPI_RC_ERR_INVALID_PARAMETER);
         return missing_data(body->element_type);
     }
-    return to_data(core_of(array), body->elements[index]);
+    return to_data_in(array, body->elements[index]);
 }
 
 bool is_text_type(CMPIType type) {
@@ -112,8 +112,11 @@ CMPIStatus array_set(CMPIArray* array, CMPICount index, const CMPIValue* value,
     ArrayBody::Held held;
     if (!element->is_null() && (type & CMPI_ENC) != 0 && !(type == CMPI_chars) &&
         type != CMPI_charsptr) {
-        const auto* object = reinterpret_cast<const Object*>(value->string);
+        auto* object = reinterpret_cast<Object*>(value->string);
         held = {object, object->serial};
+        // It goes with the array, unless it has another owner already.
+        if (!object->parameter && object->arena != &core.clones)
+            adopt(*object, body->contents);
     }
     body->elements[index] = std::move(*element);
     body->held[index] = held;

@@ -62,18 +62,36 @@ bool Core::is_provider_name_space(std::string_view name_space) const {
                        [&](const std::string& known) { return same_name(known, name_space); });
 }
 
+namespace {
+
+// "2 CMPIString", one text for each kind.
+std::vector<std::string> count_kinds(std::initializer_list<const Arena*> arenas) {
+    Live_Counts counts{};
+    for (const Arena* arena : arenas)
+        for (const Object* object = arena->first; object; object = object->next)
+            ++counts[static_cast<std::size_t>(object->kind)];
+    std::vector<std::string> texts;
+    for (std::size_t kind = 0; kind < KIND_COUNT; ++kind)
+        if (counts[kind] > 0)
+            texts.push_back(std::to_string(counts[kind]) + " " +
+                            to_string(static_cast<Kind>(kind)));
+    return texts;
+}
+
+} // namespace
+
+void Core::end_thread(Arena& arena) {
+    for (const std::string& text : count_kinds({&arena}))
+        report(this, FaultKind::left_at_detach, text);
+    left += destroy_all(arena, true);
+}
+
 void Core::report_leaks() {
     if (const int threads = attached_threads.load(); threads > 0)
         report(this, FaultKind::leak, std::to_string(threads) + " threads still attached");
-    Live_Counts counts{};
-    for (const Arena* arena : {&clones, &contexts, &strays})
-        for (const Object* object = arena->first; object; object = object->next)
-            ++counts[static_cast<std::size_t>(object->kind)];
-    for (std::size_t kind = 0; kind < KIND_COUNT; ++kind)
-        if (counts[kind] > 0)
-            report(this, FaultKind::leak,
-                   std::to_string(counts[kind]) + " " + to_string(static_cast<Kind>(kind)) +
-                       (counts[kind] == 1 ? " was" : " were") + " never released");
+    for (const std::string& text : count_kinds({&clones, &contexts, &strays}))
+        report(this, FaultKind::leak,
+               text + (text.starts_with("1 ") ? " was" : " were") + " never released");
     destroy_all(clones);
     destroy_all(contexts);
     destroy_all(strays);

@@ -53,6 +53,9 @@ public:
     bool is_provider_name_space(std::string_view name_space) const;
     // Records what is alive as leaks and frees it.
     void report_leaks();
+    // Records what a thread leaves behind when it detaches and frees it, in a way that no provider
+    // can count on: at once, oldest first. Object managers are known that free it twice.
+    void end_thread(Arena& arena);
 
     // The manager that a fault is reported to when its object cannot tell: that of the running
     // call, else the youngest one; null if there is none.

@@ -36,6 +36,8 @@ const char* to_string(FaultKind kind) {
         return "thread not attached";
     case FaultKind::attachment:
         return "attachment of a thread";
+    case FaultKind::left_at_detach:
+        return "left at detachThread";
     case FaultKind::recursion:
         return "recursive up-call";
     case FaultKind::leak:

@@ -181,7 +181,12 @@ std::size_t Manager::live_object_count() const {
 }
 
 Statistics Manager::statistics() const {
-    return {_core->calls, _core->up_calls, _core->counters.created, _core->left};
+    return {_core->calls, _core->up_calls, _core->counters.created, _core->left,
+            _core->counters.peak};
+}
+
+void Manager::restart_peak() {
+    _core->counters.peak = _core->counters.alive.load();
 }
 
 std::vector<Indication> Manager::indications() const {

@@ -34,6 +34,9 @@ struct Options {
     // Released texts are overwritten and kept for a while, so that a late use is seen, and
     // harmless.
     bool strict = true;
+    // Good elements of an enumeration come with the state CMPI_nullValue, as from one object
+    // manager.
+    bool elements_marked_null = false;
     // Microseconds since the epoch, for new datetimes; empty: the system's clock.
     std::function<std::uint64_t()> clock;
     // Gets a line for each call into the provider and each up-call, on the thread that makes it.
@@ -87,6 +90,7 @@ struct Statistics {
     std::size_t up_calls = 0;        // from it
     std::size_t objects_created = 0; // CMPI objects
     std::size_t objects_left = 0; // of these, freed by the end of their call, parameters included
+    std::size_t objects_peak = 0; // the most alive at once
 };
 
 class Manager {
@@ -150,6 +154,7 @@ public:
     Live_Counts live_objects() const; // by kind, now
     std::size_t live_object_count() const;
     Statistics statistics() const;
+    void restart_peak(); // from what is alive now
     std::vector<Indication> indications() const;
     std::vector<Log_Message> log_messages() const;
 

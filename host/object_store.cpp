@@ -2,6 +2,7 @@
 
 #include "host/core.h"
 
+#include <algorithm>
 #include <deque>
 #include <mutex>
 #include <new>
@@ -90,48 +91,67 @@ public:
         object->parameter = false;
         object->serial = ++_serial;
         object->core = &core;
-        object->arena = &arena;
         object->body = body.release();
-        object->previous = nullptr;
-        object->next = arena.first;
-        if (arena.first)
-            arena.first->previous = object;
-        arena.first = object;
-        ++arena.count;
+        link(*object, arena);
         object->state.store(Object::live, std::memory_order_release);
         return object;
     }
 
     void remove(Object& object) {
-        std::unique_ptr<Body> body;
-        {
-            const std::lock_guard lock(_mutex);
-            if (object.previous)
-                object.previous->next = object.next;
-            else
-                object.arena->first = object.next;
-            if (object.next)
-                object.next->previous = object.previous;
-            --object.arena->count;
-            body = retire(object);
-        }
+        Bodies ended;
+        const std::lock_guard lock(_mutex);
+        unlink(object);
+        retire(object, ended, false);
     }
 
-    std::size_t remove_all(Arena& arena) {
-        std::vector<std::unique_ptr<Body>> bodies;
+    std::size_t remove_all(Arena& arena, bool at_once) {
+        Bodies ended;
         const std::lock_guard lock(_mutex);
         const std::size_t count = arena.count;
-        bodies.reserve(count);
-        for (Object* object = arena.first; object;) {
-            Object* next = object->next;
-            bodies.push_back(retire(*object));
-            object = next;
-        }
-        arena = Arena{};
+        retire_all(arena, ended, at_once);
         return count;
     }
 
+    void adopt(Object& object, Arena& arena) {
+        const std::lock_guard lock(_mutex);
+        unlink(object);
+        link(object, arena);
+    }
+
 private:
+    using Bodies = std::vector<std::unique_ptr<Body>>;
+
+    static void link(Object& object, Arena& arena) {
+        object.arena = &arena;
+        object.previous = nullptr;
+        object.next = arena.first;
+        if (arena.first)
+            arena.first->previous = &object;
+        arena.first = &object;
+        ++arena.count;
+    }
+
+    static void unlink(Object& object) {
+        if (object.previous)
+            object.previous->next = object.next;
+        else
+            object.arena->first = object.next;
+        if (object.next)
+            object.next->previous = object.previous;
+        --object.arena->count;
+    }
+
+    void retire_all(Arena& arena, Bodies& ended, bool at_once) {
+        std::vector<Object*> objects;
+        for (Object* object = arena.first; object; object = object->next)
+            objects.push_back(object);
+        if (at_once)
+            std::reverse(objects.begin(), objects.end());
+        arena = Arena{};
+        for (Object* object : objects)
+            retire(*object, ended, at_once);
+    }
+
     Object* take_slot() {
         if (_resting_count > RESTING_SLOTS) {
             Object* object = _oldest;
@@ -146,27 +166,30 @@ private:
         return &_chunk->objects[_chunk->used++];
     }
 
-    // Returns a body that may go now.
-    std::unique_ptr<Body> retire(Object& object) {
+    // Bodies that may go go to ended: their destructors run without the lock.
+    void retire(Object& object, Bodies& ended, bool at_once) {
         object.state.store(Object::dead, std::memory_order_release);
         Counters& counters = object.core->counters;
         --counters.live[static_cast<std::size_t>(object.kind)];
+        --counters.alive;
         std::unique_ptr<Body> body(object.body);
+        retire_all(body->contents, ended, at_once);
         object.body = nullptr;
         object.hdl = nullptr;
         object.next = nullptr;
         (_oldest ? _newest->next : _oldest) = &object;
         _newest = &object;
         ++_resting_count;
-        if (!object.core->options.strict)
-            return body;
+        if (!object.core->options.strict || at_once) {
+            ended.push_back(std::move(body));
+            return;
+        }
         body->poison();
         _resting_bodies.push_back(std::move(body));
         if (_resting_bodies.size() <= RESTING_BODIES)
-            return nullptr;
-        body = std::move(_resting_bodies.front());
+            return;
+        ended.push_back(std::move(_resting_bodies.front()));
         _resting_bodies.pop_front();
-        return body;
     }
 
     std::mutex _mutex;
@@ -206,6 +229,10 @@ Object* create_object(Core& core, Kind kind, const void* table, std::unique_ptr<
     Object* object = Store::the().add(core, kind, table, std::move(body), arena);
     ++core.counters.live[static_cast<std::size_t>(kind)];
     ++core.counters.created;
+    const std::size_t alive = ++core.counters.alive;
+    std::size_t peak = core.counters.peak.load();
+    while (peak < alive && !core.counters.peak.compare_exchange_weak(peak, alive)) {
+    }
     return object;
 }
 
@@ -213,8 +240,12 @@ void destroy_object(Object& object) {
     Store::the().remove(object);
 }
 
-std::size_t destroy_all(Arena& arena) {
-    return Store::the().remove_all(arena);
+std::size_t destroy_all(Arena& arena, bool at_once) {
+    return Store::the().remove_all(arena, at_once);
+}
+
+void adopt(Object& object, Arena& arena) {
+    Store::the().adopt(object, arena);
 }
 
 } // namespace host

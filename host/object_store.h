@@ -36,13 +36,25 @@ inline constexpr std::size_t KIND_COUNT = 10;
 // "CMPIString"
 const char* to_string(Kind kind);
 
-// The contents of an object.
-struct Body {
-    virtual ~Body() = default;
-    virtual void poison() {} // overwrites what a provider may still point to
+struct Object;
+
+// The objects that end together: those of a call, those in another object, or those that belong to
+// the caller.
+struct Arena {
+    Object* first = nullptr; // the youngest
+    std::size_t count = 0;
 };
 
-struct Arena;
+// The contents of an object.
+struct Body {
+    Body() = default;
+    Body(const Body&) noexcept {} // the objects in it stay with the original
+    Body& operator=(const Body&) noexcept { return *this; }
+    virtual ~Body() = default;
+    virtual void poison() {} // overwrites what a provider may still point to
+
+    Arena contents; // values that it handed out, elements that it holds: they go with it
+};
 
 struct Object {
     // What the provider sees as CMPIString, CMPIInstance and so on.
@@ -52,7 +64,7 @@ struct Object {
     enum State : std::uint32_t { never = 0, live = 0x4C495645, dead = 0xDEADDEAD };
     std::atomic<std::uint32_t> state;
     Kind kind;
-    bool parameter; // belongs to the call; a provider must not release it
+    bool parameter; // belongs to the call or to another object; a provider must not release it
     std::uint64_t serial;
     Core* core;
     Arena* arena;
@@ -61,17 +73,13 @@ struct Object {
     Body* body;
 };
 
-// The objects that end together: those of a call, or those that belong to the caller.
-struct Arena {
-    Object* first = nullptr;
-    std::size_t count = 0;
-};
-
 // Counts of live objects by kind.
 using Live_Counts = std::array<std::size_t, KIND_COUNT>;
 struct Counters {
     std::array<std::atomic<std::size_t>, KIND_COUNT> live{};
     std::atomic<std::size_t> created{0};
+    std::atomic<std::size_t> alive{0}; // of all kinds
+    std::atomic<std::size_t> peak{0};  // the most that were alive at once
     Live_Counts snapshot() const;
 };
 
@@ -84,8 +92,11 @@ Object* create_object(Core& core, Kind kind, const void* table, std::unique_ptr<
                       Arena& arena);
 // The object must be live.
 void destroy_object(Object& object);
-// Returns how many there were.
-std::size_t destroy_all(Arena& arena);
+// Returns how many there were. At once: oldest first, and without the rest that would make a late
+// use of their contents harmless.
+std::size_t destroy_all(Arena& arena, bool at_once = false);
+// Moves a live object into another arena.
+void adopt(Object& object, Arena& arena);
 
 } // namespace host
 

@@ -79,12 +79,28 @@ CMPIString* new_string(Core& core, std::string text) {
 
 namespace {
 
-CMPIArray* new_array(Core& core, const Value& value) {
+// Where the objects of a value are made: in a container, or for the call.
+struct Place {
+    Core& core;
+    Arena* container;
+
+    template <class B>
+    typename B::Cmpi* make(B body) const {
+        if (!container)
+            return host::make(core, std::move(body));
+        Object* object = create_object(core, B::kind, &B::table,
+                                       std::make_unique<B>(std::move(body)), *container);
+        object->parameter = true;
+        return reinterpret_cast<typename B::Cmpi*>(object);
+    }
+};
+
+CMPIArray* new_array(const Place& place, const Value& value) {
     ArrayBody body;
     body.element_type = value.element_type();
     body.elements = value.as_array();
     body.held.resize(body.elements.size());
-    return make(core, std::move(body));
+    return place.make(std::move(body));
 }
 
 void put_integer(CMPIValue& out, CMPIType type, const Value& value) {
@@ -125,9 +141,9 @@ void put_integer(CMPIValue& out, CMPIType type, const Value& value) {
     }
 }
 
-void put_value(Core& core, CMPIValue& out, const Value& value) {
+void put_value(const Place& place, CMPIValue& out, const Value& value) {
     if (value.is_array()) {
-        out.array = new_array(core, value);
+        out.array = new_array(place, value);
         return;
     }
     switch (value.type) {
@@ -141,45 +157,53 @@ void put_value(Core& core, CMPIValue& out, const Value& value) {
         out.real64 = value.as_real();
         return;
     case CMPI_string:
-        out.string = new_string(core, value.as_text());
+        out.string = place.make(StringBody(value.as_text()));
         return;
     case CMPI_dateTime: {
         DateTimeBody body;
         body.text = value.as_text();
-        out.dateTime = make(core, std::move(body));
+        out.dateTime = place.make(std::move(body));
         return;
     }
     case CMPI_ref:
-        out.ref = make(core, to_body(core, *value.as_reference()));
+        out.ref = place.make(to_body(place.core, *value.as_reference()));
         return;
     case CMPI_instance:
-        out.inst = make(core, to_body(core, *value.as_instance()));
+        out.inst = place.make(to_body(place.core, *value.as_instance()));
         return;
     default:
         put_integer(out, value.type, value);
     }
 }
 
-} // namespace
-
-CMPIData to_data(Core& core, const Value& value) {
+CMPIData data_of(const Place& place, const Value& value) {
     CMPIData data{};
     data.type = value.type;
     if (value.is_null())
         data.state = CMPI_nullValue;
     else
-        put_value(core, data.value, value);
+        put_value(place, data.value, value);
     return data;
 }
 
-CMPIData to_key_data(Core& core, const Value& value) {
+} // namespace
+
+CMPIData to_data(Core& core, const Value& value) {
+    return data_of({core, nullptr}, value);
+}
+
+CMPIData to_data_in(const void* container, const Value& value) {
+    return data_of({core_of(container), &contents_of(container)}, value);
+}
+
+CMPIData to_key_data_in(const void* container, const Value& value) {
     CMPIData data{};
     if (is_unsigned(value.type))
-        data = to_data(core, Value::unsigned_number(CMPI_uint64, value.as_unsigned()));
+        data = to_data_in(container, Value::unsigned_number(CMPI_uint64, value.as_unsigned()));
     else if (is_signed(value.type))
-        data = to_data(core, Value::signed_number(CMPI_sint64, value.as_signed()));
+        data = to_data_in(container, Value::signed_number(CMPI_sint64, value.as_signed()));
     else
-        data = to_data(core, value);
+        data = to_data_in(container, value);
     data.state = static_cast<CMPIValueState>(data.state | CMPI_keyValue);
     return data;
 }

@@ -140,6 +140,12 @@ enum class Owner {
 // The arena for a new object; outside any call that is a fault of the provider.
 Arena& arena_for(Core& core, Owner owner);
 
+// What an object contains goes with it, and is nobody's to release, as object managers have it that
+// hand out their own data.
+inline Arena& contents_of(const void* object) {
+    return static_cast<const Object*>(object)->body->contents;
+}
+
 template <class B>
 typename B::Cmpi* make(Core& core, B body, Owner owner = Owner::call) {
     Object* object = create_object(core, B::kind, &B::table, std::make_unique<B>(std::move(body)),
@@ -192,10 +198,11 @@ CMPIString* new_string(Core& core, std::string text);
 
 // ---- Between host values and CMPI data ----
 
-// A value with an object of the call for everything that is one. Keys are flagged as such, and
+// A value with an object for everything that is one. Keys are flagged as such, and
 // integers among them come in their widest form, as many object managers hand them over.
-CMPIData to_data(Core& core, const Value& value);
-CMPIData to_key_data(Core& core, const Value& value);
+CMPIData to_data(Core& core, const Value& value); // the provider's to release
+CMPIData to_data_in(const void* container, const Value& value);
+CMPIData to_key_data_in(const void* container, const Value& value);
 CMPIData missing_data(CMPIType type = CMPI_null);
 
 // Reads what a provider gave. Nothing for a type that cannot be given or an object that is not

@@ -7,7 +7,6 @@
 #include "classes/PG_RegisteredProfile.h"
 #include "classes/VLNMPCA_RegisteredProfile.h"
 
-#include <memory>
 #include <vector>
 
 namespace cimple {
@@ -15,11 +14,6 @@ namespace cimple {
 namespace {
 
 constexpr char PLATFORM_CLASS[] = "OMC_RegisteredBaseServerProfile";
-
-struct Class_Releaser {
-    void operator()(const Meta_Class* meta_class) const { unref(meta_class); }
-};
-using Class_Handle = std::unique_ptr<Meta_Class, Class_Releaser>;
 
 using Profiles = std::vector<Ref<VLNMPCA_RegisteredProfile>>;
 
@@ -61,7 +55,6 @@ Ref<PG_RegisteredProfile> base_server_profile() {
     return {};
 }
 
-// Shares the platform's profile instead of cloning it, since a clone would not count its class.
 Ref<VLNMPCA_BaseServerReferencedProfile>
 reference_to(const Ref<PG_RegisteredProfile>& base_server,
              const Ref<VLNMPCA_RegisteredProfile>& profile) {
@@ -81,17 +74,15 @@ void enumerate(ProviderAgent& agent, const Enum_Instances_Handler& handler) {
             return;
 }
 
-// The antecedent's class is unknown to the engine, which drops it from the path of a get. The
-// platform has one such profile: ours tells which reference is meant.
 Ref<VLNMPCA_BaseServerReferencedProfile> find(ProviderAgent& agent,
                                               const VLNMPCA_BaseServerReferencedProfile& model) {
-    if (!model.Dependent)
+    if (!model.Antecedent || !model.Dependent)
         return {};
     for (const auto& profile : registered_profiles(agent)) {
         if (!key_eq(profile.get(), model.Dependent))
             continue;
         const auto base_server = base_server_profile();
-        if (base_server && (!model.Antecedent || key_eq(base_server.get(), model.Antecedent)))
+        if (base_server && key_eq(base_server.get(), model.Antecedent))
             return reference_to(base_server, profile);
     }
     return {};

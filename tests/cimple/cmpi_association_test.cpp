@@ -48,7 +48,7 @@ TEST_F(Association_Test, NamesAreDerivedFromTheEnumeration) {
     EXPECT_EQ(broker.returned_paths[0]->string("Id"), "x");
     EXPECT_EQ(broker.returned_paths[1]->name_space, "root/far") << "a target's own namespace";
     EXPECT_EQ(broker.done, 0) << "the object manager closes the result";
-    EXPECT_EQ(broker.live_paths_and_instances(), 0);
+    EXPECT_EQ(broker.live(), 0);
 
     names(base_path("y", 2));
     ASSERT_EQ(broker.returned_paths.size(), 1u);
@@ -113,6 +113,15 @@ TEST_F(Association_Test, ReferencesToTheSource) {
     ASSERT_EQ(broker.returned_instances.size(), 2u);
     EXPECT_FALSE(broker.returned_instances[0]->find("Weight"));
     EXPECT_TRUE(broker.returned_instances[0]->find("Right")) << "a key comes with any list";
+
+    // What is listed keeps its null; what is not listed is null.
+    static_cast<Test_Link*>(script.instances[0].get())->Weight.null = 1;
+    broker.clear_results();
+    const char* weight[] = {"Weight", nullptr};
+    mi->ft->references(mi, context, result, leaf_path("a"), 0, 0, weight);
+    ASSERT_EQ(broker.returned_instances.size(), 2u);
+    EXPECT_FALSE(broker.returned_instances[0]->find("Weight"));
+    EXPECT_TRUE(broker.returned_instances[1]->find("Weight"));
 
     mi->ft->referenceNames(mi, context, result, leaf_path("a"), 0, 0);
     ASSERT_EQ(broker.returned_paths.size(), 2u);

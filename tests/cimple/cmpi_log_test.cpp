@@ -100,6 +100,14 @@ TEST_F(Log_Death_Test, CallsAreTraced) {
         if (mi->ft->associatorNames(mi, context, result, path, 0, 0, 0, 0).rc != 0 ||
             mi->ft->associators(mi, context, result, path, 0, 0, 0, 0, nullptr).rc != 0)
             std::_Exit(1);
+        auto* link = create_null<Test_Link>();
+        link->Left = create_null<Test_Root>();
+        link->Right = make_base("gone", 1);
+        script.instances = {link};
+        script.status = {{OP_ENUM_ASSOCIATOR_NAMES, ENUM_ASSOCIATOR_NAMES_UNSUPPORTED},
+                         {OP_ENUM_ASSOCIATORS, ENUM_ASSOCIATORS_UNSUPPORTED}};
+        broker.upcall_status = CMPI_RC_ERR_NOT_FOUND;
+        mi->ft->associators(mi, context, result, broker.path("", "Test_Root"), 0, 0, 0, 0, nullptr);
         auto* methods = method_mi();
         methods->ft->invokeMethod(methods, context, result, path, "Run", nullptr, nullptr);
         methods->ft->cleanup(methods, context, true);
@@ -108,6 +116,7 @@ TEST_F(Log_Death_Test, CallsAreTraced) {
              "enter: cimple_cmpi_adapter()\n",
              "return: associatorNames(): CMPI_RC_ERR_INVALID_CLASS\n",
              "return: associators(): CMPI_RC_OK\n",
+             "an associator of class Test_Base was not found: 6\n",
              "return: invokeMethod(): CMPI_RC_ERR_FAILED MetaClass not found\n",
              "return: cleanup(): CMPI_RC_OK cleanup unload\n",
              "enter: ~CMPI_Adapter()\n",

@@ -200,7 +200,7 @@ protected:
     Cimom_Test() { Thread_Context::push(&thread); }
     ~Cimom_Test() override {
         Thread_Context::pop();
-        EXPECT_EQ(broker.live_paths_and_instances(), 0) << "a long thread leaves nothing behind";
+        EXPECT_EQ(broker.live(), 0) << "a long thread leaves nothing behind";
     }
     CMPI_Thread_Context thread{&broker.broker, context, nullptr};
     const Ref<Test_Base> model{make_base("m", 4)};
@@ -246,6 +246,16 @@ TEST_F(Cimom_Test, EnumerationConvertsToTheModelsClass) {
     cimom::enum_instances("root/x", model.get(), enumerator);
     enumerator.next();
     EXPECT_FALSE(enumerator.more()) << "an element that fails ends it";
+    broker.failures.clear();
+    {
+        CMPI_Thread_Context call(&broker.broker, context, nullptr);
+        Thread_Context::push(&call);
+        ASSERT_EQ(cimom::enum_instances("root/x", model.get(), enumerator), 0);
+        Thread_Context::pop();
+    }
+    EXPECT_EQ(broker.live(), 0) << "it went with the call";
+    enumerator.next();
+    EXPECT_FALSE(enumerator.more());
     broker.upcall_status = CMPI_RC_ERR_INVALID_CLASS;
     EXPECT_EQ(cimom::enum_instances("root/x", model.get(), enumerator), -1);
     EXPECT_EQ(cimom::enum_instances("root/x", nullptr, enumerator), -1);
@@ -291,6 +301,29 @@ TEST_F(Cimom_Test, MethodsOfOthers) {
     broker.upcall_status = CMPI_RC_ERR_FAILED;
     EXPECT_EQ(cimom::invoke_method("root/z", service.get(), method), -1);
     EXPECT_EQ(cimom::invoke_method(nullptr, service.get(), method), -1);
+
+    // A path that cannot be made, for a static method as for another, and a thread without a
+    // broker or context.
+    broker.upcall_status = CMPI_RC_OK;
+    broker.failures = {{"newObjectPath", 1}};
+    EXPECT_EQ(cimom::invoke_method("root/z", service.get(), method), -1);
+    const Meta_Method& run = Test_Service_Run_method::static_meta_class;
+    const Meta_Method static_run{{{{0}, run.flags | FLAG_STATIC, run.name, nullptr, 0},
+                                  run.meta_features,
+                                  run.num_meta_features,
+                                  run.size},
+                                 run.return_type};
+    method->__meta_class = as_class(&static_run);
+    broker.failures = {{"newObjectPath", 1}};
+    EXPECT_EQ(cimom::invoke_method("root/z", service.get(), method), -1);
+    CMPI_Thread_Context no_broker(nullptr, context, nullptr);
+    CMPI_Thread_Context no_context(&broker.broker, nullptr, nullptr);
+    for (CMPI_Thread_Context* lacking : {&no_broker, &no_context}) {
+        Thread_Context::push(lacking);
+        EXPECT_EQ(cimom::invoke_method("root/z", service.get(), method), -1);
+        Thread_Context::pop();
+    }
+    EXPECT_EQ(broker.upcalls.size(), 2u);
 }
 
 TEST_F(Cimom_Test, UserName) {

@@ -96,14 +96,15 @@ const void* table_for(CMPIType type) {
     }
 }
 
-CMPIData load(Broker& broker, const Value& value) {
+// What a container hands out goes with it, and is not the engine's to release.
+CMPIData load(Broker& broker, const Value& value, bool contained = true) {
     CMPIData loaded{};
     loaded.type = value.type;
     loaded.state = value.state;
     loaded.value = value.scalar;
     if (value.object)
-        loaded.value.inst =
-            reinterpret_cast<CMPIInstance*>(broker.make(table_for(value.type), value.object));
+        loaded.value.inst = reinterpret_cast<CMPIInstance*>(
+            broker.make(table_for(value.type), value.object, contained));
     return loaded;
 }
 
@@ -272,6 +273,8 @@ CMPIArrayFT array_table = {
         if (owner(a).fails("setElementAt") || index >= data(a).elements.size())
             return FAILED;
         data(a).elements[index] = store(value, type);
+        if (value && is_object(type))
+            owner(a).keep(handle(static_cast<void*>(value->inst)));
         return OK;
     },
 };
@@ -433,7 +436,7 @@ CMPIBrokerFT broker_table = {
         auto arguments = std::make_shared<Data>(data(in));
         self(b).upcall_instances.push_back(arguments);
         data(out).members = self(b).method_outputs;
-        return load(self(b), self(b).method_result);
+        return load(self(b), self(b).method_result, false);
     },
     nullptr,
     nullptr,
@@ -505,11 +508,9 @@ void Broker::free(Handle* handle) {
     _live--;
 }
 
-int Broker::live_paths_and_instances() const {
-    return static_cast<int>(
-        std::count_if(_handles.begin(), _handles.end(), [](const std::unique_ptr<Handle>& h) {
-            return !h->parameter && (h->table == &path_table || h->table == &instance_table);
-        }));
+void Broker::keep(Handle* handle) {
+    handle->parameter = true;
+    _live--;
 }
 
 void Broker::end_call() {

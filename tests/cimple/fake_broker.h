@@ -70,7 +70,6 @@ public:
 
     // Objects that the engine caused and has not released, and the end of a call, which frees them.
     int live() const { return _live; }
-    int live_paths_and_instances() const;
     int released_parameters = 0; // faults of the engine
     void end_call();
 
@@ -97,6 +96,7 @@ public:
     struct Handle;
     Handle* make(const void* table, Data_Ref data, bool parameter = false);
     void free(Handle* handle);
+    void keep(Handle* handle); // an array takes its element over
 
 private:
     int _live = 0;

@@ -155,8 +155,11 @@ void copy_argument(const CMPIArgs* in, CMPIArgs* out, const char* from, const ch
 CMPIUint32 count_of(const CMPIContext* context, const std::string& name_space,
                     const std::string& class_name) {
     CMPIStatus status = kit::OK;
-    CMPIEnumeration* all = broker->bft->enumerateInstances(
-        broker, context, kit::new_path(broker, name_space, class_name.c_str()), nullptr, &status);
+    CMPIObjectPath* path = kit::new_path(broker, name_space, class_name.c_str());
+    CMPIEnumeration* all = broker->bft->enumerateInstances(broker, context, path, nullptr, &status);
+    path->ft->release(path);
+    if (status.msg)
+        status.msg->ft->release(status.msg);
     if (status.rc != CMPI_RC_OK)
         return 1000 + static_cast<CMPIUint32>(status.rc);
     CMPIUint32 count = 0;
@@ -164,6 +167,7 @@ CMPIUint32 count_of(const CMPIContext* context, const std::string& name_space,
         const CMPIData data = all->ft->getNext(all, nullptr);
         count += data.type == CMPI_instance;
     }
+    all->ft->release(all);
     return count;
 }
 

@@ -14,6 +14,7 @@ CMPIString* kept;             // from an earlier call
 struct Wrong {
     const CMPIContext* context;
     const CMPIResult* result;
+    const CMPIArgs* in;
     CMPIArgs* out;
 };
 
@@ -147,6 +148,12 @@ CMPIrc release_parameter(const Wrong& wrong) {
     return wrong.context->ft->release(const_cast<CMPIContext*>(wrong.context)).rc;
 }
 
+// What an object contains goes with it.
+CMPIrc release_contents(const Wrong& wrong) {
+    const CMPIData how = wrong.in->ft->getArg(wrong.in, "How", nullptr);
+    return how.value.string->ft->release(how.value.string).rc;
+}
+
 CMPIrc stale_element(const Wrong&) {
     CMPIArray* array = broker->eft->newArray(broker, 1, CMPI_string, nullptr);
     CMPIString* string = new_string("x");
@@ -210,6 +217,16 @@ CMPIrc undetached_thread(const Wrong& wrong) {
     return CMPI_RC_OK;
 }
 
+CMPIrc left_at_detach(const Wrong& wrong) {
+    CMPIContext* own = broker->bft->prepareAttachThread(broker, wrong.context);
+    std::thread([own] {
+        broker->bft->attachThread(broker, own);
+        new_string("x");
+        broker->bft->detachThread(broker, own);
+    }).join();
+    return CMPI_RC_OK;
+}
+
 CMPIrc attached_twice(const Wrong& wrong) {
     return broker->bft->attachThread(broker, wrong.context).rc;
 }
@@ -240,6 +257,7 @@ constexpr Row ROWS[] = {
     {"overwritten object", overwritten_object},
     {"other kind", other_kind},
     {"release of a parameter", release_parameter},
+    {"release of contents", release_contents},
     {"stale element", stale_element},
     {"index out of range", index_out_of_range},
     {"null text", null_text},
@@ -251,6 +269,7 @@ constexpr Row ROWS[] = {
     {"output of other type", output_of_other_type},
     {"unattached thread", unattached_thread},
     {"undetached thread", undetached_thread},
+    {"left at detach", left_at_detach},
     {"attached twice", attached_twice},
 };
 
@@ -264,7 +283,7 @@ CMPIStatus invoke(CMPIMethodMI*, const CMPIContext* context, const CMPIResult* r
     enumeration_mode = how;
     for (const Row& row : ROWS)
         if (how == row.how) {
-            const CMPIrc rc = row.act({context, result, out});
+            const CMPIrc rc = row.act({context, result, in, out});
             return how.starts_with("result")
                        ? kit::OK
                        : kit::answer_number(result, static_cast<CMPIUint32>(rc));

@@ -90,6 +90,23 @@ TEST(Enumeration, APropertyListNarrowsWhatIsSet) {
     EXPECT_EQ(text_of(reply.value[0], "Manufacturer"), "-");
 }
 
+// What is made while answering is given back as it is handed over.
+TEST(Enumeration, ALargeAnswerHoldsNoMoreObjectsThanASmallOne) {
+    Road road({.scenario = R"({"include": ")" VLN_SCENARIOS
+                           R"(/parts/cna.json", "cards": [{"use": "cna", "functions": [
+        {"use": "nic"}, {"use": "fcoe", "targets": {"luns": 200,
+                                                    "wwpn": "50:25:64:C0:00:00:00:01"}}]}]})"});
+    EXPECT_EQ(road.enumerate("VLNMPCA_StorageVolume").size(), 200u);
+    host::Manager& manager = road.manager();
+    manager.restart_peak();
+    EXPECT_EQ(manager.enumerate_names("VLNMPCA_StorageVolume").value.size(), 200u);
+    EXPECT_EQ(road.enumerate("VLNMPCA_StorageVolume").size(), 200u);
+    const auto initiators = road.enumerate("VLNMPCA_SCSIProtocolEndpoint");
+    ASSERT_FALSE(initiators.empty());
+    EXPECT_GE(manager.associators(initiators[0].path).value.size(), 200u);
+    EXPECT_LT(manager.statistics().objects_peak, 50u);
+}
+
 TEST(Enumeration, PatternClassesRefuseChanges) {
     Road road;
     const auto cards = road.enumerate("VLNMPCA_Card");

@@ -36,13 +36,15 @@ std::vector<std::string> system_names(Road& road) {
 }
 
 TEST(Platform, ItsComputerSystemIsTheOneEverythingHangsOn) {
-    Road road({.platform = PLATFORM});
-    const auto names = system_names(road);
-    EXPECT_GT(names.size(), 10u);
-    for (const std::string& name : names)
-        EXPECT_EQ(name, "rack7-node3");
-    for (const host::Instance& port : road.enumerate("VLNMPCA_EthernetPort"))
-        EXPECT_EQ(text_of(port, "SystemCreationClassName"), "IBMSD_ComputerSystem");
+    for (const bool elements_marked_null : {false, true}) {
+        Road road({.platform = PLATFORM, .elements_marked_null = elements_marked_null});
+        const auto names = system_names(road);
+        EXPECT_GT(names.size(), 10u);
+        for (const std::string& name : names)
+            EXPECT_EQ(name, "rack7-node3");
+        for (const host::Instance& port : road.enumerate("VLNMPCA_EthernetPort"))
+            EXPECT_EQ(text_of(port, "SystemCreationClassName"), "IBMSD_ComputerSystem");
+    }
 }
 
 TEST(Platform, ItsChassisHoldsTheCard) {

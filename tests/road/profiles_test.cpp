@@ -73,6 +73,20 @@ TEST(Profiles, ThePlatformsBaseServerIsAskedForAtEachCall) {
     host::set(nobody.keys, "InstanceID", host::Value::text("VLN:Fan"));
     host::set(other.keys, "Dependent", host::Value::reference(nobody));
     EXPECT_EQ(road.manager().get(other).status.rc, CMPI_RC_ERR_NOT_FOUND);
+    const host::ObjectPath server = *references[0].property("Antecedent")->as_reference();
+    host::ObjectPath fan = server;
+    host::set(fan.keys, "InstanceID", host::Value::text("OMC:Fan"));
+    other = references[0].path;
+    host::set(other.keys, "Antecedent", host::Value::reference(fan));
+    EXPECT_EQ(road.manager().get(other).status.rc, CMPI_RC_ERR_NOT_FOUND);
+
+    // From the platform's profile, which is of no class of ours: the way that consoles walk.
+    const host::Association_Filter via{"VLNMPCA_BaseServerReferencedProfile", "", "", ""};
+    EXPECT_EQ(road.manager().associators(server, via).value.size(), profiles.size());
+    EXPECT_EQ(road.manager().references(server).value.size(), profiles.size());
+    EXPECT_TRUE(road.manager().associator_names(fan, via).value.empty());
+    EXPECT_TRUE(
+        road.manager().associator_names(server, {via.via, "", "Dependent", ""}).value.empty());
     const auto servers = road.manager().associator_names(
         profiles[0].path, {"VLNMPCA_BaseServerReferencedProfile", "", "", ""});
     ASSERT_EQ(servers.value.size(), 1u);

@@ -58,6 +58,7 @@ Road::Road(const Setup& setup) : _root(fresh_folder()) {
         std::ofstream(_root / "etc/vorlan_mpca_provider.dmp") << "2,5,1\n"
                                                               << _root.native() << TRACE_FILE;
     host::Options options;
+    options.elements_marked_null = setup.elements_marked_null;
     if (!setup.platform.empty()) {
         options.platform_path = _root / "platform.json";
         std::ofstream(options.platform_path) << setup.platform;

@@ -22,6 +22,7 @@ struct Setup {
     std::string platform = {};                  // a JSON text, "" for none
     bool libraries = true;                      // false: the host has none of the closed libraries
     bool log = false;                           // level 5 to the provider's log file
+    bool elements_marked_null = false;          // as host::Options has it
 };
 
 class Road {

@@ -54,7 +54,8 @@ bool VLN_Common::IsReadOnlyFS() {
     VLN_LOG(VLN_DBG, " Inside IsReadOnlyFS()");
     if (!read_only_test.done) {
         struct statvfs status {};
-        if (read_only_test.query.load()("/", &status) == 0) {
+        const std::string root = std::string(host_root()) + "/";
+        if (read_only_test.query.load()(root.c_str(), &status) == 0) {
             read_only_test.read_only = (status.f_flag & ST_RDONLY) != 0;
             read_only_test.done = true;
         }

@@ -7,6 +7,7 @@
 #include <cstdio>
 #include <exception>
 #include <fcntl.h>
+#include <mutex>
 #include <semaphore.h>
 #include <unistd.h>
 
@@ -20,6 +21,9 @@ namespace {
 // finds that value is the first and initialises. The second, s_initialised, is only created.
 constinit std::atomic<sem_t*> s_initialising{nullptr};
 constinit std::atomic<sem_t*> s_initialised{nullptr};
+
+// Guards the step from "nobody in this process has the semaphore" to "somebody has".
+constinit std::mutex s_openMutex;
 
 constexpr int INITIALISER = 2;
 constexpr mode_t SEMAPHORE_MODE = 0644;
@@ -35,6 +39,10 @@ struct Semaphore_Name {
 
 Semaphore_Name initialisingName() {
     return Semaphore_Name("/VLN_AX_INIT_LIB_");
+}
+
+Semaphore_Name initialisedName() {
+    return Semaphore_Name("/VLN_AX_INIT_LIB_DONE_");
 }
 
 sem_t* createSemaphore(const Semaphore_Name& name, unsigned value) {
@@ -55,16 +63,36 @@ int valueOf(sem_t* semaphore) {
     return value;
 }
 
+void unlinkNames() {
+    sem_unlink(initialisingName().text);
+    sem_unlink(initialisedName().text);
+}
+
+// Both semaphores of the handshake; the second may have failed to open.
 void closeAndUnlink(sem_t* semaphore) {
     sem_close(semaphore);
-    sem_unlink(initialisingName().text);
+    if (sem_t* done = s_initialised.exchange(nullptr))
+        sem_close(done);
+    unlinkNames();
+}
+
+// Names that are there while nobody in this process has the semaphore were left by an earlier
+// process with the same identifier. Their value tells nothing, and their layout may be that of the
+// other word size.
+sem_t* openSemaphore(const Semaphore_Name& name) {
+    const std::lock_guard lock(s_openMutex);
+    if (!s_initialising)
+        unlinkNames();
+    sem_t* semaphore = createSemaphore(name, INITIALISER);
+    s_initialising = semaphore;
+    return semaphore;
 }
 
 // Throws when the library refuses.
 void initialiseLibrary(sem_t* semaphore) {
     VLN_LOG(VLN_DBG, "Aquired Semaphore.. Running AX_InitLib %s ", initialisingName().text);
-    // Nothing waits on the second semaphore, and nothing posts, closes or unlinks it.
-    const Semaphore_Name doneName("/VLN_AX_INIT_LIB_DONE_");
+    // Nothing waits on the second semaphore, and nothing posts it.
+    const Semaphore_Name doneName = initialisedName();
     s_initialised = createSemaphore(doneName, 0);
     VLN_LOG(VLN_DBG, "Aquired Completed Semaphore.. Running AX_InitLib %s", doneName.text);
     const auto status = static_cast<sint32>(AX_InitLib());
@@ -87,8 +115,7 @@ VLN_MethodWrapper::VLN_MethodWrapper() {
     VLN_LOG(VLN_DBG, "VLN_MethodWrapper::Constructor");
     VLN_LOG(VLN_DBG, "Setting Up for FIFO.. ");
     const Semaphore_Name name = initialisingName();
-    sem_t* semaphore = createSemaphore(name, INITIALISER);
-    s_initialising = semaphore;
+    sem_t* semaphore = openSemaphore(name);
     // Without a semaphore the library is left as it is, and nobody is told: the calls will fail.
     if (semaphore) {
         const int value = valueOf(semaphore);
@@ -103,6 +130,11 @@ VLN_MethodWrapper::VLN_MethodWrapper() {
         }
     }
     VLN_LOG(VLN_DBG, "AX Library initialized");
+}
+
+void VLN_MethodWrapper::removeSemaphores() noexcept {
+    if (s_initialising)
+        unlinkNames();
 }
 
 VLN_MethodWrapper::~VLN_MethodWrapper() {

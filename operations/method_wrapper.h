@@ -26,11 +26,14 @@ public:
     static constexpr std::size_t TARGET_OS_SIZE = 41;
 
     // The object brackets the lifetime of the library; the ProviderAgent owns the only one. The
-    // constructor initialises the library once in this process, over a POSIX named semaphore, and
+    // constructor initialises the library once in this process, over POSIX named semaphores whose
+    // names go with the last object, and
     // throws std::exception when the library refuses. It waits, without end, for an
     // initialisation that is under way on another thread.
     VLN_MethodWrapper();
     ~VLN_MethodWrapper();
+    // At the end of the process: the names go, whoever may still have the semaphores open.
+    static void removeSemaphores() noexcept;
     VLN_MethodWrapper(const VLN_MethodWrapper&) = delete;
     VLN_MethodWrapper& operator=(const VLN_MethodWrapper&) = delete;
 

@@ -66,7 +66,7 @@ TEST_F(Handshake, InitialiserRunsTheLibraryOnce) {
                                                              "5:AX Library uninitialzed"}));
     EXPECT_EQ(calls, 1);
     EXPECT_FALSE(exists(m_first));
-    EXPECT_TRUE(exists(m_second)); // stays, on purpose
+    EXPECT_FALSE(exists(m_second));
 }
 
 TEST_F(Handshake, RefusalThrowsAndALaterTryStartsAfresh) {
@@ -114,6 +114,20 @@ TEST_F(Handshake, SecondCallerWaitsForTheFirst) {
     // Both ended, one closed the semaphore.
     EXPECT_EQ(log_capture::count(lines, "5:AX Library uninitialzed"), 2);
     EXPECT_FALSE(exists(m_first));
+}
+
+// An earlier process with this identifier has ended suddenly, or was of the other word size.
+TEST_F(Handshake, NamesLeftByAnEarlierProcessAreNotUsed) {
+    int calls = 0;
+    fake.initLib = [&] {
+        ++calls;
+        return AX_STATUS_OK;
+    };
+    sem_close(sem_open(m_first.c_str(), O_CREAT, 0644, 0)); // whoever waits for it waits for ever
+    sem_close(sem_open(m_second.c_str(), O_CREAT, 0644, 0));
+    { VLN_MethodWrapper wrapper; }
+    EXPECT_EQ(calls, 1);
+    EXPECT_FALSE(exists(m_first) || exists(m_second));
 }
 
 // Without a semaphore nothing is initialised and nobody is told.

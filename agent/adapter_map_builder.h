@@ -11,9 +11,8 @@
 #include "agent/associations.h"
 #include "agent/class_groups.h"
 #include "agent/map_status.h"
+#include "agent/platform/platform_objects.h"
 #include "agent/provider_agent.h"
-#include "classes/CIM_Chassis.h"
-#include "classes/CIM_ComputerSystem.h"
 #include "classes/VLNMPCA_Card.h"
 #include "classes/VLNMPCA_EthernetPort.h"
 #include "classes/VLNMPCA_LANEndpoint.h"
@@ -31,7 +30,8 @@ class VLN_IPInterfaceConfig;
 
 class Adapter_Map_Builder {
 public:
-    explicit Adapter_Map_Builder(ProviderAgent& agent) : _agent(agent) {}
+    Adapter_Map_Builder(ProviderAgent& agent, const Platform_Objects& platform)
+        : _agent(agent), _platform(platform) {}
 
     // The whole pass. Exceptions of the card loop end that loop only.
     uint32 run();
@@ -73,7 +73,6 @@ private:
     // platform/platform_maps.cpp
     uint32 createComputerSystem();
     Ref<CIM_ComputerSystem> ownComputerSystem() const;
-    void findChassis();
     uint32 createChassis();
     Ref<CIM_Chassis> ownChassis() const;
 
@@ -130,8 +129,8 @@ private:
     void joinIPEndpoint(const IP_Interface& interface);
 
     ProviderAgent& _agent;
+    const Platform_Objects& _platform;        // found by the up-calls
     CIM_ComputerSystem* _system = nullptr;    // in its store
-    Ref<CIM_Chassis> _platform_chassis;       // found by the up-call, not yet in its store
     CIM_Chassis* _chassis = nullptr;          // in its store
     std::vector<VLNMPCA_Card*> _untied_cards; // in their store; see createNICCard
 };

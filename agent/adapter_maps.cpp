@@ -9,8 +9,8 @@
 
 namespace cimple {
 
-uint32 ProviderAgent::updateAdapterMaps() {
-    return Adapter_Map_Builder(*this).run();
+uint32 ProviderAgent::updateAdapterMaps(const Platform_Objects& platform) {
+    return Adapter_Map_Builder(*this, platform).run();
 }
 
 uint32 Adapter_Map_Builder::run() {
@@ -20,7 +20,6 @@ uint32 Adapter_Map_Builder::run() {
         VLN_LOG(VLN_CRIT, "Could not create the Computer System Instance");
         return END_PASS;
     }
-    findChassis();
     registerBaseProfiles();
     if (const uint32 status = makeGroups(Group_Place::PLATFORM))
         return status;

@@ -4,29 +4,36 @@ namespace cimple {
 
 namespace {
 
-void pass_adapter_data(ProviderAgent& agent) {
+bool pass_adapter_data(const Visit& visit) {
+    ProviderAgent& agent = visit.agent;
     Auto_Mutex lock(agent.m_AdapterDataReadyMutex);
-    if (agent.m_bIsAdapterDataReady)
-        return;
+    if (agent.m_bIsAdapterDataReady || ProviderAgent::isRefreshThread())
+        return true;
     VLN_LOG(VLN_DBG, "PERF: Waiting for m_AdapterDataReadyMutex");
-    agent.m_AdapterDataReadyCond.wait(agent.m_AdapterDataReadyMutex);
+    if (!visit.was_cut())
+        agent.m_AdapterDataReadyCond.wait(agent.m_AdapterDataReadyMutex);
     VLN_LOG(VLN_DBG, "PERF: Woken up from wait for m_AdapterDataReadyMutex");
+    return agent.m_bIsAdapterDataReady || !visit.was_cut();
 }
 
-void pass_adapter_maps(ProviderAgent& agent) {
+bool pass_adapter_maps(const Visit& visit) {
+    ProviderAgent& agent = visit.agent;
     Auto_Mutex lock(agent.m_AdapterMapsReadyMutex);
-    if (agent.m_bIsAdapterMapsReady)
-        return;
+    if (agent.m_bIsAdapterMapsReady || ProviderAgent::isRefreshThread())
+        return true;
     VLN_LOG(VLN_DBG, "PERF: Waiting for m_AdapterMapsReadyMutex");
-    agent.m_AdapterMapsReadyCond.wait(agent.m_AdapterMapsReadyMutex);
+    if (!visit.was_cut())
+        agent.m_AdapterMapsReadyCond.wait(agent.m_AdapterMapsReadyMutex);
     VLN_LOG(VLN_DBG, "PERF: Woken up from wait for m_AdapterMapsReadyMutex");
+    return agent.m_bIsAdapterMapsReady || !visit.was_cut();
 }
 
 Mutex& data_mutex_behind_gates(ProviderAgent& agent) {
-    agent.BuildCimpleInfo();
-    pass_adapter_data(agent);
-    pass_adapter_maps(agent);
-    return agent.m_DataMutex;
+    for (;;) {
+        const Visit visit(agent);
+        if (pass_adapter_data(visit) && pass_adapter_maps(visit))
+            return agent.m_DataMutex;
+    }
 }
 
 } // namespace
@@ -34,7 +41,7 @@ Mutex& data_mutex_behind_gates(ProviderAgent& agent) {
 void request_stale_san_maps(ProviderAgent& agent) {
     Auto_Mutex lock(agent.m_SANMapsReadyMutex);
     if (!agent.m_bIsSANMapsReady)
-        agent.m_bSANRefreshRequested = true;
+        agent.m_bSANMapsAsked = true;
 }
 
 Operation_Prologue::Operation_Prologue(ProviderAgent& agent)

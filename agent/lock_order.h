@@ -14,6 +14,7 @@ enum Lock_Rank : int {
     RANK_DATA = 60,
     RANK_UPDATE = 65, // recursive, one for each active class
     RANK_DYNAMIC_PORT_STATUS = 70,
+    RANK_AGENT_THREAD = 80, // what is known of a background thread
 };
 
 } // namespace cimple

@@ -35,6 +35,7 @@ namespace flag {
 
 struct m_bAdapterRefreshRequested;
 struct m_bSANRefreshRequested;
+struct m_bSANMapsAsked;
 struct m_bLibraryLoaded;
 struct m_bIsAdapterMapsReady;
 struct m_bIsSANMapsReady;

@@ -6,12 +6,15 @@
 #include "agent/signal_handler.h"
 #include "agent/version.h"
 #include "cimple/guard.h"
+#include "cimple/thread_context.h"
 #include "device/library/bound_functions.h"
 #include "device/library/runtime_loader.h"
+#include "device/scan_end.h"
 #include "foundation/common.h"
 #include "foundation/host_paths.h"
 
 #include <atomic>
+#include <cstdlib>
 
 #include <unistd.h>
 
@@ -23,10 +26,22 @@ namespace {
 constinit std::atomic<ProviderAgent*> s_Agent{nullptr};
 // Loaded class providers. Written under s_AgentMutex; the log lines read it outside.
 constinit std::atomic<sint32> s_AgentRefCount{0};
-// Classes whose load failed and which have not been unloaded. Guarded by s_AgentMutex.
+// Loads that failed and have not been undone. Guarded by s_AgentMutex.
 constinit sint32 s_FailedLoads = 0;
 
 constinit Process_Wide<Mutex> s_AgentMutex(false, RANK_AGENT, "s_AgentMutex");
+
+// Registered anew with each agent, behind the libraries that it has opened: what a process has
+// started last ends first, so that the threads are gone before the libraries are.
+void registerExit() {
+    std::atexit([] { ProviderAgent::endThreadsAtExit(); });
+}
+
+// The provider whose call this thread is in.
+const void* presentProvider() {
+    const Thread_Context* context = Thread_Context::top();
+    return context ? context->provider() : nullptr;
+}
 
 } // namespace
 
@@ -41,6 +56,7 @@ ProviderAgent* ProviderAgent::instanceLocked() {
     if (!agent) {
         agent = new ProviderAgent;
         s_Agent.store(agent, std::memory_order_release);
+        registerExit();
     }
     return agent;
 }
@@ -53,51 +69,50 @@ ProviderAgent* ProviderAgent::instance() {
     return instanceLocked();
 }
 
-bool ProviderAgent::acquire() {
+bool ProviderAgent::acquire(Class_Loads& loads) {
     const No_Cancellation whole_agent;
     Auto_Mutex lock(*s_AgentMutex);
     ProviderAgent* agent = instanceLocked();
     if (!agent->m_bLibraryLoaded) {
         ++s_FailedLoads;
+        ++loads.failures;
         return false;
     }
     VLN_LOG(VLN_DBG, "ProviderAgent::addRef[%d]", s_AgentRefCount.load());
     ++s_AgentRefCount;
+    ++loads.references;
     return true;
 }
 
-void ProviderAgent::release() {
+// The agent, which what the record holds keeps alive; null if it holds nothing.
+ProviderAgent* ProviderAgent::holder(const Class_Loads& loads) {
+    Auto_Mutex lock(*s_AgentMutex);
+    return loads.references || loads.failures ? current() : nullptr;
+}
+
+void ProviderAgent::release(Class_Loads& loads) {
     const No_Cancellation whole_agent;
-    ProviderAgent* agent = current();
+    ProviderAgent* agent = holder(loads);
     if (!agent)
         return;
-    if (agent->m_bLibraryLoaded) {
-        agent->releaseRef();
-        return;
-    }
-    // The half-built agent has no references, but it may have a refresh thread, and the library may
-    // be unmapped once its last class is gone.
+    agent->endThreadsOf(presentProvider());
     Auto_Mutex lock(*s_AgentMutex);
-    if (--s_FailedLoads == 0)
+    if (loads.references) {
+        VLN_LOG(VLN_DBG, "ProviderAgent::releaseRef[%d]", s_AgentRefCount.load());
+        --loads.references;
+        --s_AgentRefCount;
+    } else if (loads.failures) {
+        // The half-built agent has no references, but it may have had a refresh thread.
+        --loads.failures;
+        --s_FailedLoads;
+    }
+    if (s_AgentRefCount == 0 && s_FailedLoads == 0)
         destroyLocked();
 }
 
 void ProviderAgent::destroyLocked() {
     delete s_Agent.load(std::memory_order_relaxed);
     s_Agent.store(nullptr, std::memory_order_release);
-}
-
-void ProviderAgent::addRef() {
-    VLN_LOG(VLN_DBG, "ProviderAgent::addRef[%d]", s_AgentRefCount.load());
-    Auto_Mutex lock(*s_AgentMutex);
-    ++s_AgentRefCount;
-}
-
-void ProviderAgent::releaseRef() {
-    VLN_LOG(VLN_DBG, "ProviderAgent::releaseRef[%d]", s_AgentRefCount.load());
-    Auto_Mutex lock(*s_AgentMutex);
-    if (--s_AgentRefCount == 0)
-        destroyLocked();
 }
 
 // ---- Construction ----
@@ -108,7 +123,7 @@ ProviderAgent::ProviderAgent()
       m_AdapterMapsReadyMutex(false, RANK_ADAPTER_MAPS_READY, "m_AdapterMapsReadyMutex"),
       m_SANMapsReadyMutex(false, RANK_SAN_MAPS_READY, "m_SANMapsReadyMutex"),
       m_DynamicPortStatusMutex(false, RANK_DYNAMIC_PORT_STATUS, "m_DynamicPortStatusMutex"),
-      m_DataFetchMutex(false, RANK_DATA_FETCH, "m_DataFetchMutex") {
+      m_DataFetchMutex(false, RANK_DATA_FETCH, "m_DataFetchMutex"), m_Process(getpid()) {
     const bool complete = run_guarded([this] {
         m_ConfigFile.load(host_path(Host_File::TUNING).c_str());
         prepareSignalAction();
@@ -167,20 +182,44 @@ void ProviderAgent::shutDown() {
     unloadRuntimeLibraries();
 }
 
-// Waits for one port's poll at most: a sleeping thread is woken.
+// ---- The end of the threads ----
+
+// Nothing is left over of them that uses the provider's broker.
+void ProviderAgent::endThreadsOf(const void* provider) {
+    if (m_DynamicPortThread.is_given_by(provider))
+        stopDynamicThread();
+    endRefreshOf(provider);
+}
+
+// The refresh ends as soon as it can. What it has not finished is asked for again, for the classes
+// that stay.
+void ProviderAgent::endRefreshOf(const void* provider) {
+    {
+        Auto_Mutex lock(m_DataFetchMutex);
+        if (!m_DataFetchThread.is_given_by(provider))
+            return;
+        if (m_bDataFetchRunning) {
+            scan_is_to_end = true;
+            VLN_LOG(VLN_DBG, "PERF: Clearing the previous thread...with join");
+        }
+    }
+    m_DataFetchThread.join();
+}
+
+// Waits for one port's poll at most: a sleeping thread is woken. The next look at a port starts
+// another thread.
 void ProviderAgent::stopDynamicThread() {
-    if (!m_DynamicPortThreadInitialized)
-        return;
     raise_flag(m_bStopDynamicThread);
     Time::wake();
-    void* value = nullptr;
-    Thread::join(m_DynamicPortThread, value);
+    m_DynamicPortThread.join();
+    Auto_Mutex lock(m_DynamicPortStatusMutex);
     m_pDynamicPortStatus.reset();
     m_DynamicPortThreadInitialized = false;
+    m_bStopDynamicThread = false;
 }
 
 // The cleared library flag makes a running refresh skip what it has not begun. A thread that has
-// ended is joined as well: its last instructions are this library's code, which goes away next.
+// ended is joined as well: its last instructions are this library's code.
 void ProviderAgent::stopDataFetch() {
     bool running = false;
     {
@@ -190,8 +229,26 @@ void ProviderAgent::stopDataFetch() {
     }
     if (running)
         VLN_LOG(VLN_DBG, "PERF: Clearing the previous thread...with join");
-    joinDataFetch();
+    m_DataFetchThread.join();
 }
+
+// No lock is taken that the process's last thread may hold itself. A child process that was forked
+// has the agent but not its threads.
+void ProviderAgent::endThreadsAtExit() noexcept {
+    ProviderAgent* agent = current();
+    if (!agent || agent->m_Process != getpid())
+        return;
+    raise_flag(agent->m_bStopDynamicThread);
+    Time::wake();
+    scan_is_to_end = true;
+    agent->m_bLibraryLoaded = false;
+    constexpr uint64 LONGEST_WAIT = 5 * Datetime::SECOND; // for each
+    agent->m_DynamicPortThread.join_within(LONGEST_WAIT);
+    agent->m_DataFetchThread.join_within(LONGEST_WAIT);
+    VLN_MethodWrapper::removeSemaphores();
+}
+
+// ---- The end of the rest ----
 
 void ProviderAgent::destroyDeviceModel() {
     VLN_LOG(VLN_DBG, "Deleting Data pointer");

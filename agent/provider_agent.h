@@ -9,6 +9,7 @@
 #ifndef VLN_AGENT_PROVIDER_AGENT_H
 #define VLN_AGENT_PROVIDER_AGENT_H
 
+#include "agent/agent_thread.h"
 #include "agent/plain_flag.h"
 #include "agent/status/dynamic_port_status.h"
 #include "agent/status/dynamic_status.h"
@@ -22,8 +23,17 @@
 #include <atomic>
 #include <memory>
 #include <string>
+#include <sys/types.h>
 
 namespace cimple {
+
+struct Platform_Objects;
+
+// What the loads of one class took and its unloads have not given back. Guarded by s_AgentMutex.
+struct Class_Loads {
+    uint16 references = 0;
+    uint16 failures = 0; // of loads while the libraries were not usable
+};
 
 class ProviderAgent : public Instance_Stores {
 public:
@@ -34,23 +44,25 @@ public:
     static ProviderAgent* instance();
     // The agent, or null when there is none; builds nothing.
     static ProviderAgent* current() noexcept;
-    // instance and addRef in one step, so that the last release on another thread can't come
-    // between. False, and no reference, when the libraries are not usable.
-    static bool acquire();
-    // Undoes one acquire, whatever it answered. The last one of an agent whose libraries are not
-    // usable destroys it, so that a later load tries again.
-    static void release();
-
-    // One reference for each class provider that is loaded. The last release destroys the agent: it
-    // joins a running refresh and waits at the gates, with s_AgentMutex held.
-    void addRef();
-    void releaseRef();
+    // Loads a class provider: builds the agent if there is none, and counts a reference. False, and
+    // no reference, when the libraries are not usable. What was taken is noted in the record.
+    static bool acquire(Class_Loads& loads);
+    // Undoes one acquire of the record: ends the threads that the calls of this provider started,
+    // then gives back what was taken, if anything. With the last of all the agent goes, also one
+    // whose libraries are not usable, so that a later load tries again. Holds no lock while it
+    // waits for a thread, which may be in an up-call that leads to a load.
+    static void release(Class_Loads& loads);
+    // At the end of the process: ends the threads without destroying anything.
+    static void endThreadsAtExit() noexcept;
 
     // ---- Refresh ----
 
     // Every class operation calls this before it reads anything: decides whether a refresh is due
     // and starts it. Takes m_DataFetchMutex; answers 0 always and waits for no refresh.
     int BuildCimpleInfo();
+    // Whether this thread is the refresh: a request that its up-calls lead to. It finds the stores
+    // as they are, since the refresh cannot go on before it is answered.
+    static bool isRefreshThread() noexcept;
 
     // Clears the stores of both refresh passes, each under its ready mutex. For the destructor
     // only.
@@ -68,7 +80,10 @@ public:
 
     // One-shot: the first refresh always has adapter data.
     Plain_Flag<flag::m_bAdapterRefreshRequested> m_bAdapterRefreshRequested = true;
-    Plain_Flag<flag::m_bSANRefreshRequested> m_bSANRefreshRequested = false; // one-shot
+    // One-shot: a service has changed the SAN.
+    Plain_Flag<flag::m_bSANRefreshRequested> m_bSANRefreshRequested = false;
+    // A client waits for the SAN stores: a request that is met by the stores of any pass.
+    Plain_Flag<flag::m_bSANMapsAsked> m_bSANMapsAsked = false;
     Plain_Flag<flag::m_bLibraryLoaded> m_bLibraryLoaded = false; // the device layer may be used
 
     std::unique_ptr<VLN_Data> m_pData;
@@ -103,17 +118,22 @@ public:
     bool m_bStopDynamicThread = false;
     std::unique_ptr<Dynamic_Port_Status> m_pDynamicPortStatus;
     Mutex m_DynamicPortStatusMutex;
-    Thread m_DynamicPortThread;
+    Agent_Thread m_DynamicPortThread;
 
     bool m_bFirstAdapterPass = true;
     std::string m_OSName;
     std::string m_OSVersion;
 
     Datetime m_LoadedTime; // end of the last refresh; all zero before the first
-    Thread m_DataFetchThread;
+    Agent_Thread m_DataFetchThread;
     Mutex m_DataFetchMutex; // guards the refresh decision and the members around it
+    // A start that failed leaves it set: the stores stay as they are.
     bool m_bDataFetchRunning = false;
+    // How many refreshes were told to end before they were done. Those whom such a refresh would
+    // have let through the gates start another.
+    std::atomic<uint32> m_CutRefreshes = 0;
     bool m_bOwnComputerSystem = false;
+    const pid_t m_Process; // in which the agent was built, and its threads are
 
 private:
     ProviderAgent();
@@ -123,32 +143,32 @@ private:
     void copyConfiguration();
     void loadLibraries();
     void shutDown();
+    void endThreadsOf(const void* provider);
+    void endRefreshOf(const void* provider);
     void stopDynamicThread();
     void stopDataFetch();
     void destroyDeviceModel();
     void clearRecords();
     static ProviderAgent* instanceLocked();
+    static ProviderAgent* holder(const Class_Loads& loads);
     static void destroyLocked();
 
     // refresh.cpp
     static void* DataFetch_Handler(void* agent);
     bool isCacheTimedOut();
     bool claimRefresh();
-    void joinDataFetch();
+    bool isSANPassWanted() const;
     void runAdapterPass();
     void rebuildAdapterData();
-    void rebuildAdapterMaps();
+    void rebuildAdapterMaps(const Platform_Objects& platform);
     void runSANPass();
     void rebuildSANMaps();
-    void finishRefresh();
+    bool finishRefresh();
+    void wakeWaiters();
 
     // The two map builders, on the refresh thread, under m_DataMutex. 0 or 32769.
-    uint32 updateAdapterMaps();
+    uint32 updateAdapterMaps(const Platform_Objects& platform);
     uint32 updateSANMaps();
-
-    // There is a thread that nobody has joined yet. A start that failed leaves m_bDataFetchRunning
-    // set and this one clear, so that no thread that never was gets joined.
-    bool m_bDataFetchJoinable = false;
 };
 
 } // namespace cimple

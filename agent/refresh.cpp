@@ -1,13 +1,17 @@
 // When a refresh is due, and what the refresh thread does.
 
+#include "agent/platform/platform_objects.h"
 #include "agent/provider_agent.h"
 #include "cimple/guard.h"
+#include "device/scan_end.h"
 
 namespace cimple {
 
 namespace {
 
 constexpr uint32 USEC_PER_MINUTE = 60000000;
+
+thread_local bool is_refresh_thread = false;
 
 // A builder that throws must cost its stores or its model, never the object manager's process.
 template <class Build>
@@ -17,6 +21,10 @@ void guarded(const char* what, Build build) {
 }
 
 } // namespace
+
+bool ProviderAgent::isRefreshThread() noexcept {
+    return is_refresh_thread;
+}
 
 // ---- The decision ----
 
@@ -41,7 +49,8 @@ bool ProviderAgent::isCacheTimedOut() {
 // call comes past this test until that thread has ended, so the thread's handle needs no lock.
 bool ProviderAgent::claimRefresh() {
     Auto_Mutex lock(m_DataFetchMutex);
-    if (!isCacheTimedOut() && !m_bAdapterRefreshRequested && !m_bSANRefreshRequested) {
+    if (!isCacheTimedOut() && !m_bAdapterRefreshRequested && !m_bSANRefreshRequested &&
+        !m_bSANMapsAsked) {
         VLN_LOG(VLN_DBG, "PERF: ---No timeout BuildCimpleInfo END---");
         return false;
     }
@@ -56,19 +65,11 @@ bool ProviderAgent::claimRefresh() {
     m_bDataFetchRunning = true;
     if (!(m_LoadedTime == Datetime()))
         VLN_LOG(VLN_DBG, "PERF: Clearing the previous thread...with join");
-    // The previous thread has cleared the running flag in its last locked step: this join is
-    // prompt.
-    joinDataFetch();
-    m_bDataFetchJoinable = true;
+    // The previous thread has cleared the running flag in a late step and waits for nobody since:
+    // this join is prompt.
+    m_DataFetchThread.join();
+    scan_is_to_end = false;
     return true;
-}
-
-void ProviderAgent::joinDataFetch() {
-    if (!m_bDataFetchJoinable)
-        return;
-    void* value = nullptr;
-    Thread::join(m_DataFetchThread, value);
-    m_bDataFetchJoinable = false;
 }
 
 int ProviderAgent::BuildCimpleInfo() {
@@ -83,12 +84,11 @@ int ProviderAgent::BuildCimpleInfo() {
     if (!claimRefresh())
         return 0;
     // Only a pending SAN request alone may leave the adapter data as they are.
-    if (!m_bSANRefreshRequested)
+    if (!m_bSANRefreshRequested && !m_bSANMapsAsked)
         m_bAdapterRefreshRequested = true;
-    // A start that fails is not reported, and the running flag stays up: the stores keep what they
-    // hold. All that is noted is that there is no thread to join.
-    if (Thread::create_joinable(m_DataFetchThread, DataFetch_Handler, this) != 0)
-        m_bDataFetchJoinable = false;
+    // After a start that fails the running flag stays up: the stores keep what they hold.
+    if (const int error = m_DataFetchThread.start(DataFetch_Handler, this))
+        VLN_LOG(VLN_ERR, "Error : DataFetch_Handler thread could not be started (%d)", error);
     VLN_LOG(VLN_DBG, "PERF: ---Created DataFetch_Handler thread -- BuildCimpleInfo END---");
     return 0;
 }
@@ -98,23 +98,33 @@ int ProviderAgent::BuildCimpleInfo() {
 void* ProviderAgent::DataFetch_Handler(void* argument) {
     VLN_LOG(VLN_DBG, "PERF: DataFetch_Handler Thread BEGIN");
     auto* agent = static_cast<ProviderAgent*>(argument);
+    is_refresh_thread = true;
     if (agent->m_bRefreshAdapterData || agent->m_bAdapterRefreshRequested)
         agent->runAdapterPass();
-    if (agent->m_bRefreshSANData || agent->m_bSANRefreshRequested)
-        agent->runSANPass();
-    agent->finishRefresh();
+    do {
+        if (agent->isSANPassWanted())
+            agent->runSANPass();
+    } while (!agent->finishRefresh());
+    agent->wakeWaiters();
     VLN_LOG(VLN_DBG, "PERF: DataFetch_Handler Thread END");
     return nullptr;
 }
 
+bool ProviderAgent::isSANPassWanted() const {
+    return m_bRefreshSANData || m_bSANRefreshRequested || m_bSANMapsAsked;
+}
+
 void ProviderAgent::runAdapterPass() {
+    Platform_Objects platform;
+    if (m_bLibraryLoaded && !scan_is_to_end)
+        guarded("up-calls", [&platform] { platform = find_platform_objects(); });
     rebuildAdapterData();
     {
         // New adapter data always make the SAN stores stale.
         Auto_Mutex lock(m_SANMapsReadyMutex);
         m_bIsSANMapsReady = false;
     }
-    rebuildAdapterMaps();
+    rebuildAdapterMaps(platform);
 }
 
 void ProviderAgent::rebuildAdapterData() {
@@ -130,18 +140,26 @@ void ProviderAgent::rebuildAdapterData() {
         Auto_Mutex data(m_DataMutex);
         guarded("buildAdapterData", [this] { m_pData->buildAdapterData(); });
     }
-    m_bIsAdapterDataReady = true;
     m_bIsAdapterDataBuilding = false;
+    if (scan_is_to_end) {
+        m_bAdapterRefreshRequested = true;
+        return;
+    }
+    m_bIsAdapterDataReady = true;
     m_AdapterDataReadyCond.broadcast();
 }
 
-void ProviderAgent::rebuildAdapterMaps() {
+void ProviderAgent::rebuildAdapterMaps(const Platform_Objects& platform) {
     Auto_Mutex gate(m_AdapterMapsReadyMutex);
+    if (scan_is_to_end) {
+        m_bAdapterRefreshRequested = true;
+        return;
+    }
     m_bIsAdapterMapsBuilding = true;
     if (m_bLibraryLoaded) {
         VLN_LOG(VLN_DBG, "PERF: Updating Adapter Maps...");
         Auto_Mutex data(m_DataMutex);
-        guarded("updateAdapterMaps", [this] { updateAdapterMaps(); });
+        guarded("updateAdapterMaps", [&] { updateAdapterMaps(platform); });
     }
     m_bIsAdapterMapsReady = true;
     m_bIsAdapterMapsBuilding = false;
@@ -152,7 +170,12 @@ void ProviderAgent::rebuildAdapterMaps() {
 // class clients wait for it as well.
 void ProviderAgent::runSANPass() {
     Auto_Mutex data_gate(m_AdapterDataReadyMutex);
+    if (scan_is_to_end) {
+        m_bSANRefreshRequested = true;
+        return;
+    }
     m_bSANRefreshRequested = false;
+    m_bSANMapsAsked = false;
     m_bIsSANMapsReady = false; // without its own mutex, as above
     if (!m_bIsAdapterDataReady)
         m_AdapterDataReadyCond.wait(m_AdapterDataReadyMutex);
@@ -174,17 +197,45 @@ void ProviderAgent::rebuildSANMaps() {
         Auto_Mutex data(m_DataMutex);
         VLN_LOG(VLN_DBG, "PERF: Updating SAN Maps...");
         guarded("updateSANMaps", [this] { updateSANMaps(); });
+        // A part of the SAN is nobody's picture.
+        if (scan_is_to_end)
+            clearSANMaps();
+    }
+    m_bIsSANMapsBuilding = false;
+    if (scan_is_to_end) {
+        m_bSANRefreshRequested = true;
+        return;
     }
     m_bIsSANMapsReady = true;
-    m_bIsSANMapsBuilding = false;
+    // Whoever has asked meanwhile has what it asked for. Clients ask under this mutex.
+    m_bSANMapsAsked = false;
     m_SANMapsReadyCond.broadcast();
 }
 
-// The time-out counts from here: from the end of a refresh, not from its start.
-void ProviderAgent::finishRefresh() {
+// The time-out counts from here: from the end of a refresh, not from its start. False, and no end,
+// if a client waits for SAN stores that no pass of this refresh will make otherwise.
+bool ProviderAgent::finishRefresh() {
     Auto_Mutex lock(m_DataFetchMutex);
+    if (m_bSANMapsAsked && !m_bIsSANMapsReady && !scan_is_to_end)
+        return false;
     m_bDataFetchRunning = false;
     m_LoadedTime = Datetime::now();
+    if (scan_is_to_end)
+        ++m_CutRefreshes;
+    return true;
+}
+
+// After a refresh that has ended early. Those who wait see that by the count, and start another.
+void ProviderAgent::wakeWaiters() {
+    if (!scan_is_to_end)
+        return;
+    const auto wake = [](Mutex& mutex, Cond& cond) {
+        Auto_Mutex lock(mutex);
+        cond.broadcast();
+    };
+    wake(m_AdapterDataReadyMutex, m_AdapterDataReadyCond);
+    wake(m_AdapterMapsReadyMutex, m_AdapterMapsReadyCond);
+    wake(m_SANMapsReadyMutex, m_SANMapsReadyCond);
 }
 
 } // namespace cimple

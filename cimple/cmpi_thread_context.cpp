@@ -92,7 +92,7 @@ Thread_Context* CMPI_Thread_Context::thread_create_hook(void*) {
     CMPIContext* prepared = _broker->bft->prepareAttachThread(_broker, _context);
     if (!prepared)
         return nullptr;
-    auto* child = new (std::nothrow) CMPI_Thread_Context(_broker, prepared, _adapter);
+    auto* child = new (std::nothrow) CMPI_Thread_Context(_broker, prepared, nullptr);
     if (child)
         child->_prepared = prepared;
     else

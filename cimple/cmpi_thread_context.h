@@ -13,7 +13,7 @@ struct CMPI_Enumerator;
 // context ends or its thread detaches: some brokers do not survive what is left then.
 class CMPI_Thread_Context : public Thread_Context {
 public:
-    // Borrows all three. adapter is null until a provider's is built.
+    // Borrows all three. adapter is null on a thread that a provider started, which may outlive it.
     CMPI_Thread_Context(const CMPIBroker* broker, const CMPIContext* context,
                         CMPI_Adapter* adapter) noexcept
         : _broker(broker), _context(context), _adapter(adapter) {}
@@ -23,6 +23,7 @@ public:
 
     const CMPIBroker* broker() const { return _broker; }
     const CMPIContext* context() const { return _context; }
+    const void* provider() const override { return _adapter; }
 
     Thread_Context* thread_create_hook(void* argument) override;
     void thread_start_hook() override;

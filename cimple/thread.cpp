@@ -220,6 +220,15 @@ int Thread::join(Thread& thread, void*& value) {
     return pthread_join(thread._thread, &value);
 }
 
+bool Thread::join_within(Thread& thread, uint64 usec) {
+    timespec end{};
+    clock_gettime(CLOCK_REALTIME, &end); // which is what this wait goes by
+    const uint64 nanoseconds = static_cast<uint64>(end.tv_nsec) + usec * 1000;
+    end.tv_sec += static_cast<time_t>(nanoseconds / 1000000000);
+    end.tv_nsec = static_cast<long>(nanoseconds % 1000000000);
+    return pthread_timedjoin_np(thread._thread, nullptr, &end) == 0;
+}
+
 void Thread::exit(void* value) {
     if (Thread_Context* context = Thread_Context::top())
         context->thread_exit_hook();

@@ -106,6 +106,8 @@ public:
     static int create_detached(Thread& thread, Thread_Proc proc, void* argument);
 
     static int join(Thread& thread, void*& value); // value is 0 before the join
+    // False if the thread runs on after so many microseconds; it is not joined then.
+    static bool join_within(Thread& thread, uint64 usec);
     [[noreturn]] static void exit(void* value);
     static Thread self();
     friend bool operator==(const Thread& a, const Thread& b) {

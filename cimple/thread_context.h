@@ -18,6 +18,9 @@ class Thread_Context {
 public:
     virtual ~Thread_Context() = default;
 
+    // Which provider's call this is, to be compared only; null on a thread that a provider started.
+    virtual const void* provider() const { return nullptr; }
+
     // A context for a thread about to start, made on the parent; null if that fails.
     virtual Thread_Context* thread_create_hook(void* argument) = 0;
     virtual void thread_start_hook() = 0; // first on the new thread

@@ -58,38 +58,43 @@ bool copy_stores(ProviderAgent& agent, Copying& copying) {
 }
 
 bool copy_adapter_group(ProviderAgent& agent, Copying& copying) {
-    agent.BuildCimpleInfo();
-    const Gate maps = adapter_maps_gate(agent);
-    Auto_Mutex data(agent.m_DataMutex);
-    return copy_stores(agent, copying);
+    return behind(agent, adapter_maps_gate, [&] { return copy_stores(agent, copying); });
 }
 
 bool copy_san_group(ProviderAgent& agent, Copying& copying) {
     request_stale_san_maps(agent);
-    agent.BuildCimpleInfo();
-    const Gate maps = san_maps_gate(agent);
-    Auto_Mutex data(agent.m_DataMutex);
-    return copy_stores(agent, copying);
+    return behind(agent, san_maps_gate, [&] { return copy_stores(agent, copying); });
 }
 
 bool copy_active(ProviderAgent& agent, Copying& copying) {
-    agent.BuildCimpleInfo();
-    const Gate adapters = adapter_data_gate(agent);
-    const Gate maps = adapter_maps_gate(agent);
-    Auto_Mutex data(agent.m_DataMutex);
-    const No_Cancellation in_the_library;
-    {
-        Auto_Mutex update(copying.row.update_mutex());
-        if (copying.row.update)
-            copying.row.update(agent);
+    for (;;) {
+        const Visit visit(agent);
+        const Gate adapters = adapter_data_gate(visit);
+        const Gate maps = adapter_maps_gate(visit);
+        if (!adapters.is_open || !maps.is_open)
+            continue;
+        Auto_Mutex data(agent.m_DataMutex);
+        const No_Cancellation in_the_library;
+        {
+            Auto_Mutex update(copying.row.update_mutex());
+            if (copying.row.update)
+                copying.row.update(agent);
+        }
+        return copy_stores(agent, copying);
     }
-    return copy_stores(agent, copying);
 }
 
 struct Shape_Steps {
     bool (*copy)(ProviderAgent& agent, Copying& copying);
     const char* exception; // the line of the guard
 };
+
+// What each class's loads took.
+constinit Class_Loads loads[NUM_PATTERNS];
+
+Class_Loads& loads_of(const Pattern_Row& row) {
+    return loads[&row - pattern_table];
+}
 
 // By Pattern_Shape.
 constexpr Shape_Steps SHAPES[] = {
@@ -120,15 +125,15 @@ void enumerate(ProviderAgent& agent, const Pattern_Row& row,
 
 } // namespace
 
-sint32 pattern_load() {
+sint32 pattern_load(const Pattern_Row& row) {
     bool loaded = false;
-    run_guarded([&] { loaded = ProviderAgent::acquire(); });
+    run_guarded([&] { loaded = ProviderAgent::acquire(loads_of(row)); });
     return loaded ? PROVIDER_OK : LOAD_FAILED;
 }
 
 sint32 pattern_unload(const Pattern_Row& row) {
     VLN_LOG(VLN_DBG, "%s_Provider::unload()", row.meta_class->name);
-    if (!run_guarded([] { ProviderAgent::release(); }))
+    if (!run_guarded([&] { ProviderAgent::release(loads_of(row)); }))
         VLN_LOG(VLN_ERR, "Error in ProviderAgent unload. Just continue");
     return PROVIDER_OK;
 }

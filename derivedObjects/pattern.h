@@ -57,10 +57,11 @@ inline constexpr Pattern_Id pattern_id = NUM_PATTERNS;
 // ---- The operations. None of them throws; a cancellation of the thread passes through. ----
 
 // Builds the agent if there is none, and takes a reference. LOAD_FAILED, and no reference, when the
-// libraries are not usable.
-sint32 pattern_load();
+// libraries are not usable or memory is short.
+sint32 pattern_load(const Pattern_Row& row);
 
-// Gives the reference back; the last one destroys the agent.
+// Gives back what a load of the class took; the last of all destroys the agent. The row is one of
+// the table.
 sint32 pattern_unload(const Pattern_Row& row);
 
 // Hands a clone of each stored instance to the handler, on the caller's thread with no lock held;

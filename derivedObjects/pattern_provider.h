@@ -15,7 +15,7 @@ template <class C>
 struct Pattern_Provider : Method_Stubs<C> {
     static const Pattern_Row& row() { return pattern_table[pattern_id<C>]; }
 
-    sint32 load() { return pattern_load(); }
+    sint32 load() { return pattern_load(row()); }
     sint32 unload() { return pattern_unload(row()); }
     sint32 get_instance(const C*, C*&) { return GET_INSTANCE_UNSUPPORTED; }
     sint32 enum_instances(const C*, const Enum_Instances_Handler& handler) {

@@ -5,6 +5,7 @@
 #include "device/fcoe_adapter.h"
 #include "device/iscsi_adapter.h"
 #include "device/nic_adapter.h"
+#include "device/scan_end.h"
 #include "foundation/log.h"
 
 #include <algorithm>
@@ -97,7 +98,7 @@ void VLN_Data::buildAdapterData() {
     VLN_LOG(VLN_DBG, "buildAdapterData");
     freeAllData();
     Scan scan;
-    while (adapterCount == 0) {
+    while (adapterCount == 0 && !scan_is_to_end) {
         if (++scan.passes > MOST_PASSES) {
             VLN_LOG(VLN_ERR, "ERROR: no end to the adapter scan, given up with %zu adapters",
                     adapters.size());

@@ -1,6 +1,7 @@
 #include "device/port.h"
 
 #include "cimple/guard.h"
+#include "device/scan_end.h"
 #include "device/target_mapping.h"
 #include "foundation/log.h"
 
@@ -30,7 +31,7 @@ void Port::dropTargets() noexcept {
 void Port::makeTargets(Adapter& owner, const Target_Mapping& mapping) {
     if (mapping.status() != HBA_STATUS_OK)
         return;
-    for (std::size_t unit = 0; unit < mapping.size(); ++unit) {
+    for (std::size_t unit = 0; unit < mapping.size() && !scan_is_to_end; ++unit) {
         const auto make_target = [&] {
             targets.push_back(std::make_unique<Target>(owner, mapping[unit]));
         };

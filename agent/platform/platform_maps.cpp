@@ -4,6 +4,7 @@
 #include "agent/adapter_map_builder.h"
 #include "agent/associations.h"
 #include "agent/platform/host_identity.h"
+#include "agent/platform/platform_objects.h"
 #include "agent/text.h"
 #include "agent/version.h"
 #include "cimple/cimom.h"
@@ -103,8 +104,15 @@ Host_Identity host_identity() {
 
 } // namespace
 
+Platform_Objects find_platform_objects() {
+    Platform_Objects found;
+    found.system = Ref<CIM_ComputerSystem>(platform_instance(COMPUTER_SYSTEM_CALL).release());
+    found.chassis = Ref<CIM_Chassis>(platform_instance(CHASSIS_CALL).release());
+    return found;
+}
+
 uint32 Adapter_Map_Builder::createComputerSystem() {
-    Ref<CIM_ComputerSystem> system(platform_instance(COMPUTER_SYSTEM_CALL).release());
+    Ref<CIM_ComputerSystem> system = _platform.system;
     _agent.m_bOwnComputerSystem = !system;
     if (system) {
         VLN_LOG(VLN_DBG, "All clear -created vlnhba computer system instance");
@@ -135,12 +143,8 @@ Ref<CIM_ComputerSystem> Adapter_Map_Builder::ownComputerSystem() const {
     return system;
 }
 
-void Adapter_Map_Builder::findChassis() {
-    _platform_chassis = Ref<CIM_Chassis>(platform_instance(CHASSIS_CALL).release());
-}
-
 uint32 Adapter_Map_Builder::createChassis() {
-    Ref<CIM_Chassis> chassis = _platform_chassis;
+    Ref<CIM_Chassis> chassis = _platform.chassis;
     if (!chassis) {
         VLN_LOG(VLN_DBG, "up-call method to get the chassis is failed");
         chassis = ownChassis();

@@ -6,6 +6,7 @@
 #include "classes/CIM_ComputerSystem.h"
 #include "classes/VLNMPCA_SCSIProtocolEndpoint.h"
 #include "classes/VLNMPCA_SCSIProtocolInitiatorEndpoint.h"
+#include "device/scan_end.h"
 #include "foundation/utf8.h"
 
 #include <string_view>
@@ -127,7 +128,7 @@ void FC_SAN_Maps::createTargets(Port& port) {
     const FC_Initiator initiator = findInitiator(port);
     const auto targets = group_units(port);
     Logical_Unit_Maps units(_agent, _system);
-    for (std::size_t i = 0; i < targets.size(); ++i) {
+    for (std::size_t i = 0; i < targets.size() && !scan_is_to_end; ++i) {
         VLN_LOG(VLN_DBG, "Creating classes for target %d of %d.", static_cast<int>(i + 1),
                 static_cast<int>(targets.size()));
         const Target& first = *targets[i].front();

@@ -13,6 +13,7 @@
 #include "classes/VLNMPCA_TCPProtocolEndpoint.h"
 #include "device/library/bound_functions.h"
 #include "device/library/hba_api.h"
+#include "device/scan_end.h"
 
 #include <cstdlib>
 #include <new>
@@ -89,7 +90,7 @@ uint32 ISCSI_SAN_Maps::walkTargets(const ISCSI_View& view) {
     const Owned_List<AX_iSCSI_TargetList> owner(table);
     VLN_LOG(VLN_DBG, "AX_iSCSI_GetTargets succeded.");
     std::vector<ISCSI_Target> targets;
-    for (uint32 i = 0; i < table->count; ++i) {
+    for (uint32 i = 0; i < table->count && !scan_is_to_end; ++i) {
         VLN_LOG(VLN_DBG, "targetList index: %u", i);
         ISCSI_Target& target = targets.emplace_back(target_of(i, table->entry[i]));
         if (table->entry[i].flags & AX_ISCSI_TARGET_HAS_SESSIONS)
@@ -98,6 +99,8 @@ uint32 ISCSI_SAN_Maps::walkTargets(const ISCSI_View& view) {
             return status;
     }
     for (const ISCSI_Target& target : targets) {
+        if (scan_is_to_end)
+            break;
         status = createTarget(view, target);
         if (status != AX_STATUS_OK)
             return status;

@@ -8,6 +8,7 @@
 #include "classes/VLNMPCA_iSCSITargetProtocolEndpoint.h"
 #include "device/library/bound_functions.h"
 #include "device/library/hba_api.h"
+#include "device/scan_end.h"
 #include "foundation/utf8.h"
 
 #include <cstdlib>
@@ -133,7 +134,7 @@ void ISCSI_SAN_Maps::createUnits(const ISCSI_View& view, const ISCSI_Target& tar
                 target.name.c_str());
     Logical_Unit_Maps maps(_agent, view.system);
     const auto paths = paths_to(target, target_endpoint);
-    for (uint32 i = 0; i < luns.count; ++i) {
+    for (uint32 i = 0; i < luns.count && !scan_is_to_end; ++i) {
         Told_Unit told{};
         told.index = i;
         split_text(luns.entry[i], told);

@@ -69,7 +69,7 @@ void SAN_Map_Builder::createISCSIClasses() {
 // What throws in here ends the FC part of the SAN, and nothing else.
 void SAN_Map_Builder::createFCClasses() {
     VLN_LOG(VLN_DBG, "Entering update SAN maps for FCoE ifdef");
-    try {
+    const bool complete = run_guarded([this] {
         FC_SAN_Maps maps(_agent);
         for (const auto& adapter : _agent.m_pData->adapters) {
             if (adapter->getAdapterType() != ADAPTER_FCOE) {
@@ -80,9 +80,9 @@ void SAN_Map_Builder::createFCClasses() {
             for (const auto& port : adapter->getPorts())
                 maps.createTargets(*port);
         }
-    } catch (...) {
+    });
+    if (!complete)
         VLN_LOG(VLN_ERR, "FCoE SAN refresh failed");
-    }
 }
 
 } // namespace cimple

@@ -8,6 +8,8 @@
 #include <algorithm>
 #include <exception>
 
+#include <unistd.h>
+
 namespace cimple {
 
 namespace {
@@ -15,6 +17,7 @@ namespace {
 constexpr uint64 SLEEP = 6 * Datetime::SECOND;
 constexpr unsigned SLEEPS_PER_POLL = 20;
 constexpr uint64 SLEEP_BETWEEN_PORTS = 2 * Datetime::SECOND;
+constexpr useconds_t LOCK_TRIAL_USEC = 10000; // of the machine's time
 
 using Port_Rows = std::vector<Dynamic_Port_Row>;
 
@@ -48,20 +51,29 @@ void read_states(Dynamic_Port_Row& row) {
     row.physical_state = physical_state;
 }
 
+// Takes a lock that a refresh may hold for long; false, and no lock, if the thread is stopped
+// first.
+bool lock_or_stop(const ProviderAgent& agent, Mutex& mutex) {
+    while (!stopped(agent)) {
+        if (mutex.try_lock() == 0)
+            return true;
+        usleep(LOCK_TRIAL_USEC);
+    }
+    return false;
+}
+
 // One port at a time under the data lock, with a rest between, so that no client waits for more
 // than one call of the library. False when the thread was stopped meanwhile.
 bool poll(ProviderAgent& agent, Port_Rows& rows) {
-    {
-        // Held while the maps are being built: lets a refresh end first.
-        Auto_Mutex maps(agent.m_AdapterMapsReadyMutex);
-    }
+    // Held while the maps are being built: lets a refresh end first.
+    if (!lock_or_stop(agent, agent.m_AdapterMapsReadyMutex))
+        return false;
+    agent.m_AdapterMapsReadyMutex.unlock();
     for (Dynamic_Port_Row& row : rows) {
-        if (stopped(agent))
+        if (!lock_or_stop(agent, agent.m_DataMutex))
             return false;
-        const bool complete = run_guarded([&] {
-            Auto_Mutex data(agent.m_DataMutex);
-            read_states(row);
-        });
+        const bool complete = run_guarded([&] { read_states(row); });
+        agent.m_DataMutex.unlock();
         if (!complete)
             VLN_LOG(VLN_DBG, "Error occurred while retrieving NicPort status...");
         Time::pause(SLEEP_BETWEEN_PORTS, agent.m_bStopDynamicThread);

@@ -79,11 +79,17 @@ void start_thread(ProviderAgent& agent) {
         throw;
     }
     VLN_LOG(VLN_DBG, "PERF: Creating DynamicDataFetch_Handler Thread.");
-    if (Thread::create_joinable(agent.m_DynamicPortThread, DynamicDataFetch_Handler, &agent) != 0) {
-        VLN_LOG(VLN_DBG, "PERF: Thread DynamicDataFetch_Handler Creation failed");
+    if (agent.m_DynamicPortThread.start(DynamicDataFetch_Handler, &agent) != 0) {
+        VLN_LOG(VLN_ERR, "PERF: Thread DynamicDataFetch_Handler Creation failed");
         return;
     }
+    Auto_Mutex lock(agent.m_DynamicPortStatusMutex);
     agent.m_DynamicPortThreadInitialized = true;
+}
+
+bool is_thread_running(ProviderAgent& agent) {
+    Auto_Mutex lock(agent.m_DynamicPortStatusMutex);
+    return agent.m_DynamicPortThreadInitialized;
 }
 
 void show_status(VLNMPCA_EthernetPort& port, const Dynamic_Port_Row& row) {
@@ -102,6 +108,8 @@ void show_status(VLNMPCA_EthernetPort& port, const Dynamic_Port_Row& row) {
 void show_port_status(ProviderAgent& agent) {
     const auto& ports = agent.m_VLNMPCA_EthernetPort_map;
     Auto_Mutex lock(agent.m_DynamicPortStatusMutex);
+    if (!agent.m_pDynamicPortStatus)
+        return; // the thread has ended meanwhile
     for (uint32 i = 0; i < ports.size(); ++i)
         for (const Dynamic_Port_Row& row : agent.m_pDynamicPortStatus->rows)
             if (ports[i]->DeviceID.value == row.name)
@@ -150,7 +158,7 @@ void UpdateDynamicEthernetPortStatus(ProviderAgent& agent) {
         VLN_LOG(VLN_DBG, "Returning from m_bIsAdapterMapsReady condn");
         return;
     }
-    if (!agent.m_DynamicPortThreadInitialized) {
+    if (!is_thread_running(agent)) {
         VLN_LOG(VLN_DBG, "Returning from m_DynamicPortThreadInitialized false condn");
         start_thread(agent);
         return;

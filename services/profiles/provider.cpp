@@ -19,14 +19,13 @@ using Profiles = std::vector<Ref<VLNMPCA_RegisteredProfile>>;
 
 // Copies, so that no lock of the agent is held during the up-call.
 Profiles registered_profiles(ProviderAgent& agent) {
-    agent.BuildCimpleInfo();
-    const Gate maps = adapter_maps_gate(agent);
-    Auto_Mutex data(agent.m_DataMutex);
-    const auto& store = agent.m_VLNMPCA_RegisteredProfile_map;
-    Profiles profiles;
-    for (uint32 i = 0; i < store.size(); ++i)
-        profiles.emplace_back(clone(store[i]));
-    return profiles;
+    return behind(agent, adapter_maps_gate, [&agent] {
+        const auto& store = agent.m_VLNMPCA_RegisteredProfile_map;
+        Profiles profiles;
+        for (uint32 i = 0; i < store.size(); ++i)
+            profiles.emplace_back(clone(store[i]));
+        return profiles;
+    });
 }
 
 bool is_base_server(const PG_RegisteredProfile* profile) {

@@ -145,7 +145,7 @@ int Agent_Test::refreshes_started(ProviderAgent& agent) {
 }
 
 Loaded_Agent::Loaded_Agent() {
-    EXPECT_EQ(pattern_load(), PROVIDER_OK);
+    EXPECT_EQ(pattern_load(pattern_table[0]), PROVIDER_OK);
 }
 
 Long_Operation::Long_Operation(ProviderAgent& agent) {

@@ -5,6 +5,7 @@
 
 #include "agent/provider_agent.h"
 #include "cimple/registration.h"
+#include "derivedObjects/pattern.h"
 #include "foundation/logger.h"
 
 #include <gtest/gtest.h>
@@ -63,7 +64,7 @@ protected:
 class Loaded_Agent {
 public:
     Loaded_Agent();
-    ~Loaded_Agent() { ProviderAgent::current()->releaseRef(); }
+    ~Loaded_Agent() { pattern_unload(pattern_table[0]); }
     ProviderAgent* operator->() const { return ProviderAgent::current(); }
     ProviderAgent& operator*() const { return *ProviderAgent::current(); }
 };

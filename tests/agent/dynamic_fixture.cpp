@@ -34,14 +34,14 @@ void Dynamic_Test::TearDown() {
 
 void Dynamic_Test::begin(const std::string& functions) {
     load(functions);
-    ASSERT_EQ(pattern_load(), PROVIDER_OK);
+    ASSERT_EQ(pattern_load(pattern_table[0]), PROVIDER_OK);
     agent = ProviderAgent::current();
     ASSERT_EQ(refreshes_started(*agent), 1);
 }
 
 void Dynamic_Test::end() {
     if (agent)
-        agent->releaseRef();
+        pattern_unload(pattern_table[0]);
     agent = nullptr;
 }
 

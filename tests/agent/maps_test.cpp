@@ -16,11 +16,11 @@ protected:
         // What a card tells of itself as a replaceable unit is another test's matter.
         ASSERT_EQ(vlnsim_fault("AX_GetVPDV2", VLNSIM_EVERY, VLNSIM_STATUS, 1), 0);
         replace_host_queries(&HOST);
-        ASSERT_EQ(pattern_load(), 0);
+        ASSERT_EQ(pattern_load(pattern_table[0]), 0);
         EXPECT_EQ(refreshes_started(*ProviderAgent::current()), 1);
     }
     void TearDown() override {
-        ProviderAgent::current()->releaseRef();
+        pattern_unload(pattern_table[0]);
         replace_host_queries(nullptr);
         Maps_Test::TearDown();
     }

@@ -40,12 +40,12 @@ class Narrowing_Test : public Agent_Test {
 protected:
     void SetUp() override {
         Agent_Test::SetUp();
-        ASSERT_EQ(pattern_load(), 0);
+        ASSERT_EQ(pattern_load(pattern_table[0]), 0);
         agent = ProviderAgent::current();
         ASSERT_EQ(refreshes_started(*agent), 1);
     }
     void TearDown() override {
-        agent->releaseRef();
+        pattern_unload(pattern_table[0]);
         Agent_Test::TearDown();
     }
 

@@ -16,12 +16,12 @@ protected:
     // A settled agent: what a test puts into a store is not cleared by a refresh.
     void SetUp() override {
         Agent_Test::SetUp();
-        ASSERT_EQ(pattern_load(), 0);
+        ASSERT_EQ(pattern_load(pattern_table[0]), 0);
         agent = ProviderAgent::current();
         ASSERT_EQ(refreshes_started(*agent), 1);
     }
     void TearDown() override {
-        agent->releaseRef();
+        pattern_unload(pattern_table[0]);
         Agent_Test::TearDown();
     }
     VLNMPCA_Product* put_product(const char* name) {

@@ -42,6 +42,7 @@ struct VLN_Data::Scan {
     bool nicSeen = false;
     int sleeps = 0;
     int passes = 0;
+    std::size_t earlierPasses = 0; // adapters that stood when this pass began
 
     // A zeroed table of `count` words. False without memory, or for a count that cannot be.
     bool makeTable();
@@ -96,14 +97,17 @@ void VLN_Data::freeAllData() {
 // after that. A NIC function that shows up in the last look comes too late, and that is meant.
 void VLN_Data::buildAdapterData() {
     VLN_LOG(VLN_DBG, "buildAdapterData");
+    ++scanNumber;
     freeAllData();
     Scan scan;
     while (adapterCount == 0 && !scan_is_to_end) {
         if (++scan.passes > MOST_PASSES) {
+            keepLastPass(scan.earlierPasses);
             VLN_LOG(VLN_ERR, "ERROR: no end to the adapter scan, given up with %zu adapters",
                     adapters.size());
             return;
         }
+        scan.earlierPasses = adapters.size();
         if (listInstances(scan))
             takeInstances(scan);
         scan.table.reset();
@@ -114,6 +118,19 @@ void VLN_Data::buildAdapterData() {
         Time::sleep(SLEEP_USEC);
         ++scan.sleeps;
     }
+}
+
+// Each pass made the same adapters again.
+void VLN_Data::keepLastPass(std::size_t earlierPasses) {
+    adapters.erase(adapters.begin(), adapters.begin() + static_cast<std::ptrdiff_t>(earlierPasses));
+    const auto has = [this](uint32 type) {
+        return std::any_of(adapters.begin(), adapters.end(), [type](const auto& adapter) {
+            return adapter->getAdapterType() == type;
+        });
+    };
+    hasNICAdapter = has(ADAPTER_NIC);
+    hasFCoEAdapter = has(ADAPTER_FCOE);
+    hasISCSIAdapter = has(ADAPTER_ISCSI);
 }
 
 void VLN_Data::buildSANData() {

@@ -36,9 +36,12 @@ public:
     // Counts a failing adapter down without having counted it up, so it may be less than the list
     // holds, or negative. That is meant: only 0 makes the scan go on.
     sint32 adapterCount = 0;
+    // Of the scan that this picture is from, or is to be from: the first is 1.
+    uint32 scanNumber = 0;
 
 private:
     struct Scan;
+    void keepLastPass(std::size_t earlierPasses);
     bool listInstances(Scan& scan);
     void takeInstances(Scan& scan);
     bool readRecord(Scan& scan, uint32 index, LocalHBAInfoV4& info);

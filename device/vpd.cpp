@@ -144,9 +144,11 @@ void walk(char* buffer, Take take) {
         Entry entry{};
         void* next =
             AX_GetNextVpdEntry(cursor, entry.tag, AX_VPD_TAG_SIZE, entry.value, AX_VPD_VALUE_SIZE);
+        // The last entry may come with the end of the list.
+        if (next || entry.tag[0] != '\0')
+            take(entry);
         if (!next)
             return;
-        take(entry);
         // Only forward, and not out of the buffer, whatever the library answers.
         const auto step =
             reinterpret_cast<std::uintptr_t>(next) - reinterpret_cast<std::uintptr_t>(cursor);

@@ -179,7 +179,7 @@ std::string readWebLaunchURL(const char* path) {
     while (read_line(stream.get(), 256, line)) {
         const std::size_t start = line.find_first_not_of(" \t\r");
         if (start != std::string::npos && line[start] != '#')
-            return line.substr(start);
+            return line.substr(start, line.find_last_not_of('\r') + 1 - start);
     }
     return {};
 }

@@ -130,6 +130,18 @@ TEST_F(Vpd_Test, FailuresAnswerTheirStatus) {
     EXPECT_EQ(fake_vpd.steps, 0);
 }
 
+// A library may tell of the end together with the last entry.
+TEST_F(Vpd_Test, AnEntryCountsThatComesWithTheEnd) {
+    fake_vpd.onStep = [](char* cursor, char* tag, char* value) -> void* {
+        std::strcpy(tag, fake_vpd.steps == 1 ? "SN" : "PN");
+        std::strcpy(value, "told");
+        return fake_vpd.steps == 1 ? cursor + 7 : nullptr;
+    };
+    ASSERT_EQ(read(), AX_STATUS_OK);
+    EXPECT_STREQ(record.serialNumber, "told");
+    EXPECT_STREQ(record.partNumber, "told");
+}
+
 TEST_F(Vpd_Test, PCIKeywordsComeInOrder) {
     fake_vpd.entry("PN", "VT-1");
     fake_vpd.entry("V0", "first");

@@ -110,6 +110,7 @@ TEST_F(Config_File_Test, WebLaunchAddress) {
         {"# where\n\n  \t https://host:8443/launch?a=#b \nhttps://second\n",
          "https://host:8443/launch?a=#b "},
         {"https://no-end-of-line", "https://no-end-of-line"},
+        {"# from another system\r\n\r\nhttps://host/\r\n", "https://host/"},
         {std::string(300, 'h'), std::string(256, 'h')},
     };
     for (const auto& [text, address] : cases) {

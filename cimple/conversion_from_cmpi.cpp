@@ -422,7 +422,10 @@ Ref<Instance> make_foreign_reference(const Converter& converter, const Meta_Clas
     CMPICount count = 0;
     if (base->num_keys == 0 || !From_Path{path}.count(count) || count != base->num_keys)
         return {};
-    const Class_Handle foreign(create_meta_class(cmpi::class_name(path).c_str(), base, 0));
+    const String name = cmpi::class_name(path);
+    if (name.empty())
+        return {};
+    const Class_Handle foreign(create_meta_class(name.c_str(), base, 0));
     Ref<Instance> instance = make_cimple_reference(converter, foreign.get(), path);
     return keys_all_set(instance.get()) ? instance : Ref<Instance>();
 }

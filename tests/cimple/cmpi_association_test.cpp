@@ -39,22 +39,6 @@ protected:
     CMPIAssociationMI* mi = association_mi();
 };
 
-TEST_F(Association_Test, NamesAreDerivedFromTheEnumeration) {
-    unsupported();
-    EXPECT_EQ(names(leaf_path("a")).rc, 0);
-    ASSERT_EQ(broker.returned_paths.size(), 2u);
-    EXPECT_EQ(broker.returned_paths[0]->text, "Test_Base");
-    EXPECT_EQ(broker.returned_paths[0]->name_space, "root/test");
-    EXPECT_EQ(broker.returned_paths[0]->string("Id"), "x");
-    EXPECT_EQ(broker.returned_paths[1]->name_space, "root/far") << "a target's own namespace";
-    EXPECT_EQ(broker.done, 0) << "the object manager closes the result";
-    EXPECT_EQ(broker.live(), 0);
-
-    names(base_path("y", 2));
-    ASSERT_EQ(broker.returned_paths.size(), 1u);
-    EXPECT_EQ(broker.returned_paths[0]->string("Name"), "b");
-}
-
 TEST_F(Association_Test, RolesAndClassesNarrowTheMatch) {
     unsupported();
     const struct {
@@ -84,21 +68,6 @@ TEST_F(Association_Test, AnUnknownSourceHasNoAssociations) {
     EXPECT_EQ(mi->ft->references(mi, context, result, path, 0, 0, nullptr).rc, 0);
     EXPECT_EQ(mi->ft->referenceNames(mi, context, result, path, 0, 0).rc, 0);
     EXPECT_EQ(script.operations, std::vector<int>{OP_LOAD});
-}
-
-TEST_F(Association_Test, AssociatorsAreFetchedByAnUpCall) {
-    unsupported();
-    broker.upcall_instances = {fake::instance_data(base_data("x", 1), {{"Id", fake::text("x")}})};
-    EXPECT_EQ(mi->ft->associators(mi, context, result, leaf_path("a"), 0, 0, 0, 0, nullptr).rc, 0);
-    EXPECT_EQ(broker.upcalls, (std::vector<std::string>{"getInstance root/test:Test_Base",
-                                                        "getInstance root/far:Test_Base"}));
-    EXPECT_EQ(broker.returned_instances.size(), 2u);
-
-    broker.clear_results();
-    broker.upcall_status = CMPI_RC_ERR_NOT_FOUND;
-    EXPECT_EQ(mi->ft->associators(mi, context, result, leaf_path("a"), 0, 0, 0, 0, nullptr).rc, 0);
-    EXPECT_EQ(broker.upcalls.size(), 2u) << "one that is gone does not end the answer";
-    EXPECT_TRUE(broker.returned_instances.empty());
 }
 
 TEST_F(Association_Test, ReferencesToTheSource) {
@@ -255,13 +224,6 @@ TEST_F(Method_Test, ParametersReachTheProviderAndComeBack) {
     EXPECT_EQ(broker.done, 1);
 }
 
-TEST_F(Method_Test, AbsentParametersWriteNothing) {
-    EXPECT_EQ(run("Run", {}).rc, 0);
-    EXPECT_TRUE(fake::Broker::data(out).members.empty());
-    EXPECT_TRUE(broker.returned_data.empty());
-    EXPECT_EQ(broker.done, 1);
-}
-
 TEST_F(Method_Test, Refusals) {
     EXPECT_EQ(run("NoSuch", {}).rc, CMPI_RC_ERR_METHOD_NOT_FOUND);
     EXPECT_EQ(run("Name", {}).rc, CMPI_RC_ERR_METHOD_NOT_FOUND) << "a property is no method";
@@ -273,15 +235,6 @@ TEST_F(Method_Test, Refusals) {
         EXPECT_EQ(run("Run", {}).rc, rc) << status;
         EXPECT_EQ(broker.done, rc == 0);
     }
-}
-
-TEST_F(Method_Test, AMethodInstanceOfAnotherNameIsNotDispatched) {
-    const Ref<Instance> self(create(&Test_Service::static_meta_class));
-    const Ref<Instance> other(create(&Test_Base::static_meta_class));
-    EXPECT_EQ(service_registration.proc(
-                  nullptr, OP_INVOKE_METHOD, 0, reinterpret_cast<Provider_Word>(self.get()),
-                  reinterpret_cast<Provider_Word>(other.get()), 0, 0, 0, 0, 0),
-              -1);
 }
 
 // ---- Indications ----

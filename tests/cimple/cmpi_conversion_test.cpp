@@ -123,23 +123,6 @@ TYPED_TEST(Every_Type, GoesThereAndBack) {
     }
 }
 
-TYPED_TEST(Every_Type, NullStaysNull) {
-    const One_Class<TypeParam> meta;
-    const Ref<Instance> one(create(&meta.meta_class));
-    nullify(one.get(), true, true);
-    EXPECT_TRUE(this->to_instance(one.get())->members.empty());
-
-    const CMPIType type = CMPI_TYPES[Type_Of<TypeParam>::code];
-    const auto path = fake::path_data("", "One");
-    const Ref<Instance> back = make_cimple_instance(
-        this->converter, &meta.meta_class,
-        this->broker.instance(fake::instance_data(
-            path, {{"Value", fake::null(type)},
-                   {"Values", fake::null(static_cast<CMPIType>(type | CMPI_ARRAY))}})));
-    EXPECT_TRUE(is_null(back.get(), &meta.value));
-    EXPECT_TRUE(is_null(back.get(), &meta.values));
-}
-
 // ---- References and embedded objects ----
 
 TEST_F(Conversion_Test, ReferencesGoAsPathsInTheirOwnNamespace) {
@@ -240,15 +223,6 @@ TEST_F(Conversion_Test, KeysAreNarrowedByTruncation) {
     EXPECT_TRUE(base->Slot.is_null()) << "properties are not narrowed";
 }
 
-TEST_F(Conversion_Test, PathGivesKeysOnly) {
-    const auto sub = from_path<Test_Sub>(
-        {{"id", fake::text("x")}, {"Caption", fake::text("no key")}, {"Nonsense", fake::text("")}});
-    EXPECT_STREQ(sub->Id.value.c_str(), "x") << "names compare without regard to case";
-    EXPECT_TRUE(sub->Slot.is_null());
-    EXPECT_TRUE(sub->Caption.is_null());
-    EXPECT_STREQ(sub->__name_space.c_str(), "root/test");
-}
-
 TEST_F(Conversion_Test, ABadMemberFailsAlone) {
     const auto null_string = fake::object(CMPI_string, nullptr);
     const auto types = from_instance<Test_Types>({
@@ -322,40 +296,7 @@ TEST_F(Conversion_Test, StringArgumentsAreCastToSmallScalars) {
     EXPECT_STREQ(parse_argument<String>(broker, "12").value.c_str(), "12");
 }
 
-TEST_F(Conversion_Test, MethodParametersByDirection) {
-    const Ref<Instance> owner =
-        make_method_instance(converter, &Test_Service_Run_method::static_meta_class,
-                             broker.args({{"Level", fake::number(CMPI_uint32, 4)},
-                                          {"Answer", fake::text("an output is not read")}}));
-    auto* method = static_cast<Test_Service_Run_method*>(owner.get());
-    EXPECT_EQ(method->Level.value, 4u);
-    EXPECT_TRUE(method->Answer.is_null());
-
-    method->Answer.set("done");
-    method->return_value.set(9);
-    CMPIArgs* args = broker.args();
-    CMPIValue value;
-    CMPIType type;
-    EXPECT_EQ(make_method_out(&broker.broker, "", method, args, value, type), 0);
-    EXPECT_EQ(type, CMPI_uint32);
-    EXPECT_EQ(value.uint32, 9u);
-    ASSERT_EQ(fake::Broker::data(args).members.size(), 1u) << "neither inputs nor the return value";
-    EXPECT_EQ(fake::Broker::data(args).string("Answer"), "done");
-}
-
 // ---- To CMPI ----
-
-TEST_F(Conversion_Test, PropertyListComesWithTheKeys) {
-    const Ref<Test_Sub> sub(create_null<Test_Sub>());
-    sub->Id.set("i");
-    sub->Caption.set("c");
-    sub->State.set(2);
-    const char* properties[] = {"State", nullptr};
-    const fake::Data_Ref sent = to_instance(sub.get(), properties);
-    EXPECT_TRUE(sent->find("State"));
-    EXPECT_TRUE(sent->find("Id"));
-    EXPECT_FALSE(sent->find("Caption"));
-}
 
 // Each function of the broker fails, always and at each of its calls: nothing is lost but what
 // could not be converted, and nothing crashes.
@@ -391,14 +332,6 @@ TEST_F(Conversion_Test, FailuresOfTheBroker) {
             EXPECT_EQ(broker.live(), 0) << function << n;
         }
     }
-}
-
-TEST(Type_Words, NameEveryCode) {
-    EXPECT_STREQ(type_word(TYPE_NONE), "NONE");
-    EXPECT_STREQ(type_word(TYPE_UINT8), "UINT8");
-    EXPECT_STREQ(type_word(0x8E), "INSTANCE_ARRAY");
-    EXPECT_EQ(from_cmpi_type(CMPI_refA), 0x8E);
-    EXPECT_EQ(from_cmpi_type(CMPI_chars), TYPE_NONE);
 }
 
 } // namespace

@@ -15,23 +15,9 @@ sint32 Script::run(int operation) {
 
 sint32 Script::deliver(int operation, const Instance_Handler& handler) {
     const sint32 answer = run(operation);
-    std::vector<const Instance*> all;
     for (const Ref<Instance>& instance : instances)
-        all.push_back(instance.get());
-    if (store && handler.focus()) {
-        all.clear();
-        if (const auto wanted = store->narrow(*handler.focus()))
-            for (uint32 position : *wanted)
-                all.push_back(store->at(position));
-        else
-            for (uint32 i = 0; i < store->size(); ++i)
-                all.push_back(store->at(i));
-    }
-    for (const Instance* instance : all) {
-        ++delivered;
-        if (!handler.handle(clone(instance)))
+        if (!handler.handle(clone(instance.get())))
             break;
-    }
     return answer;
 }
 

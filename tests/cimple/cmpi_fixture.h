@@ -4,7 +4,6 @@
 #define TESTS_CIMPLE_CMPI_FIXTURE_H
 
 #include "cimple/cmpi_adapter.h"
-#include "cimple/instance_map.h"
 #include "cimple/provider_proc.h"
 #include "tests/cimple/fake_broker.h"
 #include "tests/cimple/test_schema.h"
@@ -23,10 +22,6 @@ struct Script {
     std::vector<Ref<Instance>> instances;  // what enumerations deliver, as clones
     std::function<void(int operation)> on; // runs inside the operation; may throw
     std::vector<int> operations;           // what was called
-    // Enumerations deliver from this store instead, and no more than the receiver looks at.
-    Instance_Map_Base* store = nullptr;
-    std::size_t delivered = 0; // instances, by all enumerations
-    Instance_Proc forward = nullptr;
 
     Ref<Instance> model; // clones of what an operation was given
     Ref<Instance> instance;

@@ -36,11 +36,6 @@ TEST_F(Cmpi_Test, FactoryFillsTheTables) {
     EXPECT_EQ(script.count(OP_LOAD), 1);
 }
 
-TEST_F(Cmpi_Test, LongNamesAreCut) {
-    interface<void>(base_registration, 'I', std::string(300, 'n').c_str());
-    EXPECT_EQ(std::strlen(blocks[&base_registration].association_name), 255u);
-}
-
 TEST_F(Cmpi_Test, CleanupCountsDownAndLoadsAnew) {
     auto* mi = instance_mi();
     auto* method = interface<CMPIMethodMI>(base_registration, 'M');
@@ -266,33 +261,6 @@ TEST_F(Status_Test, EveryProviderStatusHasItsCode) {
 
 // ---- The functions ----
 
-TEST_F(Cmpi_Test, UnknownClassesFail) {
-    auto* mi = instance_mi();
-    CMPIObjectPath* path = broker.path("root/test", "No_Such_Class");
-    EXPECT_EQ(mi->ft->enumerateInstances(mi, context, result, path, nullptr).rc, 1);
-    EXPECT_EQ(mi->ft->deleteInstance(mi, context, result, path).rc, 1);
-    EXPECT_EQ(mi->ft->execQuery(mi, context, result, path, "SELECT", "WQL").rc, 7);
-    EXPECT_EQ(script.operations, std::vector<int>{OP_LOAD});
-}
-
-TEST_F(Cmpi_Test, EnumerationDeliversEachInstanceAndItsPath) {
-    auto* mi = instance_mi();
-    auto* first = make_base("a", 1);
-    first->Caption.set("one");
-    script.instances = {first, make_base("b", 2)};
-    EXPECT_EQ(mi->ft->enumerateInstances(mi, context, result, base_path(), nullptr).rc, 0);
-    ASSERT_EQ(broker.returned_instances.size(), 2u);
-    EXPECT_EQ(broker.returned_instances[0]->string("Caption"), "one");
-    EXPECT_FALSE(broker.returned_instances[1]->find("Caption")) << "null properties are not set";
-    EXPECT_EQ(broker.returned_instances[1]->path->name_space, "root/test");
-    EXPECT_EQ(broker.returned_instances[1]->path->find("Slot")->scalar.uint32, 2u);
-    EXPECT_TRUE(script.model->__meta_class == &Test_Base::static_meta_class);
-
-    const char* properties[] = {"Caption", nullptr};
-    mi->ft->enumerateInstances(mi, context, result, base_path(), properties);
-    EXPECT_FALSE(cast<Test_Base>(script.model.get())->Caption.is_null()) << "the model asks for it";
-}
-
 TEST_F(Cmpi_Test, AConversionErrorStopsTheStreamButNotTheCall) {
     auto* mi = instance_mi();
     script.instances = {make_base("a", 1), make_base("b", 2), make_base("c", 3)};
@@ -300,44 +268,6 @@ TEST_F(Cmpi_Test, AConversionErrorStopsTheStreamButNotTheCall) {
     EXPECT_EQ(mi->ft->enumerateInstances(mi, context, result, base_path(), nullptr).rc, 0);
     EXPECT_EQ(broker.returned_instances.size(), 1u);
     EXPECT_EQ(broker.done, 1);
-}
-
-TEST_F(Cmpi_Test, GetInstanceFallsBackOnEnumeration) {
-    auto* mi = instance_mi();
-    script.status[OP_GET_INSTANCE] = GET_INSTANCE_UNSUPPORTED;
-    auto* sub = create_null<Test_Sub>(); // a subclass with the same keys matches as well
-    sub->Id.set("b");
-    sub->Slot.set(2);
-    sub->State.set(4);
-    script.instances = {make_base("a", 1), sub, make_base("b", 2)};
-    EXPECT_EQ(mi->ft->getInstance(mi, context, result, base_path("b", 2), nullptr).rc, 0);
-    ASSERT_EQ(broker.returned_instances.size(), 1u);
-    EXPECT_EQ(broker.returned_instances[0]->path->text, "Test_Sub");
-    EXPECT_EQ(broker.returned_instances[0]->find("State")->scalar.uint16, 4);
-
-    EXPECT_EQ(mi->ft->getInstance(mi, context, result, base_path("b", 3), nullptr).rc,
-              CMPI_RC_ERR_NOT_FOUND);
-    script.status[OP_GET_INSTANCE] = 0;
-    script.instances.clear();
-    EXPECT_EQ(mi->ft->getInstance(mi, context, result, base_path("b", 2), nullptr).rc,
-              CMPI_RC_ERR_FAILED)
-        << "a provider that says yes and gives nothing";
-}
-
-TEST_F(Cmpi_Test, ModifyHandsOverAModelOfWhatIsToChange) {
-    auto* mi = instance_mi();
-    CMPIInstance* source = broker.instance(
-        fake::instance_data(base_data("a", 1), {{"Id", fake::text("a")},
-                                                {"Slot", fake::number(CMPI_uint32, 1)},
-                                                {"Caption", fake::text("new")}}));
-    const char* properties[] = {"caption", nullptr};
-    CMPIObjectPath* path = broker.path(
-        "root/test", "Test_Sub", {{"Id", fake::text("a")}, {"Slot", fake::number(CMPI_uint64, 1)}});
-    EXPECT_EQ(mi->ft->modifyInstance(mi, context, result, path, source, properties).rc, 0);
-    EXPECT_FALSE(cast<Test_Sub>(script.model.get())->Caption.is_null());
-    EXPECT_TRUE(cast<Test_Sub>(script.model.get())->State.is_null());
-    EXPECT_STREQ(cast<Test_Sub>(script.instance.get())->Caption.value.c_str(), "new");
-    EXPECT_EQ(broker.returned_paths[0]->text, "Test_Sub");
 }
 
 // The object manager may send the instances of a base class: the provider sees its own class.

@@ -80,18 +80,6 @@ TEST_F(Log_Death_Test, OffUnlessTurnedOn) {
         EXPECT_EQ(log_of(settings, one_of_each), "-") << (settings ? settings : "no CIMPLE_HOME");
 }
 
-TEST_F(Log_Death_Test, WarningsHaveASwitch) {
-    const std::string log = log_of("LOG_LEVEL=INFO\n", [] {
-        EXPECT_EQ(set_log_enabled(true), -1);
-        EXPECT_EQ(set_log_enabled(false), 0);
-        CIMPLE_WARN("hidden");
-        set_log_enabled(true);
-        CIMPLE_WARN("shown");
-    });
-    EXPECT_EQ(log.find("hidden"), std::string::npos);
-    EXPECT_NE(log.find("shown"), std::string::npos);
-}
-
 // The trace of calls tells more than the answers do.
 TEST_F(Log_Death_Test, CallsAreTraced) {
     const std::string log = log_of("LOG_LEVEL=DBG\n", [this] {

@@ -60,26 +60,6 @@ TEST(Mutex_Death_Test, LockOrderIsAsserted) {
 #endif
 }
 
-TEST(Cond_Test, BroadcastWakesTheWaiters) {
-    Mutex mutex;
-    Cond cond;
-    int ready = 0;
-    std::vector<std::thread> waiters;
-    for (int i = 0; i < 3; i++)
-        waiters.emplace_back([&] {
-            const Auto_Mutex guard(mutex);
-            while (!ready)
-                cond.wait(mutex);
-        });
-    {
-        const Auto_Mutex guard(mutex);
-        ready = 1;
-        cond.broadcast();
-    }
-    for (std::thread& waiter : waiters)
-        waiter.join();
-}
-
 // ---- Threads ----
 
 void* answer(void* argument) {
@@ -148,32 +128,6 @@ TEST_F(Cmpi_Test, AnUnstartedThreadsContextIsGivenBack) {
     const int before = broker.live();
     delete parent.thread_create_hook(nullptr);
     EXPECT_EQ(broker.live(), before);
-}
-
-TEST_F(Cmpi_Test, ContextsStack) {
-    CMPI_Thread_Context outer(&broker.broker, context, nullptr);
-    CMPI_Thread_Context inner(&broker.broker, context, nullptr);
-    Thread_Context::pop();
-    Thread_Context::push(&outer);
-    Thread_Context::push(&inner);
-    EXPECT_EQ(Thread_Context::top(), &inner);
-    Thread_Context::pop();
-    EXPECT_EQ(Thread_Context::top(), &outer);
-    Thread_Context::pop();
-    Thread_Context::pop();
-    EXPECT_EQ(Thread_Context::top(), nullptr);
-}
-
-TEST(Time_Test, TheClockIsReplaceable) {
-    static uint64 slept = 0;
-    const Time::Clock clock = {[]() -> uint64 { return 42 + slept; },
-                               [](uint64 usec) { slept += usec; }};
-    Time::replace_clock(&clock);
-    Time::sleep(8);
-    EXPECT_EQ(Time::now(), 50u);
-    Time::replace_clock(nullptr);
-    EXPECT_GT(Time::now(), 1700000000000000u);
-    Time::sleep(1);
 }
 
 // A clock that has no pauses of its own leaves them to the host's time.
@@ -324,14 +278,6 @@ TEST_F(Cimom_Test, MethodsOfOthers) {
         Thread_Context::pop();
     }
     EXPECT_EQ(broker.upcalls.size(), 2u);
-}
-
-TEST_F(Cimom_Test, UserName) {
-    String user;
-    EXPECT_FALSE(cimom::get_username(user));
-    broker.principal = "root";
-    EXPECT_TRUE(cimom::get_username(user));
-    EXPECT_STREQ(user.c_str(), "root");
 }
 
 } // namespace

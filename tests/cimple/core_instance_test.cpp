@@ -28,19 +28,6 @@ Test_Holder* make_holder() {
     return holder;
 }
 
-TEST(Instance, IsEmptyAndNotNullWithoutDefaults) {
-    Ref<Test_Types> types(create<Test_Types>());
-    EXPECT_EQ(types->__magic, INSTANCE_MAGIC);
-    EXPECT_EQ(types->__refs, 1u);
-    EXPECT_TRUE(types->__name_space.empty());
-    for (uint32 i = 0; i < Test_Types::static_meta_class.num_meta_features; ++i)
-        EXPECT_FALSE(is_null(types.get(), Test_Types::static_meta_class.meta_features[i])) << i;
-    EXPECT_EQ(types->U64.value, 0u);
-    EXPECT_TRUE(types->Str.value.empty());
-    EXPECT_TRUE(types->Date.value == Datetime());
-    EXPECT_TRUE(types->Numbers.value.empty());
-}
-
 TEST(Instance, TakesDefaultsAndIsNullWithoutOne) {
     Ref<Test_Types> types(create<Test_Types>(true));
     EXPECT_TRUE(types->Numbers.value == (Array<uint32>{1, 2}));
@@ -85,16 +72,6 @@ TEST(Instance, ClonesShareNothingThatChanges) {
     Ref<Test_Link> link(create<Test_Link>());
     Ref<Test_Link> unlinked(clone(link.get()));
     EXPECT_EQ(unlinked->Left, nullptr);
-}
-
-TEST(Instance, RefChecksTheClass) {
-    Test_Base* base = make_base("b", 1);
-    EXPECT_FALSE(Ref<Test_Sub>(base)); // takes the count all the same
-    Ref<Test_Base> sub(create<Test_Sub>());
-    Ref<Test_Base> second(sub);
-    EXPECT_EQ(sub->__refs, 2u);
-    second.reset();
-    EXPECT_EQ(sub->__refs, 1u);
 }
 
 TEST(Instance, CopiesWhatTheModelHolds) {
@@ -151,32 +128,6 @@ TEST(Instance, ClearEmptiesEverything) {
     EXPECT_TRUE(holder->Objects.is_null());
 }
 
-TEST(Instance, NullifySelectsKeysAndOthers) {
-    Ref<Test_Base> base(make_base("a", 1));
-    base->Caption.set("c");
-    nullify_non_keys(base.get());
-    EXPECT_TRUE(base->Caption.is_null() && !base->Id.is_null());
-    EXPECT_TRUE(keys_all_set(base.get()));
-    nullify_keys(base.get());
-    EXPECT_TRUE(base->Id.is_null() && base->Slot.is_null());
-    EXPECT_FALSE(keys_all_set(base.get()));
-    nullify(base.get(), true, true, 0);
-    EXPECT_EQ(base->Id.value, String("a")); // only the flag had gone
-    Ref<Test_Link> link(create<Test_Link>());
-    EXPECT_FALSE(keys_all_set(link.get()));
-}
-
-TEST(Instance, NameSpaceIsSetThroughTheWholeTree) {
-    Ref<Test_Holder> holder(make_holder());
-    holder->Object->__name_space = "root/other";
-    set_name_space_recursive(holder.get(), "root/vorlan", false);
-    EXPECT_EQ(holder->__name_space, String("root/vorlan"));
-    EXPECT_EQ(holder->Object->__name_space, String("root/other"));
-    EXPECT_EQ(holder->Objects.value[2]->__name_space, String("root/vorlan"));
-    set_name_space_recursive(holder.get(), "root/x", true);
-    EXPECT_EQ(holder->Object->__name_space, String("root/x"));
-}
-
 TEST(Instance, FilterKeepsWhatIsNamed) {
     Ref<Test_Holder> holder(make_holder());
     holder->Count.set(3);
@@ -204,16 +155,6 @@ TEST(Instance, FilterKeepsWhatIsNamed) {
     Ref<Test_Service> service(create<Test_Service>());
     const char* const method[] = {"Run", nullptr};
     EXPECT_EQ(filter_properties(service.get(), method, true), -1);
-}
-
-TEST(Instance, ModelHasTheKeysOnly) {
-    Ref<Test_Base> base(make_base("a", 1));
-    base->Caption.set("c");
-    Ref<Test_Base> model(create_model(base->__meta_class, base.get()));
-    EXPECT_EQ(model->Id.value, String("a"));
-    EXPECT_TRUE(model->Caption.is_null());
-    Ref<Test_Base> other(create_model(&Test_Sub::static_meta_class, base.get()));
-    EXPECT_TRUE(other->Id.is_null());
 }
 
 std::string printed(const Instance* instance, bool keys_only) {

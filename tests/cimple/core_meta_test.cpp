@@ -49,42 +49,6 @@ TEST(Meta, SubclassesAreRelatedByPointerOrName) {
     EXPECT_EQ(is_subclass_by_name(&test_repository, nullptr, "Test_Base"), -1);
 }
 
-TEST(Meta, TypeAndFlagWordsRoundTrip) {
-    for (uint32 type = 0; type < NUM_TYPES; ++type)
-        EXPECT_EQ(type_name_to_code(type_name(type)), static_cast<Type>(type));
-    EXPECT_EQ(type_name_to_code("UINT64"), TYPE_UINT64);
-    EXPECT_EQ(type_name_to_code("uint128"), TYPE_NONE);
-    EXPECT_EQ(type_name_to_code(nullptr), TYPE_NONE);
-    for (uint32 bit = 0; bit < 32; ++bit)
-        EXPECT_EQ(flag_by_name(flag_name(bit)), 1u << bit);
-    EXPECT_STREQ(flag_name(21), "Key");
-    EXPECT_EQ(flag_by_name("embeddedinstance"), FLAG_EMBEDDED_INSTANCE);
-    EXPECT_EQ(flag_by_name("Nothing"), 0u);
-}
-
-TEST(Meta, StaticClassesAreNeverCounted) {
-    const Meta_Class* base = &Test_Base::static_meta_class;
-    ref(base);
-    EXPECT_EQ(base->refs, 0u);
-    unref(base);
-    unref(base);
-    EXPECT_EQ(base->refs, 0u);
-    unref(static_cast<const Meta_Class*>(nullptr));
-}
-
-TEST(Meta, ClassWithoutBaseIsEmpty) {
-    Meta_Class* made = create_meta_class("Made", nullptr, FLAG_CLASS | FLAG_INDICATION);
-    EXPECT_EQ(made->refs, 1u);
-    EXPECT_EQ(made->size, sizeof(Instance));
-    EXPECT_EQ(made->flags, FLAG_CLASS | FLAG_INDICATION);
-    Instance* instance = create(made, true);
-    EXPECT_EQ(made->refs, 2u);
-    EXPECT_TRUE(keys_all_set(instance));
-    destroy(instance);
-    EXPECT_EQ(made->refs, 1u);
-    unref(made);
-}
-
 TEST(Meta, ClassWithBaseIsADeepCopy) {
     for (const Meta_Class* base :
          {&Test_Root::static_meta_class, &Test_Types::static_meta_class,
@@ -149,40 +113,14 @@ std::string printed(const Meta_Class& meta_class, const Print_Options& options =
     return testing::internal::GetCapturedStdout();
 }
 
-TEST(Meta, PrintsClasses) {
-    EXPECT_EQ(printed(Test_Sub::static_meta_class), "class Test_Sub : Test_Base\n"
-                                                    "{\n"
-                                                    "    string Id = NULL;\n"
-                                                    "    uint32 Slot = NULL;\n"
-                                                    "    string Caption = NULL;\n"
-                                                    "    uint16 State = 5;\n"
-                                                    "};\n");
+TEST(Meta, Prints) {
     EXPECT_EQ(printed(Test_Sub::static_meta_class, {.local_only = true}),
               "class Test_Sub : Test_Base\n"
               "{\n"
               "    uint16 State = 5;\n"
               "};\n");
     const std::string types = printed(Test_Types::static_meta_class);
-    EXPECT_NE(types.find("    uint32 Numbers[] = {1, 2};\n"), std::string::npos) << types;
     EXPECT_NE(types.find("    string Names[2] = {\"a\", \"b\"};\n"), std::string::npos) << types;
-    EXPECT_EQ(printed(Test_Holder::static_meta_class), "class Test_Holder\n"
-                                                       "{\n"
-                                                       "    string Id = NULL;\n"
-                                                       "    Test_Base ref Object;\n"
-                                                       "    Test_Base ref Objects[];\n"
-                                                       "    uint32 Count = NULL;\n"
-                                                       "};\n");
-}
-
-TEST(Meta, PrintsMethodsAndQualifiers) {
-    EXPECT_EQ(printed(Test_Service::static_meta_class), "class Test_Service\n"
-                                                        "{\n"
-                                                        "    string Name = NULL;\n"
-                                                        "    uint32 Run(\n"
-                                                        "        uint32 Level,\n"
-                                                        "        Test_Base ref Target,\n"
-                                                        "        string Answer);\n"
-                                                        "};\n");
     EXPECT_EQ(printed(Test_Service::static_meta_class, {.qualifiers = true}),
               "class Test_Service\n"
               "{\n"
@@ -211,18 +149,6 @@ TEST(Meta, PrintsMethodsAndQualifiers) {
     EXPECT_NE(printed(Test_Sub::static_meta_class, {.local_only = true, .qualifiers = true})
                   .find("    [Read(False),\n     Values({\"a\", \"b\"})]\n"),
               std::string::npos);
-}
-
-TEST(MetaDeathTest, MethodWithoutFeaturesIsNoMethod) {
-    static const Meta_Method empty{{{{0}, FLAG_METHOD, "Empty", nullptr, 0}, nullptr, 0, 0}, 0};
-    static const Meta_Feature* const features[] = {&empty};
-    static const Meta_Class broken{
-        {{{0}, FLAG_CLASS, "Broken", nullptr, 0}, features, 1, sizeof(Instance)},
-        nullptr,
-        nullptr,
-        0,
-        nullptr};
-    EXPECT_DEATH(print(&broken), "assert: mm->num_meta_features > 0");
 }
 
 } // namespace

@@ -5,6 +5,9 @@
 #include <cstring>
 #include <mutex>
 
+// What the engine does not call is left out of the tables.
+#pragma GCC diagnostic ignored "-Wmissing-field-initializers"
+
 namespace fake {
 
 // Every CMPI object is a pair of pointers; this one knows the rest.
@@ -162,105 +165,91 @@ CMPICount count_members(const void* container, const char* function, CMPIStatus*
 // ---- Tables of objects ----
 
 CMPIInstanceFT instance_table = {
-    CMPICurrentVersion,
-    release<CMPIInstance>,
-    nullptr,
-    nullptr,
-    [](const CMPIInstance* i, CMPICount index, CMPIString** name, CMPIStatus* status) {
-        return get_member_at(i, "getPropertyAt", index, name, status);
-    },
-    [](const CMPIInstance* i, CMPIStatus* status) {
-        return count_members(i, "getPropertyCount", status);
-    },
-    [](const CMPIInstance* i, const char* name, const CMPIValue* value, CMPIType type) {
-        return set_member(i, "setProperty", name, value, type);
-    },
-    [](const CMPIInstance* i, CMPIStatus* status) {
-        return get(i, "getObjectPath", status, [i](const Data& held) {
-            return reinterpret_cast<CMPIObjectPath*>(owner(i).make(&path_table, held.path));
-        });
-    },
-    [](CMPIInstance* i, const char** properties, const char** keys) {
-        std::vector<std::string> names;
-        for (const char** list : {properties, keys})
-            for (; list && *list; list++)
-                names.emplace_back(*list);
-        data(i).filter = names;
-        return OK;
-    },
-    nullptr,
+    .ftVersion = CMPICurrentVersion,
+    .release = release<CMPIInstance>,
+    .getPropertyAt =
+        [](const CMPIInstance* i, CMPICount index, CMPIString** name, CMPIStatus* status) {
+            return get_member_at(i, "getPropertyAt", index, name, status);
+        },
+    .getPropertyCount =
+        [](const CMPIInstance* i, CMPIStatus* status) {
+            return count_members(i, "getPropertyCount", status);
+        },
+    .setProperty = [](const CMPIInstance* i, const char* name, const CMPIValue* value,
+                      CMPIType type) { return set_member(i, "setProperty", name, value, type); },
+    .getObjectPath =
+        [](const CMPIInstance* i, CMPIStatus* status) {
+            return get(i, "getObjectPath", status, [i](const Data& held) {
+                return reinterpret_cast<CMPIObjectPath*>(owner(i).make(&path_table, held.path));
+            });
+        },
+    .setPropertyFilter =
+        [](CMPIInstance* i, const char** properties, const char** keys) {
+            std::vector<std::string> names;
+            for (const char** list : {properties, keys})
+                for (; list && *list; list++)
+                    names.emplace_back(*list);
+            data(i).filter = names;
+            return OK;
+        },
 };
 
 CMPIObjectPathFT path_table = {
-    CMPICurrentVersion,
-    release<CMPIObjectPath>,
-    nullptr,
-    nullptr,
-    [](const CMPIObjectPath* p, CMPIStatus* status) {
-        return get(p, "getNameSpace", status,
-                   [p](const Data& held) { return make_string(owner(p), held.name_space); });
-    },
-    nullptr,
-    nullptr,
-    nullptr,
-    [](const CMPIObjectPath* p, CMPIStatus* status) {
-        return get(p, "getClassName", status,
-                   [p](const Data& held) { return make_string(owner(p), held.text); });
-    },
-    [](CMPIObjectPath* p, const char* name, const CMPIValue* value, CMPIType type) {
-        return set_member(p, "addKey", name, value, type);
-    },
-    nullptr,
-    [](const CMPIObjectPath* p, CMPICount index, CMPIString** name, CMPIStatus* status) {
-        return get_member_at(p, "getKeyAt", index, name, status);
-    },
-    [](const CMPIObjectPath* p, CMPIStatus* status) {
-        return count_members(p, "getKeyCount", status);
-    },
-    nullptr,
-    nullptr,
-    nullptr,
-    nullptr,
-    nullptr,
-    nullptr,
-    nullptr,
+    .ftVersion = CMPICurrentVersion,
+    .release = release<CMPIObjectPath>,
+    .getNameSpace =
+        [](const CMPIObjectPath* p, CMPIStatus* status) {
+            return get(p, "getNameSpace", status,
+                       [p](const Data& held) { return make_string(owner(p), held.name_space); });
+        },
+    .getClassName =
+        [](const CMPIObjectPath* p, CMPIStatus* status) {
+            return get(p, "getClassName", status,
+                       [p](const Data& held) { return make_string(owner(p), held.text); });
+        },
+    .addKey = [](CMPIObjectPath* p, const char* name, const CMPIValue* value,
+                 CMPIType type) { return set_member(p, "addKey", name, value, type); },
+    .getKeyAt =
+        [](const CMPIObjectPath* p, CMPICount index, CMPIString** name, CMPIStatus* status) {
+            return get_member_at(p, "getKeyAt", index, name, status);
+        },
+    .getKeyCount = [](const CMPIObjectPath* p,
+                      CMPIStatus* status) { return count_members(p, "getKeyCount", status); },
 };
 
 CMPIArgsFT args_table = {
-    CMPICurrentVersion,
-    release<CMPIArgs>,
-    nullptr,
-    [](const CMPIArgs* a, const char* name, const CMPIValue* value, CMPIType type) {
-        return set_member(a, "addArg", name, value, type);
-    },
-    nullptr,
-    [](const CMPIArgs* a, CMPICount index, CMPIString** name, CMPIStatus* status) {
-        return get_member_at(a, "getArgAt", index, name, status);
-    },
-    [](const CMPIArgs* a, CMPIStatus* status) { return count_members(a, "getArgCount", status); },
+    .ftVersion = CMPICurrentVersion,
+    .release = release<CMPIArgs>,
+    .addArg = [](const CMPIArgs* a, const char* name, const CMPIValue* value,
+                 CMPIType type) { return set_member(a, "addArg", name, value, type); },
+    .getArgAt =
+        [](const CMPIArgs* a, CMPICount index, CMPIString** name, CMPIStatus* status) {
+            return get_member_at(a, "getArgAt", index, name, status);
+        },
+    .getArgCount = [](const CMPIArgs* a,
+                      CMPIStatus* status) { return count_members(a, "getArgCount", status); },
 };
 
 CMPIStringFT string_table = {
-    CMPICurrentVersion,
-    release<CMPIString>,
-    nullptr,
-    [](const CMPIString* s, CMPIStatus* status) {
-        return get(s, "getCharPtr", status, [](const Data& held) { return held.text.c_str(); });
-    },
+    .ftVersion = CMPICurrentVersion,
+    .release = release<CMPIString>,
+    .getCharPtr =
+        [](const CMPIString* s, CMPIStatus* status) {
+            return get(s, "getCharPtr", status, [](const Data& held) { return held.text.c_str(); });
+        },
 };
 
 CMPIArrayFT array_table = {
-    CMPICurrentVersion,
-    release<CMPIArray>,
-    nullptr,
-    [](const CMPIArray* a, CMPIStatus* status) {
-        const std::lock_guard guard(the_mutex);
-        if (owner(a).fails("getSize"))
-            set(status, FAILED);
-        return static_cast<CMPICount>(data(a).elements.size());
-    },
-    nullptr,
-    [](const CMPIArray* a, CMPICount index, CMPIStatus* status) -> CMPIData {
+    .ftVersion = CMPICurrentVersion,
+    .release = release<CMPIArray>,
+    .getSize =
+        [](const CMPIArray* a, CMPIStatus* status) {
+            const std::lock_guard guard(the_mutex);
+            if (owner(a).fails("getSize"))
+                set(status, FAILED);
+            return static_cast<CMPICount>(data(a).elements.size());
+        },
+    .getElementAt = [](const CMPIArray* a, CMPICount index, CMPIStatus* status) -> CMPIData {
         const std::lock_guard guard(the_mutex);
         if (owner(a).fails("getElementAt") || index >= data(a).elements.size()) {
             set(status, FAILED);
@@ -268,51 +257,47 @@ CMPIArrayFT array_table = {
         }
         return load(owner(a), data(a).elements[index]);
     },
-    [](CMPIArray* a, CMPICount index, const CMPIValue* value, CMPIType type) {
-        const std::lock_guard guard(the_mutex);
-        if (owner(a).fails("setElementAt") || index >= data(a).elements.size())
-            return FAILED;
-        data(a).elements[index] = store(value, type);
-        if (value && is_object(type))
-            owner(a).keep(handle(static_cast<void*>(value->inst)));
-        return OK;
-    },
+    .setElementAt =
+        [](CMPIArray* a, CMPICount index, const CMPIValue* value, CMPIType type) {
+            const std::lock_guard guard(the_mutex);
+            if (owner(a).fails("setElementAt") || index >= data(a).elements.size())
+                return FAILED;
+            data(a).elements[index] = store(value, type);
+            if (value && is_object(type))
+                owner(a).keep(handle(static_cast<void*>(value->inst)));
+            return OK;
+        },
 };
 
 CMPIDateTimeFT datetime_table = {
-    CMPICurrentVersion,
-    release<CMPIDateTime>,
-    nullptr,
-    nullptr,
-    [](const CMPIDateTime* d, CMPIStatus* status) {
-        return get(d, "getStringFormat", status,
-                   [d](const Data& held) { return make_string(owner(d), held.text); });
-    },
-    nullptr,
+    .ftVersion = CMPICurrentVersion,
+    .release = release<CMPIDateTime>,
+    .getStringFormat =
+        [](const CMPIDateTime* d, CMPIStatus* status) {
+            return get(d, "getStringFormat", status,
+                       [d](const Data& held) { return make_string(owner(d), held.text); });
+        },
 };
 
 CMPIEnumerationFT enumeration_table = {
-    CMPICurrentVersion,
-    release<CMPIEnumeration>,
-    nullptr,
-    [](const CMPIEnumeration* e, CMPIStatus* status) -> CMPIData {
+    .ftVersion = CMPICurrentVersion,
+    .release = release<CMPIEnumeration>,
+    .getNext = [](const CMPIEnumeration* e, CMPIStatus* status) -> CMPIData {
         const std::lock_guard guard(the_mutex);
         if (owner(e).fails("getNext"))
             set(status, FAILED);
         Handle* state = const_cast<Handle*>(handle(e));
         return load(owner(e), data(e).elements[state->position++]);
     },
-    [](const CMPIEnumeration* e, CMPIStatus*) -> CMPIBoolean {
+    .hasNext = [](const CMPIEnumeration* e, CMPIStatus*) -> CMPIBoolean {
         return handle(e)->position < data(e).elements.size();
     },
-    nullptr,
 };
 
 CMPIContextFT context_table = {
-    CMPICurrentVersion,
-    release<CMPIContext>,
-    nullptr,
-    [](const CMPIContext* c, const char* name, CMPIStatus* status) -> CMPIData {
+    .ftVersion = CMPICurrentVersion,
+    .release = release<CMPIContext>,
+    .getEntry = [](const CMPIContext* c, const char* name, CMPIStatus* status) -> CMPIData {
         const std::lock_guard guard(the_mutex);
         if (std::strcmp(name, CMPIPrincipal) != 0 || owner(c).principal.empty()) {
             set(status, {CMPI_RC_ERR_NOT_FOUND, nullptr});
@@ -320,33 +305,33 @@ CMPIContextFT context_table = {
         }
         return load(owner(c), text(owner(c).principal.c_str()));
     },
-    nullptr,
-    nullptr,
-    nullptr,
 };
 
 CMPIResultFT result_table = {
-    CMPICurrentVersion,
-    release<CMPIResult>,
-    nullptr,
-    [](const CMPIResult* r, const CMPIValue* value, CMPIType type) {
-        owner(r).returned_data.push_back(store(value, type));
-        return OK;
-    },
-    [](const CMPIResult* r, const CMPIInstance* i) {
-        const std::lock_guard guard(the_mutex);
-        owner(r).returned_instances.push_back(handle(i)->data);
-        return OK;
-    },
-    [](const CMPIResult* r, const CMPIObjectPath* p) {
-        const std::lock_guard guard(the_mutex);
-        owner(r).returned_paths.push_back(handle(p)->data);
-        return OK;
-    },
-    [](const CMPIResult* r) {
-        owner(r).done++;
-        return OK;
-    },
+    .ftVersion = CMPICurrentVersion,
+    .release = release<CMPIResult>,
+    .returnData =
+        [](const CMPIResult* r, const CMPIValue* value, CMPIType type) {
+            owner(r).returned_data.push_back(store(value, type));
+            return OK;
+        },
+    .returnInstance =
+        [](const CMPIResult* r, const CMPIInstance* i) {
+            const std::lock_guard guard(the_mutex);
+            owner(r).returned_instances.push_back(handle(i)->data);
+            return OK;
+        },
+    .returnObjectPath =
+        [](const CMPIResult* r, const CMPIObjectPath* p) {
+            const std::lock_guard guard(the_mutex);
+            owner(r).returned_paths.push_back(handle(p)->data);
+            return OK;
+        },
+    .returnDone =
+        [](const CMPIResult* r) {
+            owner(r).done++;
+            return OK;
+        },
 };
 
 // ---- Tables of the broker ----
@@ -376,110 +361,104 @@ CMPIStatus upcall(const CMPIBroker* broker, const std::string& name, const CMPIO
 }
 
 CMPIBrokerFT broker_table = {
-    0,
-    CMPICurrentVersion,
-    "fake",
-    [](const CMPIBroker* b, const CMPIContext*) -> CMPIContext* {
+    .brokerCapabilities = 0,
+    .brokerVersion = CMPICurrentVersion,
+    .brokerName = "fake",
+    .prepareAttachThread = [](const CMPIBroker* b, const CMPIContext*) -> CMPIContext* {
         if (self(b).fails("prepareAttachThread"))
             return nullptr;
         upcall(b, "prepareAttachThread", nullptr);
         return make_new<CMPIContext>(b, "", &context_table, std::make_shared<Data>(), nullptr);
     },
-    [](const CMPIBroker* b, const CMPIContext*) { return upcall(b, "attachThread", nullptr); },
-    [](const CMPIBroker* b, const CMPIContext* c) {
-        const CMPIStatus status = upcall(b, "detachThread", nullptr);
-        release(const_cast<CMPIContext*>(c));
-        return status;
-    },
-    [](const CMPIBroker* b, const CMPIContext*, const char* ns, const CMPIInstance* i) {
-        self(b).indications.emplace_back(ns, handle(i)->data);
-        return OK;
-    },
-    nullptr,
-    [](const CMPIBroker* b, const CMPIContext*, const CMPIObjectPath* p, const char**,
-       CMPIStatus* status) -> CMPIInstance* {
+    .attachThread = [](const CMPIBroker* b,
+                       const CMPIContext*) { return upcall(b, "attachThread", nullptr); },
+    .detachThread =
+        [](const CMPIBroker* b, const CMPIContext* c) {
+            const CMPIStatus status = upcall(b, "detachThread", nullptr);
+            release(const_cast<CMPIContext*>(c));
+            return status;
+        },
+    .deliverIndication =
+        [](const CMPIBroker* b, const CMPIContext*, const char* ns, const CMPIInstance* i) {
+            self(b).indications.emplace_back(ns, handle(i)->data);
+            return OK;
+        },
+    .getInstance = [](const CMPIBroker* b, const CMPIContext*, const CMPIObjectPath* p,
+                      const char**, CMPIStatus* status) -> CMPIInstance* {
         set(status, upcall(b, "getInstance", p));
         if (self(b).upcall_instances.empty())
             return nullptr;
         return make_new<CMPIInstance>(b, "", &instance_table, self(b).upcall_instances[0], nullptr);
     },
-    [](const CMPIBroker* b, const CMPIContext*, const CMPIObjectPath* p, const CMPIInstance* i,
-       CMPIStatus* status) -> CMPIObjectPath* {
+    .createInstance = [](const CMPIBroker* b, const CMPIContext*, const CMPIObjectPath* p,
+                         const CMPIInstance* i, CMPIStatus* status) -> CMPIObjectPath* {
         set(status, upcall(b, "createInstance", p));
         self(b).upcall_instances.push_back(handle(i)->data);
         return nullptr;
     },
-    [](const CMPIBroker* b, const CMPIContext*, const CMPIObjectPath* p, const CMPIInstance* i,
-       const char**) {
-        self(b).upcall_instances.push_back(handle(i)->data);
-        return upcall(b, "modifyInstance", p);
-    },
-    [](const CMPIBroker* b, const CMPIContext*, const CMPIObjectPath* p) {
-        return upcall(b, "deleteInstance", p);
-    },
-    nullptr,
-    [](const CMPIBroker* b, const CMPIContext*, const CMPIObjectPath* p, const char**,
-       CMPIStatus* status) {
-        set(status, upcall(b, "enumInstances", p));
-        auto made = std::make_shared<Data>();
-        for (const Data_Ref& instance : self(b).upcall_instances)
-            made->elements.push_back(object(CMPI_instance, instance));
-        return make_new<CMPIEnumeration>(b, "", &enumeration_table, made, nullptr);
-    },
-    nullptr,
-    nullptr,
-    nullptr,
-    nullptr,
-    [](const CMPIBroker* b, const CMPIContext*, const CMPIObjectPath* p, const char* method,
-       const CMPIArgs* in, CMPIArgs* out, CMPIStatus* status) -> CMPIData {
+    .modifyInstance =
+        [](const CMPIBroker* b, const CMPIContext*, const CMPIObjectPath* p, const CMPIInstance* i,
+           const char**) {
+            self(b).upcall_instances.push_back(handle(i)->data);
+            return upcall(b, "modifyInstance", p);
+        },
+    .deleteInstance = [](const CMPIBroker* b, const CMPIContext*,
+                         const CMPIObjectPath* p) { return upcall(b, "deleteInstance", p); },
+    .enumerateInstances =
+        [](const CMPIBroker* b, const CMPIContext*, const CMPIObjectPath* p, const char**,
+           CMPIStatus* status) {
+            set(status, upcall(b, "enumInstances", p));
+            auto made = std::make_shared<Data>();
+            for (const Data_Ref& instance : self(b).upcall_instances)
+                made->elements.push_back(object(CMPI_instance, instance));
+            return make_new<CMPIEnumeration>(b, "", &enumeration_table, made, nullptr);
+        },
+    .invokeMethod = [](const CMPIBroker* b, const CMPIContext*, const CMPIObjectPath* p,
+                       const char* method, const CMPIArgs* in, CMPIArgs* out,
+                       CMPIStatus* status) -> CMPIData {
         set(status, upcall(b, std::string("invokeMethod ") + method, p));
         auto arguments = std::make_shared<Data>(data(in));
         self(b).upcall_instances.push_back(arguments);
         data(out).members = self(b).method_outputs;
         return load(self(b), self(b).method_result, false);
     },
-    nullptr,
-    nullptr,
 };
 
 CMPIBrokerEncFT object_table = {
-    CMPICurrentVersion,
-    [](const CMPIBroker* b, const CMPIObjectPath* p, CMPIStatus* status) {
-        auto made = std::make_shared<Data>();
-        made->path = handle(p)->data;
-        return make_new<CMPIInstance>(b, "newInstance", &instance_table, made, status);
-    },
-    [](const CMPIBroker* b, const char* ns, const char* cn, CMPIStatus* status) {
-        return make_new<CMPIObjectPath>(b, "newObjectPath", &path_table, path_data(ns, cn), status);
-    },
-    [](const CMPIBroker* b, CMPIStatus* status) {
-        return make_new<CMPIArgs>(b, "newArgs", &args_table, std::make_shared<Data>(), status);
-    },
-    [](const CMPIBroker* b, const char* chars, CMPIStatus* status) {
-        auto made = std::make_shared<Data>();
-        made->text = chars;
-        return make_new<CMPIString>(b, "newString", &string_table, made, status);
-    },
-    [](const CMPIBroker* b, CMPICount size, CMPIType type, CMPIStatus* status) {
-        auto made = std::make_shared<Data>();
-        made->elements.resize(size, null(type));
-        return make_new<CMPIArray>(b, "newArray", &array_table, made, status);
-    },
-    nullptr,
-    nullptr,
-    [](const CMPIBroker* b, const char* chars, CMPIStatus* status) {
-        auto made = std::make_shared<Data>();
-        made->text = chars;
-        return make_new<CMPIDateTime>(b, "newDateTimeFromChars", &datetime_table, made, status);
-    },
-    nullptr,
-    nullptr,
-    nullptr,
-    nullptr,
-    nullptr,
-    nullptr,
-    nullptr,
-    nullptr,
+    .ftVersion = CMPICurrentVersion,
+    .newInstance =
+        [](const CMPIBroker* b, const CMPIObjectPath* p, CMPIStatus* status) {
+            auto made = std::make_shared<Data>();
+            made->path = handle(p)->data;
+            return make_new<CMPIInstance>(b, "newInstance", &instance_table, made, status);
+        },
+    .newObjectPath =
+        [](const CMPIBroker* b, const char* ns, const char* cn, CMPIStatus* status) {
+            return make_new<CMPIObjectPath>(b, "newObjectPath", &path_table, path_data(ns, cn),
+                                            status);
+        },
+    .newArgs =
+        [](const CMPIBroker* b, CMPIStatus* status) {
+            return make_new<CMPIArgs>(b, "newArgs", &args_table, std::make_shared<Data>(), status);
+        },
+    .newString =
+        [](const CMPIBroker* b, const char* chars, CMPIStatus* status) {
+            auto made = std::make_shared<Data>();
+            made->text = chars;
+            return make_new<CMPIString>(b, "newString", &string_table, made, status);
+        },
+    .newArray =
+        [](const CMPIBroker* b, CMPICount size, CMPIType type, CMPIStatus* status) {
+            auto made = std::make_shared<Data>();
+            made->elements.resize(size, null(type));
+            return make_new<CMPIArray>(b, "newArray", &array_table, made, status);
+        },
+    .newDateTimeFromChars =
+        [](const CMPIBroker* b, const char* chars, CMPIStatus* status) {
+            auto made = std::make_shared<Data>();
+            made->text = chars;
+            return make_new<CMPIDateTime>(b, "newDateTimeFromChars", &datetime_table, made, status);
+        },
 };
 
 } // namespace

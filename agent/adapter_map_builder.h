@@ -93,7 +93,7 @@ private:
     uint32 createNICCard(NICAdapter& adapter);
     VLNMPCA_Product* findOrMakeProduct(const NICAdapterAttributes& attributes);
     VLNMPCA_Card* CreateMPCACardInstance(const NICAdapterAttributes& attributes);
-    void updateFRUData(const NIC_Function& function);
+    void readCard(VLNMPCA_Card& card);
     void tieNewCard(NIC_Function& function);
     void conformCard(const VLNMPCA_Card& card);
     void findOrMakeConnector(NIC_Port& port);
@@ -117,7 +117,6 @@ private:
     // hardware/port_controller_maps.cpp
     void findOrMakePortController(NIC_Port& port);
     void joinPortController(const NIC_Port& port);
-    void conformPortController(const VLNMPCA_PortController& controller);
     void joinControlledBy(const NIC_Port& port);
 
     // hardware/transceiver_maps.cpp

@@ -32,6 +32,18 @@ bool set_ends(Instance* association, std::span<const Ref<Instance>> ends) {
     return true;
 }
 
+// Null, with a line in the log, if an end is null or not of the class that the reference wants.
+Ref<Instance> association_of(const Meta_Class* meta_class, std::span<const Ref<Instance>> ends) {
+    Ref<Instance> association(make_instance(meta_class));
+    if (!association) {
+        VLN_LOG(VLN_CRIT, "Could not create the instance of the Association class");
+    } else if (!set_ends(association.get(), ends)) {
+        VLN_LOG(VLN_CRIT, "Wrong input for %s", meta_class->name);
+        return {};
+    }
+    return association;
+}
+
 } // namespace
 
 Instance* make_instance(const Meta_Class* meta_class) {
@@ -67,15 +79,15 @@ Ref<Instance> association_end(const Instance* instance) {
 
 Instance* associate(Instance_Map_Base& store, std::span<const Ref<Instance>> ends,
                     const Insert_Failure& failure) {
-    Ref<Instance> association(make_instance(store.meta_class()));
-    if (!association) {
-        VLN_LOG(VLN_CRIT, "Could not create the instance of the Association class");
+    return insert_instance(store, association_of(store.meta_class(), ends), failure);
+}
+
+Instance* associate_once(Instance_Map_Base& store, const Instance* first, const Instance* second,
+                         const Insert_Failure& failure) {
+    const Ref<Instance> ends[] = {association_end(first), association_end(second)};
+    const auto association = association_of(store.meta_class(), ends);
+    if (association && store.lookup(association.get()))
         return nullptr;
-    }
-    if (!set_ends(association.get(), ends)) {
-        VLN_LOG(VLN_CRIT, "Wrong input for %s", store.meta_class()->name);
-        return nullptr;
-    }
     return insert_instance(store, association, failure);
 }
 

@@ -58,6 +58,11 @@ T* insert_instance(Instance_Map<T>& store, Ref<T> instance, const Insert_Failure
 Instance* associate(Instance_Map_Base& store, const Instance* first, const Instance* second,
                     const Insert_Failure& failure = {});
 
+// The same for two that may be joined already, by another function of the same hardware: then
+// nothing is done, and null answered without a line.
+Instance* associate_once(Instance_Map_Base& store, const Instance* first, const Instance* second,
+                         const Insert_Failure& failure = {});
+
 // What an association holds of an end: a clone, taken now. Null for no instance.
 Ref<Instance> association_end(const Instance* instance);
 

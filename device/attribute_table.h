@@ -58,6 +58,13 @@ void readRow(const Attribute_Family& family, Attribute_Buffer& buffer, Class& ob
     }
 }
 
+// For ports whose state is polled between scans: one that does not tell it is left alone there.
+template <class Class>
+void takePhysicalPortState(Class& object, uint32 value) {
+    object.PhysicalPortState = value;
+    object.tellsPhysicalPortState = true;
+}
+
 // Reads all rows in table order.
 template <class Class, std::size_t N>
 void readTable(const Attribute_Family& family, Attribute_Buffer& buffer, Class& object,

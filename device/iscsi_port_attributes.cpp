@@ -20,7 +20,7 @@ constexpr Attribute_Row<A> TABLE[] = {
     {785, "_LDTO ", &A::LDTO},
     {786, "_DefaultETO ", &A::DefaultETO},
     {801, "_MaxCDBLength", &A::MaxCDBLength},
-    {802, "_PhysicalPortState", &A::PhysicalPortState},
+    {802, "_PhysicalPortState", takePhysicalPortState<A>},
     {804, "_PermanentMACAddress", &A::PermanentMACAddress},
     {805, "_CurrentMTU ", &A::CurrentMTU},
     {815, "_FuncPortSpeed", &A::FuncPortSpeed},

@@ -15,7 +15,7 @@ constexpr Attribute_Row<A> TABLE[] = {
     {779, "_PortSpeed", &A::PortSpeed},
     {784, "_MaximumMTU", &A::MaximumMTU},
     {800, "_FunctionType", &A::FunctionType},
-    {802, "_PhysicalPortState", &A::PhysicalPortState},
+    {802, "_PhysicalPortState", takePhysicalPortState<A>},
     {803, "_IfName", &A::IfName},
     {804, "_PermanentMACAddress", &A::PermanentMACAddress},
     {805, "_CurrentMTU ", &A::CurrentMTU},

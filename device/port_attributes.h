@@ -40,6 +40,7 @@ public:
     uint32 MaximumMTU = 0;
     uint32 FunctionType = 0;
     uint32 PhysicalPortState = 1;
+    bool tellsPhysicalPortState = false;
     std::string IfName;
     std::string PermanentMACAddress;
     uint32 CurrentMTU = 0;
@@ -94,6 +95,7 @@ public:
     uint32 DefaultETO = 0;
     uint32 MaxCDBLength = 0;
     uint32 PhysicalPortState = 1;
+    bool tellsPhysicalPortState = false;
     std::string PermanentMACAddress;
     uint32 CurrentMTU = 0;
     std::string FuncPortSpeed;

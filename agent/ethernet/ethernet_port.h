@@ -15,6 +15,14 @@ namespace cimple {
 // Who the port is besides its key. Later look-ups match the texts by their position.
 void append_port_identities(VLNMPCA_EthernetPort& port, const AdapterAttributes& adapter);
 
+// The speeds that the last scan read.
+template <class Port_Attributes>
+void set_port_speeds(VLNMPCA_EthernetPort& port, const Port_Attributes& attributes) {
+    port.Speed.set(speed_of_code(attributes.PortSpeed));
+    port.PhysicalPortSpeed.clear(); // told by the status alone, of a link that is down
+    port.FunctionalPortSpeed.set(text(attributes.FuncPortSpeed));
+}
+
 // The port of that name, 16 digits; what only one kind of function tells is null. Null for a port
 // whose address is no MAC address.
 template <class Port_Attributes>
@@ -32,9 +40,8 @@ ethernet_port_instance(const AdapterAttributes& adapter, const Port_Attributes& 
     port->PermanentAddress.set(address);
     port->RequestedState.set(REQUESTED_STATE_NOT_APPLICABLE);
     port->EnabledState.set(enabled_state(attributes.FunctionalPortState));
-    port->Speed.set(speed_of_code(attributes.PortSpeed));
+    set_port_speeds(*port, attributes);
     port->MaxSpeed.set(max_speed_of_mask(attributes.PortSupportedSpeed));
-    port->FunctionalPortSpeed.set(text(attributes.FuncPortSpeed));
     port->SupportedMaximumTransmissionUnit.set(attributes.MaximumMTU);
     port->ActiveMaximumTransmissionUnit.set(attributes.CurrentMTU);
     port->Generation.set(adapter.PCIFunctionNumber);

@@ -10,6 +10,7 @@
 #include "agent/hardware/vpd_maps.h"
 #include "agent/profiles/profile_maps.h"
 #include "agent/software/software_identity.h"
+#include "agent/status/dynamic_status.h"
 #include "agent/store_search.h"
 #include "agent/text.h"
 #include "classes/VLNMPCA_Chip.h"
@@ -119,9 +120,10 @@ uint32 Adapter_Map_Builder::createNICCard(NICAdapter& adapter) {
         VLN_LOG(VLN_DBG, "create icard instance %zu", static_cast<std::size_t>(cards.size()));
         function.card = CreateMPCACardInstance(attributes);
         function.new_card = function.card != nullptr;
-        if (!function.card)
+        if (function.card)
+            readCard(*function.card);
+        else
             VLN_LOG(VLN_CRIT, "CreateMPCACardInstance failed");
-        updateFRUData(function);
         associate(_agent.m_VLNMPCA_ProductPhysicalComponent_map, function.product, function.card,
                   "Insert Failed (CNA): VLNMPCA_ProductPhysicalComponent");
     } else {
@@ -149,14 +151,22 @@ VLNMPCA_Card* Adapter_Map_Builder::CreateMPCACardInstance(const NICAdapterAttrib
     return insert_instance(_agent.m_VLNMPCA_Card_map, card_instance(attributes));
 }
 
-// Comes before anything refers to the card, since it may give the card another key.
-void Adapter_Map_Builder::updateFRUData(const NIC_Function& function) {
-    const Port_List& ports = function.adapter->getPorts();
-    if (!function.card || ports.empty())
-        return;
-    VPD_Maps(_agent).UpdateFRUToCard(*function.card, asic_name(*function.attributes),
-                                     text(ports.front()->getPortName()),
-                                     _agent.m_VLNMPCA_Card_map.size() - 1);
+// Comes before anything refers to the card, since it may give the card another key: so all of the
+// card's functions are asked here.
+void Adapter_Map_Builder::readCard(VLNMPCA_Card& card) {
+    std::vector<FRU_Source> functions;
+    for (const auto& adapter : _agent.m_pData->adapters) {
+        if (adapter->getAdapterType() != ADAPTER_NIC || adapter->getPorts().empty())
+            continue;
+        const AdapterAttributes& attributes = *adapter->getAdapterAttributes();
+        if (text(attributes.SerialNumber) == card.VLNSerialNumber.value)
+            functions.push_back(
+                {asic_name(attributes), text(adapter->getPorts().front()->getPortName())});
+    }
+    VPD_Maps(_agent).UpdateFRUToCard(card, functions, _agent.m_VLNMPCA_Card_map.size() - 1);
+    // A client that gets the card by its name, or that comes just after a refresh, sees it too.
+    if (!functions.empty())
+        readBoardTemperature(functions.front().deviceId.c_str(), card);
 }
 
 // What hangs on the card itself is made once, with the card's first port.
@@ -201,14 +211,15 @@ void Adapter_Map_Builder::findOrMakeConnector(NIC_Port& port) {
                                                            port.serial_and_number));
 }
 
+// A connector that another function brought along is joined already, but maybe not with this chip.
 void Adapter_Map_Builder::joinConnector(const NIC_Port& port) {
-    associate(_agent.m_VLNMPCA_ProductPhysicalConnector_map, port.function.product, port.connector,
-              "Insert Failed (CNA): VLNMPCA_ProductPhysicalConnector");
-    associate(_agent.m_VLNMPCA_Container_map, port.function.card, port.connector,
-              "Insert Failed (CNA): VLNMPCA_Container");
+    associate_once(_agent.m_VLNMPCA_ProductPhysicalConnector_map, port.function.product,
+                   port.connector, "Insert Failed (CNA): VLNMPCA_ProductPhysicalConnector");
+    associate_once(_agent.m_VLNMPCA_Container_map, port.function.card, port.connector,
+                   "Insert Failed (CNA): VLNMPCA_Container");
     if (port.function.chip)
-        associate(_agent.m_VLNMPCA_ConnectorDependsOnChip_map, port.connector, port.function.chip,
-                  "Insert Failed (CNA): VLNMPCA_ConnectorDependsOnChip");
+        associate_once(_agent.m_VLNMPCA_ConnectorDependsOnChip_map, port.connector,
+                       port.function.chip, "Insert Failed (CNA): VLNMPCA_ConnectorDependsOnChip");
 }
 
 } // namespace cimple

@@ -87,20 +87,13 @@ void Adapter_Map_Builder::joinPortController(const NIC_Port& port) {
     associate(_agent.m_VLNMPCA_CardRealizesPortController_map, port.function.card,
               port.port_controller,
               {"Insert Failed (CNA): m_VLNMPCA_CardRealizesPortController_map", VLN_DBG});
-    if (port.port_controller)
-        conformPortController(*port.port_controller);
+    associate(_agent.m_VLNMPCA_PortControllerConformsToProfile_map,
+              Profile_Maps(_agent).find(PROFILE_REGISTRATION), port.port_controller);
     joinFirmwareToController(port);
     VLN_LOG(VLN_DBG, "Generating VLNMPCA_PortControllerSystemDevice (MPCA Port Controller:%s)",
             port.serial_and_number.c_str());
     associate(_agent.m_VLNMPCA_PortControllerSystemDevice_map, _system, port.port_controller);
     associate(_agent.m_VLNMPCA_PortControllerRealizes_map, port.connector, port.port_controller);
-}
-
-// Asked for when the controller is made and again for all of them: what conforms already stays.
-void Adapter_Map_Builder::conformPortController(const VLNMPCA_PortController& controller) {
-    associate(_agent.m_VLNMPCA_PortControllerConformsToProfile_map,
-              Profile_Maps(_agent).find(PROFILE_REGISTRATION), &controller,
-              {"Insert Failed : m_VLNMPCA_PortControllerConformsToProfile_map", VLN_DBG});
 }
 
 void Adapter_Map_Builder::joinControlledBy(const NIC_Port& port) {

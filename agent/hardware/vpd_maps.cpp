@@ -46,6 +46,11 @@ void set_card_name(VLNMPCA_Card& card, const FRUVPD& record, uint32 index) {
                                                serial.c_str()));
 }
 
+void add_asic(VLNMPCA_FRUVitalProductData& fru, const String& name) {
+    if (!name.empty() && !contains(fru.ASICId.value, name))
+        fru.ASICId.append(name);
+}
+
 Ref<VLNMPCA_FRUVitalProductData> fru_instance(const VLNMPCA_Card& card, const String& asic_name,
                                               const FRUVPD& record) {
     auto fru = make_instance<VLNMPCA_FRUVitalProductData>();
@@ -60,8 +65,7 @@ Ref<VLNMPCA_FRUVitalProductData> fru_instance(const VLNMPCA_Card& card, const St
     fru->UUID.set(field(record.uuid));
     fru->FRUNumber.set(field(record.fruNumber));
     fru->FRUFirmwareDetail.append(field(record.firmware));
-    if (!asic_name.empty())
-        fru->ASICId.append(asic_name);
+    add_asic(*fru, asic_name);
     fru->CardFunction.set(record.cardFunction);
     fru->RevisionID.set(record.revisionId);
     return fru;
@@ -94,14 +98,37 @@ void copy_identities(VLNMPCA_SoftwareIdentity& firmware, const VLNMPCA_SoftwareI
 
 } // namespace
 
-uint32 VPD_Maps::UpdateFRUToCard(VLNMPCA_Card& card, const String& asicName, const String& deviceId,
+uint32 VPD_Maps::UpdateFRUToCard(VLNMPCA_Card& card, std::span<const FRU_Source> functions,
                                  uint32 index) {
-    // The number under which the unit is ordered comes from its FRU data alone.
-    if (!card.SKU.value.empty())
-        return addASIC(card, asicName, deviceId);
+    const auto* known = findFRUData(card);
+    uint32 result = 0;
+    for (const FRU_Source& function : functions) {
+        // The number under which the unit is ordered comes from its FRU data alone.
+        const uint32 status =
+            card.SKU.value.empty() ? takeFRUData(card, function, index) : addASIC(card, function);
+        if (status != 0)
+            result = status;
+    }
+    // Only now is the card's key the one that stays.
+    const auto* fru = findFRUData(card);
+    if (!known && fru &&
+        !associate(_agent.m_VLNMPCA_FRUElementVPD_map, &card, fru,
+                   "Insert Failed : VLNMPCA_FRUElementVPD"))
+        return INSERT_FAILED;
+    return result;
+}
+
+VLNMPCA_FRUVitalProductData* VPD_Maps::findFRUData(const VLNMPCA_Card& card) const {
+    return find_first(_agent.m_VLNMPCA_FRUVitalProductData_map,
+                      [&](const VLNMPCA_FRUVitalProductData& candidate) {
+                          return candidate.InstanceID.value == card.VLNSerialNumber.value;
+                      });
+}
+
+uint32 VPD_Maps::takeFRUData(VLNMPCA_Card& card, const FRU_Source& function, uint32 index) {
     VLN_LOG(VLN_DBG, "VLN_Vpd::UpdateFRUToCard");
     FRUVPD record{};
-    if (const AX_STATUS status = GetFRUVPD(deviceId.c_str(), &record)) {
+    if (const AX_STATUS status = GetFRUVPD(function.deviceId.c_str(), &record)) {
         VLN_LOG(VLN_DBG, "Unable to get the FRU VPD for Card : %s ", card.Tag.value.c_str());
         return status;
     }
@@ -111,7 +138,15 @@ uint32 VPD_Maps::UpdateFRUToCard(VLNMPCA_Card& card, const String& asicName, con
     set_unless_empty(card.SKU, field(record.fruNumber));
     set_card_name(card, record, index);
     setCardTag(card, field(record.uuid));
-    return createFRUData(card, asicName, record);
+    // Data without an order number have been taken from another function before.
+    if (auto* fru = findFRUData(card)) {
+        add_asic(*fru, function.asicName);
+        return 0;
+    }
+    return insert_instance(_agent.m_VLNMPCA_FRUVitalProductData_map,
+                           fru_instance(card, function.asicName, record))
+               ? 0
+               : INSERT_FAILED;
 }
 
 // The store finds the card by the key that it came with: it is taken out and put back.
@@ -136,29 +171,17 @@ void VPD_Maps::setCardTag(VLNMPCA_Card& card, const String& tag) {
         static_cast<void>(owner.release());
 }
 
-uint32 VPD_Maps::createFRUData(VLNMPCA_Card& card, const String& asicName, const FRUVPD& record) {
-    auto* fru = insert_instance(_agent.m_VLNMPCA_FRUVitalProductData_map,
-                                fru_instance(card, asicName, record));
-    if (!fru || !associate(_agent.m_VLNMPCA_FRUElementVPD_map, &card, fru,
-                           "Insert Failed : VLNMPCA_FRUElementVPD"))
-        return INSERT_FAILED;
-    return 0;
-}
-
-uint32 VPD_Maps::addASIC(const VLNMPCA_Card& card, const String& asicName, const String& deviceId) {
-    auto* fru = find_first(_agent.m_VLNMPCA_FRUVitalProductData_map,
-                           [&](const VLNMPCA_FRUVitalProductData& candidate) {
-                               return candidate.InstanceID.value == card.VLNSerialNumber.value;
-                           });
+uint32 VPD_Maps::addASIC(const VLNMPCA_Card& card, const FRU_Source& function) {
+    auto* fru = findFRUData(card);
     if (!fru)
         return VLN_NOT_FOUND;
-    if (asicName.empty() || contains(fru->ASICId.value, asicName))
+    if (function.asicName.empty() || contains(fru->ASICId.value, function.asicName))
         return 0;
     // The ASIC counts as the card's only if it tells that card's data.
     FRUVPD record{};
-    if (const AX_STATUS status = GetFRUVPD(deviceId.c_str(), &record))
+    if (const AX_STATUS status = GetFRUVPD(function.deviceId.c_str(), &record))
         return status;
-    fru->ASICId.append(asicName);
+    add_asic(*fru, function.asicName);
     return 0;
 }
 

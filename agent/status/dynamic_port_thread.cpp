@@ -72,7 +72,10 @@ bool poll(ProviderAgent& agent, Port_Rows& rows) {
     for (Dynamic_Port_Row& row : rows) {
         if (!lock_or_stop(agent, agent.m_DataMutex))
             return false;
-        const bool complete = run_guarded([&] { read_states(row); });
+        const bool complete = run_guarded([&] {
+            read_states(row);
+            row.scan_number = agent.m_pData->scanNumber;
+        });
         agent.m_DataMutex.unlock();
         if (!complete)
             VLN_LOG(VLN_DBG, "Error occurred while retrieving NicPort status...");

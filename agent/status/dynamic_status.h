@@ -15,6 +15,7 @@ namespace cimple {
 
 class Port;
 class ProviderAgent;
+struct VLNMPCA_Card;
 struct VLNMPCA_FCPortStatistics;
 
 enum Dynamic_Update : uint8 {
@@ -37,6 +38,10 @@ void GetFCoEPortStats(ProviderAgent& agent);
 void UpdatePhyLinkDownReason(ProviderAgent& agent);
 void UpdateBoardTemp(ProviderAgent& agent);
 void UpdateDriverParameters(ProviderAgent& agent); // driver_parameter_maps.cpp
+
+// The temperature of a card as one of its ports, of the name of 16 digits, tells it now. A failure
+// is told in the log and leaves the card as it is.
+void readBoardTemperature(const char* port_name, VLNMPCA_Card& card);
 
 // The counters of an FCoE port as the library has them now. A failure is told in the log and leaves
 // the statistics as they are.

@@ -1,5 +1,6 @@
 // Update routines of Ethernet ports, port controllers and cards.
 
+#include "agent/ethernet/ethernet_port.h"
 #include "agent/hardware/port_identity.h"
 #include "agent/provider_agent.h"
 #include "agent/state_tables.h"
@@ -28,25 +29,36 @@ const VLNMPCA_EthernetPort* find_port(const ProviderAgent& agent, const char* de
 
 // ---- Ethernet ports ----
 
-// States that the device model read at the last scan; false for a port that it does not know.
-bool find_states(VLN_Data& data, const String& name, Dynamic_Port_Row& row) {
-    const auto take = [&row](const auto* attributes) {
-        if (attributes) {
-            row.functional_state = attributes->FunctionalPortState;
-            row.physical_state = attributes->PhysicalPortState;
-        }
-        return attributes != nullptr;
-    };
+// Hands what the last scan read of a NIC or iSCSI port to take(attributes). False for a port that
+// the device model does not know.
+template <class Take>
+bool with_attributes(VLN_Data& data, const String& name, Take take) {
     for (const auto& adapter : data.adapters) {
         for (const auto& port : adapter->getPorts()) {
+            if (name != port->getPortName().c_str())
+                continue;
             PortAttributes* attributes = port->getPortAttributes();
-            if (name == port->getPortName().c_str() &&
-                (take(dynamic_cast<const NICPortAttributes*>(attributes)) ||
-                 take(dynamic_cast<const iSCSIPortAttributes*>(attributes))))
+            if (const auto* nic = dynamic_cast<const NICPortAttributes*>(attributes)) {
+                take(*nic);
                 return true;
+            }
+            if (const auto* iscsi = dynamic_cast<const iSCSIPortAttributes*>(attributes)) {
+                take(*iscsi);
+                return true;
+            }
         }
     }
     return false;
+}
+
+// The row of a port as the last scan saw it. One that does not tell its physical state counts as
+// not read: it keeps what the refresh showed. False for a port that the device model does not know.
+bool find_states(VLN_Data& data, const String& name, Dynamic_Port_Row& row) {
+    return with_attributes(data, name, [&](const auto& attributes) {
+        row.functional_state = attributes.FunctionalPortState;
+        row.physical_state = attributes.PhysicalPortState;
+        row.scan_number = attributes.tellsPhysicalPortState ? data.scanNumber : 0;
+    });
 }
 
 // A port whose name is no port's, or is too long for a row, is never polled.
@@ -92,28 +104,32 @@ bool is_thread_running(ProviderAgent& agent) {
     return agent.m_DynamicPortThreadInitialized;
 }
 
-void show_status(VLNMPCA_EthernetPort& port, const Dynamic_Port_Row& row) {
+void show_status(VLN_Data& data, VLNMPCA_EthernetPort& port, const Dynamic_Port_Row& row) {
     replace_port_state(&port, find_port_state(portStateMap, row.functional_state));
     VLN_LOG(VLN_DBG, "Updating port speeds.");
     port.DetailedStatus.set(static_cast<uint16>(row.functional_state));
     port.EnabledState.set(enabled_state(row.physical_state));
-    // A link that comes back gets its speeds at the next refresh.
-    if (row.physical_state != PHYSICAL_STATE_UP) {
+    if (row.physical_state == PHYSICAL_STATE_UP) {
+        with_attributes(data, port.DeviceID.value,
+                        [&](const auto& attributes) { set_port_speeds(port, attributes); });
+    } else {
         port.Speed.set(0);
         port.PhysicalPortSpeed.set(0);
         port.FunctionalPortSpeed.set("Not Available");
     }
 }
 
+// What a refresh has read since the last poll is newer.
 void show_port_status(ProviderAgent& agent) {
+    VLN_Data& data = *agent.m_pData;
     const auto& ports = agent.m_VLNMPCA_EthernetPort_map;
     Auto_Mutex lock(agent.m_DynamicPortStatusMutex);
     if (!agent.m_pDynamicPortStatus)
         return; // the thread has ended meanwhile
     for (uint32 i = 0; i < ports.size(); ++i)
         for (const Dynamic_Port_Row& row : agent.m_pDynamicPortStatus->rows)
-            if (ports[i]->DeviceID.value == row.name)
-                show_status(*ports[i], row);
+            if (row.scan_number == data.scanNumber && ports[i]->DeviceID.value == row.name)
+                show_status(data, *ports[i], row);
 }
 
 // ---- Port controllers and cards ----
@@ -131,18 +147,10 @@ void update_phy_link_down_reason(const ProviderAgent& agent, VLNMPCA_PortControl
 }
 
 // The serial number by which functions know their card: what the card's own data say of it may be
-// another one. Throws std::exception if the library refuses.
+// another one.
 void update_board_temperature(const ProviderAgent& agent, VLNMPCA_Card& card) {
-    const auto* port = find_port(agent, IDENTITY_SERIAL, card.VLNSerialNumber.value);
-    AX_WWN wwn{};
-    if (!port || !wwn_of_name(port->DeviceID.value.c_str(), wwn))
-        return;
-    Attribute_Buffer buffer = fetchAdapterAttributes(wwn);
-    // The bytes above the first are the temperature's thresholds.
-    uint8 celsius = 0;
-    if (read_number(buffer, BOARD_TEMPERATURE, "ERROR: AX_GetttributeValue for _BoardTemperature",
-                    celsius))
-        card.BoardTemperature.set(celsius);
+    if (const auto* port = find_port(agent, IDENTITY_SERIAL, card.VLNSerialNumber.value))
+        readBoardTemperature(port->DeviceID.value.c_str(), card);
 }
 
 } // namespace
@@ -178,14 +186,28 @@ void UpdatePhyLinkDownReason(ProviderAgent& agent) {
     VLN_LOG(VLN_DBG, "UpdatePhyLinkDownReason(): Successful");
 }
 
+void readBoardTemperature(const char* port_name, VLNMPCA_Card& card) {
+    AX_WWN wwn{};
+    if (!wwn_of_name(port_name, wwn))
+        return;
+    const bool complete = run_guarded([&] {
+        Attribute_Buffer buffer = fetchAdapterAttributes(wwn);
+        // The bytes above the first are the temperature's thresholds.
+        uint8 celsius = 0;
+        if (read_number(buffer, BOARD_TEMPERATURE,
+                        "ERROR: AX_GetttributeValue for _BoardTemperature", celsius))
+            card.BoardTemperature.set(celsius);
+    });
+    if (!complete)
+        VLN_LOG(VLN_ERR, "Error Updating Borad Temperature");
+}
+
 void UpdateBoardTemp(ProviderAgent& agent) {
     if (!update_due(agent, UPDATE_BOARD_TEMPERATURE))
         return;
     const auto& cards = agent.m_VLNMPCA_Card_map;
-    for (uint32 i = 0; i < cards.size(); ++i) {
-        if (!run_guarded([&] { update_board_temperature(agent, *cards[i]); }))
-            VLN_LOG(VLN_ERR, "Error Updating Borad Temperature");
-    }
+    for (uint32 i = 0; i < cards.size(); ++i)
+        update_board_temperature(agent, *cards[i]);
     VLN_LOG(VLN_DBG, "UpdateBoardTemp(): Successful");
 }
 

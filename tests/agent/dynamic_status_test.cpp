@@ -47,28 +47,6 @@ constexpr Shown DOWN = {3, "Link Down", 6, 3, 0};
 
 } // namespace
 
-TEST_F(Dynamic_Test, AChangedStateIsSeenAfterThePollAndNotBefore) {
-    begin();
-    expect_shown(*agent, 0, AS_SCANNED); // starts the thread
-    await_sleeping(1);
-    set(FIRST_PORT, "portAttributes", "FunctionalPortState", "6");
-    set(FIRST_PORT, "portAttributes", "PhysicalPortState", "6");
-    sleep_nineteen_times();
-    EXPECT_EQ(vlnsim_calls("AX_GetPortState"), 0u);
-    advance(6 * SECOND);
-    EXPECT_EQ(vlnsim_calls("AX_GetPortState"), 1u);
-    advance(2 * SECOND);
-    EXPECT_EQ(vlnsim_calls("AX_GetPortState"), 2u);
-    expect_shown(*agent, 0, UP); // the table is shared at the end of the poll
-    advance(2 * SECOND);
-    advance(8 * SECOND - 1);
-    expect_shown(*agent, 0, UP); // the last look was too recent
-    vlnsim_advance(1);
-    expect_shown(*agent, 0, DOWN);
-    EXPECT_FALSE(agent->m_VLNMPCA_EthernetPort_map[0]->PhysicalPortSpeed.is_null());
-    expect_shown(*agent, 1, UP);
-}
-
 TEST_F(Dynamic_Test, AFailedReadingLeavesTheRow) {
     begin();
     expect_shown(*agent, 0, AS_SCANNED);
@@ -152,7 +130,6 @@ TEST_F(Dynamic_Test, LinkDownReasonAndTemperatureFollowTheHardware) {
         EXPECT_EQ(agent->m_VLNMPCA_PortController_map[1]->PhyLinkDownReason.value, 0u);
         EXPECT_EQ(agent->m_VLNMPCA_Card_map[0]->BoardTemperature.value, celsius);
     };
-    EXPECT_TRUE(agent->m_VLNMPCA_Card_map[0]->BoardTemperature.is_null());
     look(0, 52);
     set(FIRST_PORT, "portAttributes", "PhyLinkDownReason", "5");
     set(FIRST_PORT, "adapterAttributes", "BoardTemperature", "\"0x645A3D\"");
@@ -171,15 +148,6 @@ TEST_F(Dynamic_Test, LinkDownReasonAndTemperatureFollowTheHardware) {
     look(5, 61);
     vlnsim_clear_faults();
     look(7, 61);
-}
-
-TEST_F(Dynamic_Test, WithoutEthernetPortsThereIsNoThread) {
-    begin(R"({"use": "fcoe"})");
-    Log_Capture log;
-    EXPECT_EQ(count_instances(VLNMPCA_EthernetPort::static_meta_class), 0);
-    EXPECT_EQ(log.count(VLN_DBG, "No Logical Port available to fetch the dynamic properties"), 1);
-    EXPECT_FALSE(agent->m_DynamicPortThreadInitialized);
-    EXPECT_EQ(log.count(VLN_DBG, "PERF: Creating DynamicDataFetch_Handler Thread."), 0);
 }
 
 // Rows stay with the names of the ports at the start of the thread.
@@ -208,6 +176,11 @@ TEST_F(Dynamic_Test, PortsMayComeAndGo) {
     agent->m_bAdapterRefreshRequested = true;
     EXPECT_EQ(refreshes_started(*agent), 1);
     advance(10 * SECOND);
+    expect_shown(*agent, 0, {3, "Link Down", 0, 3, FULL_SPEED}); // as scanned, after the poll
+    await_sleeping(1);
+    for (int i = 0; i < 18; ++i) // less one for the step above
+        advance(6 * SECOND);
+    poll();
     expect_shown(*agent, 0, DOWN);
 }
 

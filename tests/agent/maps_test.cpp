@@ -60,6 +60,7 @@ boolean HostingBoard = false;
 uint32 VendorSpecID = 1453984283;
 uint32 DeviceID = 8720;
 uint32 ModelID = 2587;
+sint32 BoardTemperature = 52;
 string VLNSerialNumber = "VR10420117";
 )");
     EXPECT_EQ(first(STORE_VLNMPCA_Product), R"(
@@ -175,25 +176,6 @@ string ConfiguredPortSpeed = "10Gb";
 uint32 DACCableLength = 3;
 uint32 PhyLinkDownReason = 0;
 )");
-}
-
-// Functions on one physical port share connector and controller; each has a port of its own.
-TEST_F(Maps_Test, FunctionsOfOnePort) {
-    load(R"({"use": "nic"}, {"use": "nic"})");
-    Loaded_Agent agent;
-    Log_Capture log;
-    EXPECT_EQ(refreshes_started(*agent), 1);
-    expect_counts(*agent, {{STORE_VLNMPCA_Product, 1},
-                           {STORE_VLNMPCA_Card, 1},
-                           {STORE_VLNMPCA_ChassisContainsCard, 1},
-                           {STORE_VLNMPCA_PhysicalConnector, 2},
-                           {STORE_VLNMPCA_ProductPhysicalConnector, 2},
-                           {STORE_VLNMPCA_EthernetPort, 4},
-                           {STORE_VLNMPCA_Realizes, 4},
-                           {STORE_VLNMPCA_PortController, 2},
-                           {STORE_VLNMPCA_PortControllerRealizes, 2},
-                           {STORE_VLNMPCA_ControlledBy, 4}});
-    EXPECT_EQ(log.count(VLN_CRIT, "Insert Failed (CNA): VLNMPCA_Container"), 2);
 }
 
 TEST_F(Maps_Test, StatesFollowTheLibrary) {

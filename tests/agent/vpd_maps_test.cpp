@@ -104,18 +104,22 @@ TEST_F(Vpd_Maps_Test, FurtherAsicsAreAdded) {
     const auto* fru = (*agent)->m_VLNMPCA_FRUVitalProductData_map[0];
     const uint32 names = fru->ASICId.value.size();
     vlnsim_clear_calls();
-    EXPECT_EQ(maps.UpdateFRUToCard(*card(), fru->ASICId.value[0], PORT, 0), 0u);
-    EXPECT_EQ(maps.UpdateFRUToCard(*card(), "", PORT, 0), 0u);
+    const auto update = [&](const String& asic) {
+        const FRU_Source function[] = {{asic, PORT}};
+        return maps.UpdateFRUToCard(*card(), function, 0);
+    };
+    EXPECT_EQ(update(fru->ASICId.value[0]), 0u);
+    EXPECT_EQ(update(""), 0u);
     EXPECT_EQ(vlnsim_calls("AX_GetVPDV2"), 0u);
-    EXPECT_EQ(maps.UpdateFRUToCard(*card(), "second", PORT, 0), 0u);
+    EXPECT_EQ(update("second"), 0u);
     EXPECT_EQ(vlnsim_calls("AX_GetVPDV2"), 1u);
     ASSERT_EQ(fru->ASICId.value.size(), names + 1);
     EXPECT_EQ(fru->ASICId.value[names], "second");
     ASSERT_EQ(vlnsim_fault("AX_GetVPDV2", 1, VLNSIM_STATUS, 190), 0);
-    EXPECT_EQ(maps.UpdateFRUToCard(*card(), "third", PORT, 0), 190u);
+    EXPECT_EQ(update("third"), 190u);
     EXPECT_EQ(fru->ASICId.value.size(), names + 1);
     (*agent)->m_VLNMPCA_FRUVitalProductData_map.clear();
-    EXPECT_EQ(maps.UpdateFRUToCard(*card(), "third", PORT, 0), 32768u);
+    EXPECT_EQ(update("third"), 32768u);
 }
 
 TEST_F(Vpd_Maps_Test, CardWithoutFruDataKeepsWhatItHas) {
@@ -129,7 +133,7 @@ TEST_F(Vpd_Maps_Test, CardWithoutFruDataKeepsWhatItHas) {
                             {STORE_VLNMPCA_EthernetPort, 2}});
     EXPECT_EQ(card()->Tag.value, SERIAL);
     EXPECT_EQ(card()->Name.value, "VMC-2210");
-    EXPECT_EQ(log.count(VLN_DBG, "Unable to get the FRU VPD for Card : VR10420117 "), 1);
+    EXPECT_EQ(log.count(VLN_DBG, "Unable to get the FRU VPD for Card : VR10420117 "), 2);
     EXPECT_EQ(log.count(VLN_DBG, "Updating FRU information to Softwareidentity Class"), 1);
     EXPECT_EQ(log.count(VLN_DBG, "Failed to update FRU VPD data to cim_softwareidentity instances"),
               1);

@@ -1,5 +1,5 @@
 // What changes between refreshes: the state of a port's link, a card's temperature.
-#include "tests/road/road.h"
+#include "tests/road/properties.h"
 
 #include <thread>
 
@@ -57,6 +57,66 @@ TEST(Dynamic, ALinkThatGoesDownIsSeenAfterTwoMinutes) {
     const unsigned long calls = vlnsim_calls(nullptr);
     expect_first_port(road, "{3}", "{Link Down}", "0", "Not Available");
     EXPECT_EQ(vlnsim_calls(nullptr), calls) << "what the thread has read costs no further call";
+}
+
+void poll() {
+    for (int i = 0; i < 20; ++i)
+        advance(6 * SECOND);
+    for (std::size_t i = 0; i < PORTS; ++i)
+        advance(2 * SECOND);
+}
+
+TEST(Dynamic, ALinkThatComesBackHasTheSpeedsOfTheLastRefresh) {
+    Road road({.log = true});
+    expect_first_port(road, "{2}", "{OK}", "10000000000", "10 Gbps");
+    const auto link = [](const char* state) {
+        set("portAttributes", "FunctionalPortState", state);
+        set("portAttributes", "PhysicalPortState", state);
+    };
+    link("6");
+    poll();
+    expect_first_port(road, "{3}", "{Link Down}", "0", "Not Available");
+    link("2");
+    poll();
+    expect_first_port(road, "{2}", "{OK}", "10000000000", "10 Gbps");
+
+    // What a refresh reads is newer than what a poll before it has read.
+    link("6");
+    poll();
+    expect_first_port(road, "{3}", "{Link Down}", "0", "Not Available");
+    link("2");
+    road.wait_for_refreshes(1);
+    advance(600 * SECOND);
+    road.enumerate("VLNMPCA_Card"); // starts the refresh
+    road.wait_for_refreshes(2);
+    expect_first_port(road, "{2}", "{OK}", "10000000000", "10 Gbps");
+}
+
+// A firmware that does not tell the physical state leaves its port as the refresh showed it.
+TEST(Dynamic, APortWithoutAPhysicalStateIsNoPortWithoutALink) {
+    Road road;
+    set("portAttributes", "PhysicalPortState", nullptr);
+    expect_first_port(road, "{2}", "{OK}", "10000000000", "10 Gbps");
+    advance(10 * SECOND);
+    expect_first_port(road, "{2}", "{OK}", "10000000000", "10 Gbps");
+    poll();
+    expect_first_port(road, "{2}", "{OK}", "10000000000", "10 Gbps");
+}
+
+// Cards that a refresh made anew while the last reading is recent.
+TEST(Dynamic, ANewCardHasItsTemperature) {
+    Road road({.log = true});
+    const auto temperature = [&road] {
+        return text_of(road.enumerate("VLNMPCA_Card").at(0), "BoardTemperature");
+    };
+    EXPECT_EQ(temperature(), "52");
+    road.wait_for_refreshes(1);
+    vlnsim_advance(595 * SECOND);
+    EXPECT_EQ(temperature(), "52");
+    vlnsim_advance(5 * SECOND);
+    road.enumerate("VLNMPCA_Product"); // starts the refresh
+    road.wait_for_refreshes(2);
+    EXPECT_EQ(temperature(), "52");
 }
 
 TEST(Dynamic, TheTemperatureIsReadAtMostEveryTenSeconds) {

@@ -56,6 +56,45 @@ TEST(Hardware, SubAdaptersOfOneCardAreChipsOfTheirOwn) {
     EXPECT_EQ(road.enumerate("VLNMPCA_ConnectorDependsOnChip").size(), 4u);
 }
 
+// Whatever its first function fails to tell, another one does; and none of it comes too late for
+// what refers to the card.
+TEST(Hardware, ACardIsKnownThroughAnyOfItsFunctions) {
+    const char* second_alone = R"("vpd": {"UU": null, "FN": null})";
+    const struct {
+        const char* first;
+        std::uint64_t status; // of the first function's calls
+        const char* asics;
+    } rows[] = {
+        {R"("driverType": 1)", 0, "{VR10420117:01, VR10420117:02}"},
+        {R"("driverType": 1)", 190, "{VR10420117:02}"},
+        {second_alone, 0, "{VR10420117:01, VR10420117:02}"},
+    };
+    for (const auto& row : rows) {
+        SCOPED_TRACE(row.first + std::to_string(row.status));
+        Road road({.scenario = card(R"({"use": "nic", "subAdapter": 1, )" + std::string(row.first) +
+                                    R"(}, {"use": "nic", "subAdapter": 2})"),
+                   .log = true});
+        for (unsigned call : {1u, 2u}) // on both physical ports
+            if (row.status != 0)
+                vlnsim_fault("AX_GetVPDV2", call, VLNSIM_STATUS, row.status);
+        const auto cards = road.enumerate("VLNMPCA_Card");
+        ASSERT_EQ(cards.size(), 1u);
+        const std::string tag = "0f4a2c117d3e4b529a0102564c000001";
+        expect_properties(cards[0], {{"Tag", tag.c_str()}, {"SKU", "00VM221"}});
+        const auto data = road.enumerate("VLNMPCA_FRUVitalProductData");
+        ASSERT_EQ(data.size(), 1u);
+        EXPECT_EQ(text_of(data[0], "ASICId"), row.asics);
+        const auto told = road.enumerate("VLNMPCA_FRUElementVPD");
+        ASSERT_EQ(told.size(), 1u);
+        EXPECT_EQ(end_of(told[0], "ManagedElement", "Tag"), tag);
+        const auto parts = road.enumerate("VLNMPCA_ProductPhysicalComponent");
+        ASSERT_EQ(parts.size(), 1u);
+        EXPECT_EQ(end_of(parts[0], "PartComponent", "Tag"), tag);
+        road.close();
+        EXPECT_EQ(road.faults_in_log(), "");
+    }
+}
+
 TEST(Hardware, ThePCIFunctionOfAPort) {
     Road road({.scenario = card(R"({"use": "nic"})")});
     const auto devices = road.enumerate("VLNMPCA_PCIDevice");

@@ -122,6 +122,16 @@ std::size_t Road::count_in_log(const std::string& text) const {
     return count;
 }
 
+std::string Road::faults_in_log() const {
+    std::istringstream log(log_text());
+    std::string faults;
+    for (std::string line; std::getline(log, line);)
+        if (line.find("VLN_CRIT]") != std::string::npos &&
+            line.find("Continuing logs in Vorlan log provider") == std::string::npos)
+            faults += line + "\n";
+    return faults;
+}
+
 void Road::wait_for_refreshes(std::size_t count) {
     constexpr int LIMIT = 100000;
     for (int i = 0; i < LIMIT; ++i) {

@@ -41,6 +41,8 @@ public:
     std::filesystem::path root() const { return _root; }
     std::string log_text() const; // of the provider's log file
     std::size_t count_in_log(const std::string& text) const;
+    // The lines of level 1 but the logger's own first one.
+    std::string faults_in_log() const;
     // Until that many refresh threads have ended since the start. Needs the log.
     void wait_for_refreshes(std::size_t count);
 

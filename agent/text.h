@@ -9,6 +9,8 @@
 
 namespace cimple {
 
+inline constexpr char NO_TEXT[] = "n/a"; // stands for a text that the library does not tell
+
 String text(std::string_view bytes);
 
 // As printf, of any length. A precision counts bytes.

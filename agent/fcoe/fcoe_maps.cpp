@@ -87,13 +87,14 @@ void FCoE_Map_Builder::createFCPorts() {
 
 // The steps of one port, in order, up to the first that leaves it.
 void FCoE_Map_Builder::createFCPort(FC_Function function) {
-    const bool complete = createPort(function) && createPFCThrottle(function) &&
-                          createStatistics(function) && joinConnector(function) &&
-                          joinPortController(function) && joinWWNService(function) &&
-                          createInitiatorEndpoint(function) && joinFirmware(function) &&
-                          joinEthernetPorts(function) && createPCIDevice(function);
-    if (complete)
-        makePortGroups(function);
+    const bool complete =
+        createPort(function) && createPFCThrottle(function) && createStatistics(function) &&
+        joinConnector(function) && joinPortController(function) && joinWWNService(function) &&
+        createInitiatorEndpoint(function) && joinFirmware(function) && joinEthernetPorts(function);
+    if (!complete)
+        return;
+    createPCIDevice(function);
+    makePortGroups(function);
 }
 
 bool FCoE_Map_Builder::createPort(FC_Function& function) {
@@ -137,18 +138,16 @@ bool FCoE_Map_Builder::createStatistics(const FC_Function& function) {
     return associate(_agent.m_VLNMPCA_ElementStatisticalData_map, function.fc_port, statistics);
 }
 
-bool FCoE_Map_Builder::createPCIDevice(const FC_Function& function) {
+// A port whose registers can't be read lacks that instance alone.
+void FCoE_Map_Builder::createPCIDevice(const FC_Function& function) {
     const uint32 status =
         PCI_Maps(_agent, _system)
             .CreatePCIDeviceInstance(
                 {function.name, "FCoE", function.name,
                  format_text("Vorlan:FCOEAdapter%d", static_cast<int>(function.adapter_number)),
                  _agent.m_VLNMPCA_FCConcreteIdentity_map, function.fc_port});
-    if (status == SKIP_DEVICE)
-        return false;
-    if (status != MAP_OK)
+    if (status != MAP_OK && status != SKIP_DEVICE)
         VLN_LOG(VLN_DBG, "CreatePCIDeviceInstance failed");
-    return true;
 }
 
 void FCoE_Map_Builder::makePortGroups(const FC_Function& function) {

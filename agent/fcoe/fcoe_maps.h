@@ -40,7 +40,7 @@ private:
     bool createPFCThrottle(const FC_Function& function);
     bool createStatistics(const FC_Function& function);
     void makePortGroups(const FC_Function& function);
-    bool createPCIDevice(const FC_Function& function);
+    void createPCIDevice(const FC_Function& function);
 
     // fcoe_service_maps.cpp
     void createWebLaunch();

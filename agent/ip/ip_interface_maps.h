@@ -6,6 +6,7 @@
 #define VLN_AGENT_IP_IP_INTERFACE_MAPS_H
 
 #include "agent/provider_agent.h"
+#include "agent/text.h"
 
 namespace cimple {
 
@@ -14,6 +15,16 @@ inline constexpr uint16 IF_TYPE_IPV6 = 4097;
 
 inline bool is_ipv6(const String& address) {
     return address.find(':') != -1;
+}
+
+// "0.0.0.0", and the same in IPv6.
+inline bool is_unset(const std::string& address) {
+    return address.find_first_not_of("0.:") == std::string::npos;
+}
+
+// A gateway as the library tells it; empty for an address of zeros, which stands for none.
+inline String gateway_text(const std::string& address) {
+    return is_unset(address) ? String() : text(address);
 }
 
 struct IP_Interface {

@@ -132,7 +132,7 @@ void Adapter_Map_Builder::createIPEndpoint(NICAdapter& adapter, Port& port,
     if (endpoint)
         joinIPEndpoint({endpoint, text(attributes_of(adapter).SerialNumber),
                         text(port.getPortName()), text(facts.address), text(facts.subnet_mask),
-                        text(attributes.GatewayAddress)});
+                        gateway_text(attributes.GatewayAddress)});
 }
 
 void Adapter_Map_Builder::joinIPEndpoint(const IP_Interface& interface) {

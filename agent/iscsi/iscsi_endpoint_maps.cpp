@@ -39,11 +39,6 @@ Ref<VLNMPCA_TCPProtocolEndpoint> tcp_endpoint_instance(const iSCSIPortAttributes
     return endpoint;
 }
 
-// "0.0.0.0", and the same in IPv6.
-bool is_unset(const std::string& address) {
-    return address.find_first_not_of("0.:") == std::string::npos;
-}
-
 void set_addresses(VLNMPCA_IPProtocolEndpoint& endpoint, const iSCSIPortAttributes& attributes) {
     const String address = text(attributes.IPAddress);
     const bool ipv6 = is_ipv6(address);
@@ -115,11 +110,9 @@ void ISCSI_Map_Builder::createIPInterface(const ISCSI_Port& port) {
         return;
     }
     const iSCSIPortAttributes& attributes = port.attributes;
-    const String gateway =
-        is_unset(attributes.GatewayAddress) ? String() : text(attributes.GatewayAddress);
     const uint32 status = interfaces.CreateIPInterfaceInstances(
         {port.ip_endpoint, text(port.adapter.SerialNumber), port.name, text(attributes.IPAddress),
-         text(attributes.SubnetMask), gateway});
+         text(attributes.SubnetMask), gateway_text(attributes.GatewayAddress)});
     if (status != MAP_OK && status != SKIP_DEVICE)
         VLN_LOG(VLN_CRIT, "CreateIPInterfaceInstances failed");
 }

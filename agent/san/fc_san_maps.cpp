@@ -146,8 +146,10 @@ const VLNMPCA_SCSIProtocolEndpoint* FC_SAN_Maps::createTarget(const FC_Initiator
     const String key = format_text("%s:%s:%s", _system->Name.value.c_str(),
                                    initiator.port_name.c_str(), first_unit.portWWN.c_str());
     const auto endpoint = endpoint_instance(first_unit, key, *_system);
+    if (const auto* known = store.lookup(endpoint.get()))
+        return known;
     if (!insert_instance(store, endpoint))
-        return store.lookup(endpoint.get());
+        return nullptr;
     associate_as(_agent.m_VLNMPCA_LocalHostedAccessPoint_map,
                  format_text("Local Hosted Access Point %s", key.c_str()), _system, endpoint.get());
     return endpoint.get(); // which the store keeps alive

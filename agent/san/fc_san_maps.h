@@ -26,8 +26,8 @@ class FC_SAN_Maps {
 public:
     explicit FC_SAN_Maps(ProviderAgent& agent);
 
-    // All that the port sees. What the store of endpoints refuses, since another port sees the
-    // target as well, is not made again; the paths lead to what stands there.
+    // All that the port sees. A target that another port sees as well is not made again; the paths
+    // lead to what stands there.
     void createTargets(Port& port);
 
 private:

@@ -15,8 +15,6 @@
 
 namespace cimple {
 
-inline constexpr char NO_TEXT[] = "n/a"; // stands for a text that the library does not tell
-
 enum class ISCSI_Role : uint16 { INITIATOR = 2, TARGET = 3 }; // CIM_iSCSIProtocolEndpoint.Role
 
 // An endpoint of either role. identifier: an initiator's ISID, a target's portal group.

@@ -126,8 +126,7 @@ uint32 ISCSI_SAN_Maps::createSessions(const ISCSI_View& view, ISCSI_Target& targ
             continue;
         }
         VLN_LOG(VLN_DBG, "AX_iSCSI_GetSessionInfo() succesful.");
-        if (!maps.createSession(entry.sessionId, info))
-            return AX_STATUS_ERROR;
+        maps.createSession(entry.sessionId, info);
     }
     return AX_STATUS_OK;
 }

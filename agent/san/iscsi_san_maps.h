@@ -38,7 +38,7 @@ class ISCSI_SAN_Maps {
 public:
     explicit ISCSI_SAN_Maps(ProviderAgent& agent) : _agent(agent) {}
 
-    // 0; a status of the library; 8 when out of memory; 1 when an insertion failed. What was
+    // 0; a status of the library; 8 when out of memory; 1 when a target was refused. What was
     // inserted before stays.
     uint32 GetiSCSITargets(Port& port);
 

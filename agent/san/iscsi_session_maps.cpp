@@ -2,7 +2,6 @@
 
 #include "agent/associations.h"
 #include "agent/san/iscsi_instances.h"
-#include "agent/store_search.h"
 #include "agent/text.h"
 #include "classes/VLNMPCA_EthernetPort.h"
 #include "classes/VLNMPCA_SCSIProtocolController.h"
@@ -32,13 +31,15 @@ bool join(Instance_Map_Base& store, const Instance* first, const Instance* secon
 
 } // namespace
 
-bool ISCSI_Session_Maps::createSession(uint32 session_id, const AX_iSCSI_SessionInfo& info) {
-    return info.closed ? createClosedSession(session_id, info)
-                       : createOpenSession(session_id, info);
+void ISCSI_Session_Maps::createSession(uint32 session_id, const AX_iSCSI_SessionInfo& info) {
+    if (info.closed)
+        createClosedSession(session_id, info);
+    else
+        createOpenSession(session_id, info);
 }
 
 // Nothing is left of it but itself: no connection tells where it led, so the session does.
-bool ISCSI_Session_Maps::createClosedSession(uint32 session_id, const AX_iSCSI_SessionInfo& info) {
+void ISCSI_Session_Maps::createClosedSession(uint32 session_id, const AX_iSCSI_SessionInfo& info) {
     const auto portal = portal_text(info.targetAddress);
     if (!portal)
         VLN_LOG(VLN_ERR, "Error retrieving information for iSNS Server");
@@ -49,27 +50,25 @@ bool ISCSI_Session_Maps::createClosedSession(uint32 session_id, const AX_iSCSI_S
                     _target.name.c_str(), static_cast<int>(session_id));
     auto session = session_instance(id, _target.name, info);
     session->Description.set(format_text("Target portal %s", portal.value_or(NO_TEXT).c_str()));
-    if (!insert_instance(_agent.m_VLNMPCA_iSCSISession_map, session))
-        return false;
-    VLN_LOG(VLN_DBG, "VLNMPCA_iSCSISession::create() SUCCESFUL");
-    return true;
+    if (insert_instance(_agent.m_VLNMPCA_iSCSISession_map, session))
+        VLN_LOG(VLN_DBG, "VLNMPCA_iSCSISession::create() SUCCESFUL");
 }
 
-bool ISCSI_Session_Maps::createOpenSession(uint32 session_id, const AX_iSCSI_SessionInfo& info) {
+void ISCSI_Session_Maps::createOpenSession(uint32 session_id, const AX_iSCSI_SessionInfo& info) {
     if (_view.ethernet_port)
         VLN_LOG(VLN_DBG, "Got VLNMPCA_EthernetPort in the map ");
     const auto* endpoint = findOrMakeEndpoint(info);
     if (!endpoint)
-        return false;
+        return;
     noteTarget(info, endpoint);
     const String id = format_text("VLN:iSCSI Session:%s:%s:%d", _view.port_name.c_str(),
                                   _target.name.c_str(), static_cast<int>(session_id));
     const auto* session = insert_instance(_agent.m_VLNMPCA_iSCSISession_map,
                                           session_instance(id, _target.name, info));
-    if (!session || !createStatistics(info))
-        return false;
-    const auto* connection = createConnection(info);
-    return connection && joinPipes(*endpoint, *session, *connection);
+    if (!session || !createStatistics(session_id, info))
+        return;
+    if (const auto* connection = createConnection(session_id, info))
+        joinPipes(*endpoint, *session, *connection);
 }
 
 // What the second walk needs of the sessions. Sessions of one ISID share their endpoint.
@@ -87,14 +86,11 @@ const VLNMPCA_iSCSIProtocolEndpoint*
 ISCSI_Session_Maps::findOrMakeEndpoint(const AX_iSCSI_SessionInfo& info) {
     auto& endpoints = _agent.m_VLNMPCA_iSCSIProtocolEndpoint_map;
     const String name = format_text("%s i 0x%llx", _view.port_name.c_str(), isid_of(info));
-    const auto* known = find_first(endpoints, [&](const VLNMPCA_iSCSIProtocolEndpoint& candidate) {
-        return candidate.Name.value == name;
-    });
-    if (known)
-        return known;
     auto endpoint = make_instance<VLNMPCA_iSCSIProtocolEndpoint>();
     describe_endpoint(*endpoint, *_view.system, name, format_text("0x%llx", isid_of(info)),
                       ISCSI_Role::INITIATOR);
+    if (const auto* known = endpoints.lookup(endpoint.get()))
+        return known;
     const auto* inserted = insert_instance(endpoints, endpoint);
     return inserted && joinEndpoint(*inserted) ? inserted : nullptr;
 }
@@ -108,10 +104,12 @@ bool ISCSI_Session_Maps::joinEndpoint(const VLNMPCA_iSCSIProtocolEndpoint& endpo
            join(_agent.m_VLNMPCA_iSCSIBindsToTCP_map, _view.tcp_endpoint, &endpoint);
 }
 
-bool ISCSI_Session_Maps::createStatistics(const AX_iSCSI_SessionInfo& info) {
-    const String id =
-        format_text("VLN:Session Statistics:%s:%s:i0x%llx:t%d", _view.port_name.c_str(),
-                    _target.name.c_str(), isid_of(info), static_cast<int>(info.tsih));
+// Sessions whose login is not through have no handle yet, so the library's number is part of the
+// text.
+bool ISCSI_Session_Maps::createStatistics(uint32 session_id, const AX_iSCSI_SessionInfo& info) {
+    const String id = format_text("VLN:Session Statistics:%s:%s:i0x%llx:t%d:%d",
+                                  _view.port_name.c_str(), _target.name.c_str(), isid_of(info),
+                                  static_cast<int>(info.tsih), static_cast<int>(session_id));
     const auto* statistics =
         insert_instance(_agent.m_VLNMPCA_ISCSISessionStatistics_map, statistics_instance(id, info));
     if (!statistics)
@@ -123,13 +121,14 @@ bool ISCSI_Session_Maps::createStatistics(const AX_iSCSI_SessionInfo& info) {
     return join(_agent.m_VLNMPCA_ISCSISessionStatisticalData_map, _view.controller, statistics);
 }
 
-// The port's name is part of the text: two ports may talk to one target under one ISID.
+// The port's name is part of the text as well: two ports may talk to one target under one ISID.
 const VLNMPCA_iSCSIConnection*
-ISCSI_Session_Maps::createConnection(const AX_iSCSI_SessionInfo& info) {
+ISCSI_Session_Maps::createConnection(uint32 session_id, const AX_iSCSI_SessionInfo& info) {
     const String ends = format_text("%s:%s", _view.port_name.c_str(), _target.name.c_str());
     const String id =
-        format_text("VLN:iSCSI Connection:i0x%llx:%s:t%d:%d", isid_of(info), ends.c_str(),
-                    static_cast<int>(info.tsih), static_cast<int>(info.connectionId));
+        format_text("VLN:iSCSI Connection:i0x%llx:%s:t%d:%d:%d", isid_of(info), ends.c_str(),
+                    static_cast<int>(info.tsih), static_cast<int>(info.connectionId),
+                    static_cast<int>(session_id));
     const auto* connection =
         insert_instance(_agent.m_VLNMPCA_iSCSIConnection_map, connection_instance(id, info));
     if (connection)
@@ -137,16 +136,15 @@ ISCSI_Session_Maps::createConnection(const AX_iSCSI_SessionInfo& info) {
     return connection;
 }
 
-bool ISCSI_Session_Maps::joinPipes(const VLNMPCA_iSCSIProtocolEndpoint& endpoint,
+void ISCSI_Session_Maps::joinPipes(const VLNMPCA_iSCSIProtocolEndpoint& endpoint,
                                    const VLNMPCA_iSCSISession& session,
                                    const VLNMPCA_iSCSIConnection& connection) {
-    if (!join(_agent.m_VLNMPCA_iSCSISessionEndpointOfNetworkPipe_map, &endpoint, &session))
-        return false;
+    join(_agent.m_VLNMPCA_iSCSISessionEndpointOfNetworkPipe_map, &endpoint, &session);
     if (_view.tcp_endpoint)
         VLN_LOG(VLN_DBG, "Got VLNMPCA_TCPProtocolEndpoint in the map ");
-    return join(_agent.m_VLNMPCA_iSCSIConnectionEndpointOfNetworkPipe_map, _view.tcp_endpoint,
-                &connection) &&
-           join(_agent.m_VLNMPCA_NetworkPipeComposition_map, &session, &connection);
+    join(_agent.m_VLNMPCA_iSCSIConnectionEndpointOfNetworkPipe_map, _view.tcp_endpoint,
+         &connection);
+    join(_agent.m_VLNMPCA_NetworkPipeComposition_map, &session, &connection);
 }
 
 } // namespace cimple

@@ -14,21 +14,22 @@ public:
     ISCSI_Session_Maps(ProviderAgent& agent, const ISCSI_View& view, ISCSI_Target& target)
         : _agent(agent), _view(view), _target(target) {}
 
-    // session_id: the library's number of the session on the port. False when a store refused an
-    // instance; what was inserted before stays.
-    bool createSession(uint32 session_id, const AX_iSCSI_SessionInfo& info);
+    // session_id: the library's number of the session on the port. What a store refuses costs the
+    // rest of this session; what was inserted before stays.
+    void createSession(uint32 session_id, const AX_iSCSI_SessionInfo& info);
 
 private:
-    bool createClosedSession(uint32 session_id, const AX_iSCSI_SessionInfo& info);
-    bool createOpenSession(uint32 session_id, const AX_iSCSI_SessionInfo& info);
+    void createClosedSession(uint32 session_id, const AX_iSCSI_SessionInfo& info);
+    void createOpenSession(uint32 session_id, const AX_iSCSI_SessionInfo& info);
     void noteTarget(const AX_iSCSI_SessionInfo& info,
                     const VLNMPCA_iSCSIProtocolEndpoint* endpoint);
 
     const VLNMPCA_iSCSIProtocolEndpoint* findOrMakeEndpoint(const AX_iSCSI_SessionInfo& info);
     bool joinEndpoint(const VLNMPCA_iSCSIProtocolEndpoint& endpoint);
-    bool createStatistics(const AX_iSCSI_SessionInfo& info);
-    const VLNMPCA_iSCSIConnection* createConnection(const AX_iSCSI_SessionInfo& info);
-    bool joinPipes(const VLNMPCA_iSCSIProtocolEndpoint& endpoint,
+    bool createStatistics(uint32 session_id, const AX_iSCSI_SessionInfo& info);
+    const VLNMPCA_iSCSIConnection* createConnection(uint32 session_id,
+                                                    const AX_iSCSI_SessionInfo& info);
+    void joinPipes(const VLNMPCA_iSCSIProtocolEndpoint& endpoint,
                    const VLNMPCA_iSCSISession& session, const VLNMPCA_iSCSIConnection& connection);
 
     ProviderAgent& _agent;

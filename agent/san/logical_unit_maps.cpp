@@ -69,6 +69,7 @@ struct Shared_Texts {
     const String capacity_unit{"Byte"};
     const String device_name_label{"OS Device Name"};
     const String inquiry_label{INQUIRY_LABEL<T>};
+    const String no_text{NO_TEXT};
 
     static const Shared_Texts& get() {
         static const Shared_Texts texts;
@@ -115,7 +116,8 @@ void describe(VLNMPCA_TapeDrive& drive, const Logical_Unit& unit) {
 // The device's name comes first, always: readers go by the position.
 template <class T>
 void append_identities(T& device, const Logical_Unit& unit) {
-    device.OtherIdentifyingInfo.append(unit.os_device_name);
+    device.OtherIdentifyingInfo.append(unit.os_device_name.empty() ? Shared_Texts<T>::get().no_text
+                                                                   : unit.os_device_name);
     device.IdentifyingDescriptions.append(Shared_Texts<T>::get().device_name_label);
     device.OtherIdentifyingInfo.append(unit.inquiry);
     device.IdentifyingDescriptions.append(Shared_Texts<T>::get().inquiry_label);
@@ -131,7 +133,8 @@ Ref<Instance> device_instance(const Logical_Unit& unit, const CIM_ComputerSystem
     device->Name.set(unit.name);
     device->ElementName.set(unit.name);
     device->Description.set(unit.description);
-    device->Capacity.set(unit.capacity);
+    if (unit.block_size != 0)
+        device->Capacity.set(unit.capacity);
     device->CapacityUnit.set(Shared_Texts<T>::get().capacity_unit);
     append_identities(*device, unit);
     describe(*device, unit);
@@ -234,8 +237,10 @@ Ref<Instance> Logical_Unit_Maps::findOrMake(const Logical_Unit& unit) {
     const Unit_Class& unit_class = find_peripheral_type(unit.peripheral_type).unit_class;
     Instance_Map_Base& store = _agent.store(unit_class.store);
     const Ref<Instance> device = unit_class.make(unit, *_system);
+    if (const Instance* known = store.lookup(device.get()))
+        return association_end(known);
     if (!insert_instance(store, device))
-        return association_end(store.lookup(device.get()));
+        return {};
     Instance_Map_Base& system_devices = _agent.store(unit_class.system_device);
     VLN_LOG(VLN_DBG, "Generating %s (%s: %s)", system_devices.meta_class()->name, unit_class.text,
             unit.device_id.c_str());

@@ -22,7 +22,7 @@ struct Logical_Unit {
     String os_device_name; // empty for none
     String inquiry;        // what the unit told of itself, as one text
     uint64 capacity = 0;   // bytes
-    uint64 block_size = 0; // bytes; 0 for a unit without blocks
+    uint64 block_size = 0; // bytes; 0 for a unit without blocks, or that does not tell of them
     uint64 number_of_blocks = 0;
     // The type of the first descriptor of its device identification page (SPC-3, 7.6.3.1).
     std::optional<uint32> identifier_type = {};
@@ -48,8 +48,7 @@ public:
     Logical_Unit_Maps(ProviderAgent& agent, const CIM_ComputerSystem* system);
 
     // Puts the unit into the store of its class and ties it to the computer system. Answers it as
-    // the end of an association; for a unit that two ports see under one key the one that stands
-    // there already, after the line of a failed insertion.
+    // the end of an association; a unit that two ports see under one key stands once.
     Ref<Instance> findOrMake(const Logical_Unit& unit);
 
     // The path to a unit that findOrMake answered. False, with a line in the log, if an end is

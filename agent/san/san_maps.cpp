@@ -13,13 +13,6 @@ namespace {
 
 constexpr uint32 PASS_FAILED = 32769;
 
-// Associations of the adapter pass that name an endpoint of the SAN pass.
-constexpr Store_Id JOINED_TO_SAN[] = {
-    STORE_VLNMPCA_SAPAvailableForEthernetPort,
-    STORE_VLNMPCA_iSCSIProtocolEndpointSAPImplementation,
-    STORE_VLNMPCA_iSCSIBindsToTCP,
-};
-
 } // namespace
 
 uint32 ProviderAgent::updateSANMaps() {
@@ -29,7 +22,7 @@ uint32 ProviderAgent::updateSANMaps() {
 uint32 SAN_Map_Builder::run() {
     VLN_LOG(VLN_DBG, "PERF: updateSANMaps: Entry");
     const bool complete = run_guarded([this] {
-        clearMaps();
+        _agent.clearSANMaps();
         createISCSIClasses();
         createFCClasses();
     });
@@ -39,12 +32,6 @@ uint32 SAN_Map_Builder::run() {
     }
     VLN_LOG(VLN_DBG, "PERF: updateSANMaps: cleanExit");
     return 0;
-}
-
-void SAN_Map_Builder::clearMaps() {
-    _agent.clearSANMaps();
-    for (Store_Id store : JOINED_TO_SAN)
-        _agent.store(store).clear();
 }
 
 void SAN_Map_Builder::createISCSIClasses() {

@@ -17,7 +17,6 @@ public:
     uint32 run();
 
 private:
-    void clearMaps();
     void createISCSIClasses();
     void createFCClasses();
 

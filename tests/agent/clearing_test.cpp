@@ -43,7 +43,7 @@ TEST_F(Clearing_Test, EveryStoreIsInOneGroup) {
     EXPECT_EQ(sizes[Store_Group::RECORD_LOG], 5);
     EXPECT_EQ(sizes[Store_Group::SOFTWARE_UPDATE_SERVICE], 2);
     EXPECT_EQ(sizes[Store_Group::SAN_FCOE], 17);
-    EXPECT_EQ(sizes[Store_Group::SAN_ISCSI], 17);
+    EXPECT_EQ(sizes[Store_Group::SAN_ISCSI], 20);
     EXPECT_EQ(sizes[Store_Group::KEPT], 7);
     EXPECT_EQ(sizes[Store_Group::REBUILT], 26);
 }
@@ -97,7 +97,7 @@ TEST_F(Clearing_Test, EveryProviderClassHasItsRow) {
     }
     EXPECT_EQ(without_store, 6);
     EXPECT_EQ(with_three, 3);
-    EXPECT_EQ(shapes[Pattern_Shape::SAN_GROUP], 34);
+    EXPECT_EQ(shapes[Pattern_Shape::SAN_GROUP], 37);
     EXPECT_EQ(shapes[Pattern_Shape::ACTIVE], 6);
 }
 

@@ -30,21 +30,6 @@ protected:
     }
 };
 
-TEST_F(Logical_Units_Test, AUnitSeenTwiceStandsOnce) {
-    Loaded_Agent agent;
-    const auto system = make_instance<CIM_ComputerSystem>();
-    Logical_Unit_Maps maps(*agent, system.get());
-    Log_Capture log;
-    const auto first = maps.findOrMake(tape(1));
-    ASSERT_TRUE(first);
-    const auto second = maps.findOrMake(tape(1));
-    ASSERT_TRUE(second);
-    EXPECT_TRUE(key_eq(first.get(), second.get()));
-    EXPECT_EQ(agent->store(STORE_VLNMPCA_TapeDrive).size(), 1u);
-    EXPECT_EQ(agent->store(STORE_VLNMPCA_TapeDriveSystemDevice).size(), 1u);
-    EXPECT_EQ(log.count(VLN_CRIT, "Insert Failed : m_VLNMPCA_TapeDrive_map"), 1);
-}
-
 TEST_F(Logical_Units_Test, APathNeedsItsEndsAndStandsOnce) {
     Loaded_Agent agent;
     const auto system = make_instance<CIM_ComputerSystem>();

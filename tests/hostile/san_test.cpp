@@ -56,7 +56,7 @@ TEST(Bad_San, UnitsThatDoNotAnswerAreShownAsTheyAre) {
                           {{"DeviceID", silent ? "100002564C000001_502564C000000001_1_"
                                                : "100002564C000001_502564C000000001_0_"},
                            {"Description", "Unknown Unknown Revision Unkn"},
-                           {"Capacity", "0"},
+                           {"Capacity", "-"},
                            {"BlockSize", "-"},
                            {"NumberOfBlocks", "-"},
                            {"NameFormat", "-"}});

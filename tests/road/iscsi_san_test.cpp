@@ -2,6 +2,7 @@
 #include "tests/road/properties.h"
 
 #include <algorithm>
+#include <fstream>
 
 using road::end_of;
 using road::expect_properties;
@@ -57,7 +58,7 @@ TEST(ISCSI_SAN, AnOpenSession) {
     ASSERT_EQ(statistics.size(), 7u);
     expect_properties(
         statistics[0],
-        {{"InstanceID", "VLN:Session Statistics:100002564C000002:" ARRAY_A ":i0x400002560001:t1"},
+        {{"InstanceID", "VLN:Session Statistics:100002564C000002:" ARRAY_A ":i0x400002560001:t1:1"},
          {"BytesTransmitted", "78187493530"},
          {"BytesReceived", "4096"},
          {"CommandPDUsTransferred", "77"},
@@ -75,7 +76,7 @@ TEST(ISCSI_SAN, ConnectionsOfBothAddressFamilies) {
     ASSERT_EQ(connections.size(), 7u);
     expect_properties(
         connections[0],
-        {{"InstanceID", "VLN:iSCSI Connection:i0x400002560001:100002564C000002:" ARRAY_A ":t1:0"},
+        {{"InstanceID", "VLN:iSCSI Connection:i0x400002560001:100002564C000002:" ARRAY_A ":t1:0:1"},
          {"StatusDescriptions", "{CONNECTED}"},
          {"SourcePort", "49200"},
          {"DestinationPort", "3260"},
@@ -170,6 +171,45 @@ TEST(ISCSI_SAN, EndpointsOfSessionsAndTargets) {
                                    {"Identifier", "0x2"},
                                    {"Role", "3"}});
     EXPECT_EQ(text_of(targets[1], "Name"), std::string(ARRAY_A ":") + SECOND);
+}
+
+// Whoever asks first is shown the whole SAN: when refreshes leave it out, and while the scan of an
+// FC port that comes before it goes slowly.
+TEST(ISCSI_SAN, WhatJoinsTheAdapterPassWithTheSanWaitsForTheSan) {
+    const std::string both = R"({"include": ")" VLN_SCENARIOS R"(/parts/cna.json", "cards": [
+        {"use": "cna", "functions": [{"use": "nic"},
+         {"use": "iscsi", "iscsiTargets": {"sessions": {}}},
+         {"use": "fcoe", "targets": {"luns": 1}}]}]})";
+    for (const char* association :
+         {"VLNMPCA_SAPAvailableForEthernetPort", "VLNMPCA_iSCSIProtocolEndpointSAPImplementation",
+          "VLNMPCA_iSCSIBindsToTCP"}) {
+        Road left_out({.scenario = both});
+        std::ofstream(left_out.root() / "etc/vorlan_mpca_provider.conf")
+            << "VLN_PROVIDER_REFRESH_SANDATA = FALSE\n";
+        EXPECT_EQ(count_of(left_out, association), 1u) << association;
+        left_out.close();
+
+        Road slow({.scenario = both});
+        vlnsim_use_system_clock(); // on which a delay takes its time
+        vlnsim_fault("HBA_GetFcpTargetMapping", VLNSIM_EVERY, VLNSIM_DELAY, 20000);
+        EXPECT_EQ(count_of(slow, association), 1u) << association;
+    }
+}
+
+// A login that is not through has no handle of the target's yet: the library's number tells two of
+// them apart.
+TEST(ISCSI_SAN, TwoSessionsInLoginOnOneTarget) {
+    Road road({.scenario = R"({"include": ")" VLN_SCENARIOS R"(/parts/cna.json", "cards": [
+        {"use": "cna", "functions": [{"use": "nic"}, {"use": "iscsi", "iscsiTargets": [
+         {"sessions": {"count": 2, "isidQualifier": 1, "tsih": 0, "state": "loginInProgress"}},
+         {}]}]}]})",
+               .log = true});
+    EXPECT_EQ(count_of(road, "VLNMPCA_iSCSISession"), 2u);
+    EXPECT_EQ(count_of(road, "VLNMPCA_ISCSISessionStatistics"), 2u);
+    EXPECT_EQ(count_of(road, "VLNMPCA_iSCSIConnection"), 2u);
+    EXPECT_EQ(count_of(road, "VLNMPCA_iSCSITargetProtocolEndpoint"), 2u);
+    road.close();
+    EXPECT_EQ(road.faults_in_log(), "");
 }
 
 TEST(ISCSI_SAN, UnitsOfEveryTypeAndTheirPaths) {
@@ -277,13 +317,16 @@ TEST(ISCSI_SAN, FailuresCostWhatTheyTouch) {
     }
 }
 
-// The walk of a port ends at what a store refuses; what stands stays, and so do the other ports.
+// A session that a store refuses costs no more than itself; the walk of a port ends at a target
+// that one refuses. What stands stays, and so do the other ports.
 TEST(ISCSI_SAN, ATargetThatIsListedTwiceEndsTheWalkOfItsPort) {
     Road road({.scenario = R"({"include": ")" VLN_SCENARIOS R"(/parts/cna.json", "cards": [
         {"use": "cna", "functions": [{"use": "nic"}, {"use": "iscsi"}], "ports": [
-         {"iscsiTargets": [{"count": 2, "name": "iqn.2010-04.com.example:twice"}, {}]},
+         {"iscsiTargets": [{"count": 2, "name": "iqn.2010-04.com.example:twice", "sessions": {}},
+                           {"sessions": {}}]},
          {"iscsiTargets": {"count": 3}}]}]})",
                .log = true});
+    EXPECT_EQ(count_of(road, "VLNMPCA_iSCSISession"), 2u);
     EXPECT_EQ(count_of(road, "VLNMPCA_iSCSITargetProtocolEndpoint"), 4u);
     EXPECT_EQ(count_of(road, "VLNMPCA_iSCSILocalHostedAccessPoint"), 4u);
     road.close();

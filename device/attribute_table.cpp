@@ -2,9 +2,6 @@
 
 #include "foundation/log.h"
 
-#include <algorithm>
-#include <cstring>
-
 namespace cimple {
 
 void readValue(const Attribute_Family& family, Attribute_Buffer& buffer, uint16 identifier,
@@ -29,14 +26,10 @@ void readValue(const Attribute_Family& family, Attribute_Buffer& buffer, uint16 
 void readValue(const Attribute_Family&, Attribute_Buffer& buffer, uint16 identifier,
                const char* label, Fc4_Types& types) {
     AX_STATUS status = AX_STATUS_OK;
-    std::size_t reported = 0;
-    std::size_t room = 0;
-    const uint8* value = buffer.find(identifier, status, reported, room);
-    if (status != AX_STATUS_OK || !value) {
+    if (!buffer.readUpTo(identifier, types.data(), types.size(), status)) {
         VLN_LOG(VLN_DBG, "ERROR: AX_GetPortAttributes HA_%s call failed (%d)", label, status);
         return;
     }
-    std::memcpy(types.data(), value, std::min({reported, room, types.size()}));
     for (uint8 byte : types)
         VLN_LOG(VLN_DBG, "PA_PORT_SERVICE_TYPE: [ %d ]", byte);
 }

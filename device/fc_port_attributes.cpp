@@ -14,9 +14,9 @@ FCPortAttributes::FCPortAttributes(Adapter& adapter, uint32 portIndex) {
     readPublishedRecord(adapter.getAdapterName(), portIndex);
     VLN_LOG(VLN_DBG, "Port's WWPN: %s", PortWWN.c_str());
     Attribute_Buffer buffer = fetchPortAttributes(wwnOfPort(PortWWN));
-    getPortAttributeNumber(buffer, 802, "_PortState", &PortState);
+    getPortAttributeNumber(buffer, AX_PA_PHYSICAL_PORT_STATE, "_PortState", &PortState);
     VLN_LOG(VLN_DBG, "Physical port state for FC Port: %d", PortState);
-    getPortAttributeNumber(buffer, 864, "_FECState", &FECState);
+    getPortAttributeNumber(buffer, AX_PA_FEC_STATE, "_FECState", &FECState);
     VLN_LOG(VLN_DBG, "FEC state for FC Port: %d", FECState);
 }
 

@@ -4,7 +4,6 @@
 #include "foundation/log.h"
 
 #include <algorithm>
-#include <cstring>
 #include <exception>
 #include <iterator>
 
@@ -12,34 +11,36 @@ namespace cimple {
 
 namespace {
 
-// The identifiers in the order of the counters.
-constexpr uint16 MEMBER_ORDER[PortStatistics::NUM_COUNTERS] = {
-    1025, 1030, 1032, 1031, 1033, 1036, 1037, 1038, 1039, 1040, 1041, 1042, 1043,
-    1044, 1045, 1028, 1029, 1026, 1027, 1048, 1047, 1058, 1046, 1057, 1059};
-
-// The same in the order in which the library is asked.
-constexpr uint16 FETCH_ORDER[PortStatistics::NUM_COUNTERS + 1] = {
-    1025, 1026, 1027, 1028, 1029, 1030, 1031, 1032, 1033, 1036, 1037, 1038, 1039,
-    1040, 1041, 1042, 1043, 1044, 1045, 1046, 1047, 1048, 1057, 1058, 1059, 0};
-
-std::size_t place_of(uint16 identifier) {
-    return static_cast<std::size_t>(
-        std::find(std::begin(MEMBER_ORDER), std::end(MEMBER_ORDER), identifier) -
-        std::begin(MEMBER_ORDER));
-}
+// In the order in which the library is asked, which is that of their numbers.
+constexpr uint16 COUNTERS[PortStatistics::NUM_COUNTERS] = {
+    AX_PS_PACKETS_TRANSMITTED,
+    AX_PS_EXCHANGES_RESPONDED,
+    AX_PS_ACTIVE_XRIS,
+    AX_PS_RX_SEQUENCES,
+    AX_PS_EXCHANGES_ORIGINATED,
+    AX_PS_WORDS_TRANSMITTED,
+    AX_PS_WORDS_RECEIVED,
+    AX_PS_PACKETS_RECEIVED,
+    AX_PS_LIPS,
+    AX_PS_NOS,
+    AX_PS_ERROR_FRAMES,
+    AX_PS_DUMPED_FRAMES,
+    AX_PS_LINK_FAILURES,
+    AX_PS_LOSSES_OF_SYNC,
+    AX_PS_LOSSES_OF_SIGNAL,
+    AX_PS_PRIMITIVE_SEQUENCE_ERRORS,
+    AX_PS_INVALID_WORDS,
+    AX_PS_CRC_ERRORS,
+    AX_PS_TX_SEQUENCES,
+    AX_PS_PRIMITIVE_SEQUENCE_TIMEOUTS,
+    AX_PS_ELASTIC_BUFFER_OVERRUNS,
+    AX_PS_ACTIVE_RPIS,
+    AX_PS_ARBITRATION_TIMEOUTS,
+    AX_PS_LINK_TRANSITIONS,
+    AX_PS_COUNTER_1059,
+};
 
 constexpr uint64 NO_VALUE = ~uint64{0};
-
-uint64 read_counter(Attribute_Buffer& buffer, uint16 identifier) {
-    AX_STATUS status = AX_STATUS_OK;
-    std::size_t reported = 0;
-    std::size_t room = 0;
-    const uint8* value = buffer.find(identifier, status, reported, room);
-    uint64 counter = NO_VALUE;
-    if (value && status == AX_STATUS_OK && room >= sizeof counter)
-        std::memcpy(&counter, value, sizeof counter);
-    return counter;
-}
 
 } // namespace
 
@@ -52,16 +53,18 @@ PortStatistics::PortStatistics(const std::string& portName) {
         VLN_LOG(VLN_ERR, "ERROR: AX_GetPortStatistics call failed (%d)", status);
         throw std::exception();
     }
-    for (const uint16* identifier = FETCH_ORDER; *identifier != 0; ++identifier) {
-        const uint64 counter = read_counter(buffer, *identifier);
-        if (counter != NO_VALUE)
-            m_counters[place_of(*identifier)] = counter;
+    for (std::size_t i = 0; i < NUM_COUNTERS; ++i) {
+        uint64 counter = NO_VALUE;
+        AX_STATUS ignored = AX_STATUS_OK;
+        if (buffer.read(COUNTERS[i], &counter, sizeof counter, ignored) && counter != NO_VALUE)
+            m_counters[i] = counter;
     }
 }
 
 uint64 PortStatistics::counter(uint16 identifier) const {
-    const std::size_t place = place_of(identifier);
-    return place < NUM_COUNTERS ? m_counters[place] : NOT_REPORTED;
+    const auto* place = std::find(std::begin(COUNTERS), std::end(COUNTERS), identifier);
+    return place == std::end(COUNTERS) ? NOT_REPORTED
+                                       : m_counters[static_cast<std::size_t>(place - COUNTERS)];
 }
 
 } // namespace cimple

@@ -161,16 +161,9 @@ void walk(char* buffer, Take take) {
 // Reads the data with call(wwn, buffer, size) and hands each entry to take(entry).
 template <class Call, class Take>
 AX_STATUS read_entries(const char* deviceId, const char* function, Call call, Take take) {
-    char colonForm[VLN_Identifiers::HBA_NAME_SIZE];
-    if (VLN_Identifiers::Id2HBAName(colonForm, deviceId) != 0) {
-        VLN_LOG(VLN_DBG, "Id2HBAName failed");
-        return AX_STATUS_ERROR;
-    }
     HBA_WWN name{};
-    if (VLN_Identifiers::str2HBAName(&name, colonForm) != 0) {
-        VLN_LOG(VLN_DBG, "str2HBAName failed");
+    if (!nameOfDeviceId(deviceId, name, "", VLN_DBG))
         return AX_STATUS_ERROR;
-    }
     const auto buffer = std::make_unique<char[]>(AX_VPD_BUFFER_SIZE + ROOM_BEHIND);
     uint32 size = AX_VPD_BUFFER_SIZE;
     const AX_STATUS status = call(AX_WwnOf(&name), buffer.get(), &size);

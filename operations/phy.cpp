@@ -57,8 +57,7 @@ AX_STATUS VLN_MethodWrapper::GetPhyPortSpeedAttributesValues(const HBA_WWN* name
     AX_STATUS status = AX_STATUS_ERROR;
     const bool complete = run_guarded([&] {
         Attribute_Buffer buffer(AX_PORT_ATTRIBUTES_SIZE);
-        uint32 size = buffer.size();
-        status = AX_GetPortAttributes(wwnOf(name), buffer.data(), &size);
+        status = fetchPortAttributes(wwnOf(name), buffer);
         if (status == AX_STATUS_OK)
             readSettings(buffer, *settings);
         else

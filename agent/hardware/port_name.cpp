@@ -6,18 +6,7 @@
 namespace cimple {
 
 bool port_name_to_wwn(const String& port_name, HBA_WWN& wwn) {
-    char colon_form[VLN_MethodWrapper::HBA_NAME_SIZE];
-    // A text shorter than a name must not be read past its end.
-    const bool long_enough = port_name.size() >= 16;
-    if (!long_enough || VLN_MethodWrapper::Id2HBAName(colon_form, port_name.c_str()) != 0) {
-        VLN_LOG(VLN_ERR, "VLNMPCA_Ethernetport::Id2HBAName failed");
-        return false;
-    }
-    if (VLN_MethodWrapper::str2HBAName(&wwn, colon_form) != 0) {
-        VLN_LOG(VLN_ERR, "VLNMPCA_Ethernetport::str2HBAName failed");
-        return false;
-    }
-    return true;
+    return nameOfDeviceId(port_name.c_str(), wwn, "VLNMPCA_Ethernetport::", VLN_ERR);
 }
 
 String asic_name(const AdapterAttributes& adapter) {

@@ -1,9 +1,10 @@
 // The background thread that polls the state of the logical ports.
 
 #include "agent/provider_agent.h"
-#include "agent/status/dynamic_reading.h"
 #include "agent/status/dynamic_status.h"
 #include "cimple/guard.h"
+#include "device/library/attribute_buffer.h"
+#include "device/library/identifiers.h"
 
 #include <algorithm>
 #include <exception>
@@ -37,15 +38,15 @@ Attribute_Buffer fetch_states(AX_WWN wwn) {
 // Throws std::exception, and leaves the row, unless both states can be read.
 void read_states(Dynamic_Port_Row& row) {
     AX_WWN wwn{};
-    if (!wwn_of_name(row.name, wwn))
+    if (!wwnOfName(row.name, wwn, VLN_DBG))
         throw std::exception();
     Attribute_Buffer buffer = fetch_states(wwn);
     uint32 functional_state = 0;
     uint32 physical_state = 0;
-    if (!read_number(buffer, FUNCTIONAL_PORT_STATE, "ERROR: AX_GetttributeValue for PortState",
-                     functional_state) ||
-        !read_number(buffer, PHYSICAL_PORT_STATE,
-                     "ERROR: AX_GetttributeValue for PhysicalPortState", physical_state))
+    if (!getStatusNumber(buffer, AX_PA_FUNCTIONAL_PORT_STATE,
+                         "ERROR: AX_GetttributeValue for PortState", functional_state) ||
+        !getStatusNumber(buffer, AX_PA_PHYSICAL_PORT_STATE,
+                         "ERROR: AX_GetttributeValue for PhysicalPortState", physical_state))
         throw std::exception();
     row.functional_state = functional_state;
     row.physical_state = physical_state;

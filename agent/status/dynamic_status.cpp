@@ -3,9 +3,7 @@
 #include "agent/status/dynamic_status.h"
 
 #include "agent/provider_agent.h"
-#include "agent/status/dynamic_reading.h"
 
-#include <cstring>
 #include <iterator>
 
 namespace cimple {
@@ -47,38 +45,6 @@ bool update_due(ProviderAgent& agent, Dynamic_Update update) {
         return false;
     }
     last = now;
-    return true;
-}
-
-bool wwn_of_name(const char* name, AX_WWN& wwn) {
-    HBA_WWN binary{};
-    if (VLN_MethodWrapper::string2HBAName(&binary, name) != 1) {
-        VLN_LOG(VLN_DBG, "VLN_MethodWrapper::string2HBAName failed");
-        return false;
-    }
-    wwn = AX_WwnOf(&binary);
-    return true;
-}
-
-bool fetch_port_attributes(AX_WWN wwn, Attribute_Buffer& buffer, const char* what) {
-    uint32 size = buffer.size();
-    const AX_STATUS status = AX_GetPortAttributes(wwn, buffer.data(), &size);
-    if (status != AX_STATUS_OK)
-        VLN_LOG(VLN_ERR, "%s call failed (%d)", what, static_cast<int>(status));
-    return status == AX_STATUS_OK;
-}
-
-bool read_bytes(Attribute_Buffer& buffer, uint16 identifier, const char* what, void* value,
-                std::size_t count) {
-    AX_STATUS status = AX_STATUS_ERROR;
-    std::size_t reported = 0;
-    std::size_t room = 0;
-    const uint8* found = buffer.find(identifier, status, reported, room);
-    if (!found || status != AX_STATUS_OK || room < count) {
-        VLN_LOG(VLN_ERR, "%s call failed (%d)", what, static_cast<int>(status));
-        return false;
-    }
-    std::memcpy(value, found, count);
     return true;
 }
 

@@ -2,13 +2,13 @@
 
 #include "agent/provider_agent.h"
 #include "agent/state_tables.h"
-#include "agent/status/dynamic_reading.h"
 #include "agent/status/dynamic_status.h"
 #include "agent/store_search.h"
 #include "agent/text.h"
 #include "cimple/guard.h"
 #include "classes/VLNMPCA_FCPort.h"
 #include "classes/VLNMPCA_FCPortStatistics.h"
+#include "device/library/attribute_buffer.h"
 
 #include <cstring>
 #include <optional>
@@ -37,7 +37,7 @@ void for_each_fcoe_port(ProviderAgent& agent, Update update) {
 
 // ---- Ports ----
 
-std::optional<Attribute_Buffer> fetch_attributes(AX_WWN wwn) {
+std::optional<Attribute_Buffer> fetch_attributes(const std::string& name) {
     std::optional<Attribute_Buffer> buffer;
     try {
         buffer.emplace(AX_PORT_ATTRIBUTES_SIZE);
@@ -45,7 +45,7 @@ std::optional<Attribute_Buffer> fetch_attributes(AX_WWN wwn) {
         VLN_LOG(VLN_ERR, "ERROR: vlncimGetPortAttributes: Unable to allocate buffer");
         return buffer;
     }
-    if (!fetch_port_attributes(wwn, *buffer, "AX_GetPortAttributes"))
+    if (!fetchStatus(name.c_str(), *buffer, "AX_GetPortAttributes"))
         buffer.reset();
     return buffer;
 }
@@ -55,26 +55,27 @@ void read_port(Attribute_Buffer& buffer, VLNMPCA_FCPort& port) {
     constexpr char STATE[] = "ERROR: AX_GetttributeValue for PortState";
     uint32 number = 0;
     uint8 detail = 0;
-    if (!read_number(buffer, PHYSICAL_PORT_STATE, STATE, number))
+    if (!getStatusNumber(buffer, AX_PA_PHYSICAL_PORT_STATE, STATE, number))
         return;
     replace_port_state(&port, find_fcoe_port_state(number));
-    if (!read_number(buffer, FUNCTIONAL_PORT_STATE, STATE, detail))
+    if (!getStatusNumber(buffer, AX_PA_FUNCTIONAL_PORT_STATE, STATE, detail))
         return;
     port.DetailedStatus.set(detail);
-    if (!read_number(buffer, PORT_TYPE, "ERROR: AX_GetttributeValue for PortType", number))
+    if (!getStatusNumber(buffer, AX_PA_PORT_TYPE, "ERROR: AX_GetttributeValue for PortType",
+                         number))
         return;
     const Port_Type& type = find_port_type(number);
     port.PortType.set(type.port_type);
     port.OtherPortType.set(type.name);
-    if (!read_number(buffer, PORT_SPEED, "AX_GetttributeValue for PortSpeed", number))
+    if (!getStatusNumber(buffer, AX_PA_PORT_SPEED, "AX_GetttributeValue for PortSpeed", number))
         return;
     port.Speed.set(speed_of_code(number));
-    if (!read_number(buffer, PHYSICAL_PORT_SPEED, "AX_GetttributeValue for PhysicalPortSpeed",
-                     number))
+    if (!getStatusNumber(buffer, AX_PA_PHYSICAL_PORT_SPEED,
+                         "AX_GetttributeValue for PhysicalPortSpeed", number))
         return;
     port.PhysicalPortSpeed.set(speed_of_code(number));
     Attribute_Text speed;
-    if (getAttributeText(PORT_FAMILY, speed, buffer, FUNCTIONAL_PORT_SPEED,
+    if (getAttributeText(PORT_FAMILY, speed, buffer, AX_PA_FUNCTIONAL_PORT_SPEED,
                          "FunctionalPortSpeed") == AX_STATUS_OK)
         port.FunctionalPortSpeed.set(text(speed));
 }
@@ -84,10 +85,9 @@ void update_port(const ProviderAgent& agent, const std::string& name) {
     auto* port = find_first(agent.m_VLNMPCA_FCPort_map, [&](const VLNMPCA_FCPort& candidate) {
         return holds(candidate.DeviceID.value, name);
     });
-    AX_WWN wwn{};
-    if (!port || !wwn_of_name(name.c_str(), wwn))
+    if (!port)
         return;
-    if (auto buffer = fetch_attributes(wwn))
+    if (auto buffer = fetch_attributes(name))
         read_port(*buffer, *port);
 }
 
@@ -109,30 +109,30 @@ using S = VLNMPCA_FCPortStatistics;
 
 // Every counter that has a property; 1059 has none.
 constexpr Counter_Row COUNTERS[] = {
-    {1030, &S::BytesTransmitted, Counter_Rule::WORDS},
-    {1031, &S::BytesReceived, Counter_Rule::WORDS},
-    {1025, &S::PacketsTransmitted},
-    {1032, &S::PacketsReceived},
-    {1033, &S::LIPCount},
-    {1036, &S::NOSCount, Counter_Rule::REPORTED_ONLY},
-    {1037, &S::ErrorFrames},
-    {1038, &S::DumpedFrames, Counter_Rule::REPORTED_ONLY},
-    {1039, &S::LinkFailures},
-    {1041, &S::LossOfSignalCounter},
-    {1040, &S::LossOfSyncCounter},
-    {1042, &S::PrimitiveSeqProtocolErrCount},
-    {1044, &S::CRCErrors},
-    {1043, &S::InvalidTransmissionWords},
-    {1045, &S::TxSequences},
-    {1028, &S::RxSequences},
-    {1029, &S::ExCountOrig},
-    {1026, &S::ExCountResp},
-    {1027, &S::ActiveXRIs},
-    {1048, &S::ActiveRPIs},
-    {1047, &S::ElasticBufOverruns},
-    {1058, &S::LinkTransitions},
-    {1046, &S::PrimitiveSeqTimesouts},
-    {1057, &S::ArbitrationTimeouts},
+    {AX_PS_WORDS_TRANSMITTED, &S::BytesTransmitted, Counter_Rule::WORDS},
+    {AX_PS_WORDS_RECEIVED, &S::BytesReceived, Counter_Rule::WORDS},
+    {AX_PS_PACKETS_TRANSMITTED, &S::PacketsTransmitted},
+    {AX_PS_PACKETS_RECEIVED, &S::PacketsReceived},
+    {AX_PS_LIPS, &S::LIPCount},
+    {AX_PS_NOS, &S::NOSCount, Counter_Rule::REPORTED_ONLY},
+    {AX_PS_ERROR_FRAMES, &S::ErrorFrames},
+    {AX_PS_DUMPED_FRAMES, &S::DumpedFrames, Counter_Rule::REPORTED_ONLY},
+    {AX_PS_LINK_FAILURES, &S::LinkFailures},
+    {AX_PS_LOSSES_OF_SIGNAL, &S::LossOfSignalCounter},
+    {AX_PS_LOSSES_OF_SYNC, &S::LossOfSyncCounter},
+    {AX_PS_PRIMITIVE_SEQUENCE_ERRORS, &S::PrimitiveSeqProtocolErrCount},
+    {AX_PS_CRC_ERRORS, &S::CRCErrors},
+    {AX_PS_INVALID_WORDS, &S::InvalidTransmissionWords},
+    {AX_PS_TX_SEQUENCES, &S::TxSequences},
+    {AX_PS_RX_SEQUENCES, &S::RxSequences},
+    {AX_PS_EXCHANGES_ORIGINATED, &S::ExCountOrig},
+    {AX_PS_EXCHANGES_RESPONDED, &S::ExCountResp},
+    {AX_PS_ACTIVE_XRIS, &S::ActiveXRIs},
+    {AX_PS_ACTIVE_RPIS, &S::ActiveRPIs},
+    {AX_PS_ELASTIC_BUFFER_OVERRUNS, &S::ElasticBufOverruns},
+    {AX_PS_LINK_TRANSITIONS, &S::LinkTransitions},
+    {AX_PS_PRIMITIVE_SEQUENCE_TIMEOUTS, &S::PrimitiveSeqTimesouts},
+    {AX_PS_ARBITRATION_TIMEOUTS, &S::ArbitrationTimeouts},
 };
 
 void copy_counters(const PortStatistics& counters, VLNMPCA_FCPortStatistics& statistics) {

@@ -4,13 +4,14 @@
 #include "agent/hardware/port_identity.h"
 #include "agent/provider_agent.h"
 #include "agent/state_tables.h"
-#include "agent/status/dynamic_reading.h"
 #include "agent/status/dynamic_status.h"
 #include "agent/store_search.h"
 #include "cimple/guard.h"
 #include "classes/VLNMPCA_Card.h"
 #include "classes/VLNMPCA_EthernetPort.h"
 #include "classes/VLNMPCA_PortController.h"
+#include "device/library/attribute_buffer.h"
+#include "device/library/identifiers.h"
 
 #include <cstring>
 
@@ -137,12 +138,10 @@ void show_port_status(ProviderAgent& agent) {
 void update_phy_link_down_reason(const ProviderAgent& agent, VLNMPCA_PortController& controller,
                                  Attribute_Buffer& buffer) {
     const auto* port = find_port(agent, IDENTITY_PHYSICAL_PORT, controller.DeviceID.value);
-    AX_WWN wwn{};
     uint32 reason = 0;
-    if (port && wwn_of_name(port->DeviceID.value.c_str(), wwn) &&
-        fetch_port_attributes(wwn, buffer, "ERROR: AX_GetPortAttributes") &&
-        read_number(buffer, PHY_LINK_DOWN_REASON,
-                    "ERROR: AX_GetttributeValue for _PhyLinkDownReason", reason))
+    if (port && fetchStatus(port->DeviceID.value.c_str(), buffer, "ERROR: AX_GetPortAttributes") &&
+        getStatusNumber(buffer, AX_PA_PHY_LINK_DOWN_REASON,
+                        "ERROR: AX_GetttributeValue for _PhyLinkDownReason", reason))
         controller.PhyLinkDownReason.set(reason);
 }
 
@@ -188,14 +187,14 @@ void UpdatePhyLinkDownReason(ProviderAgent& agent) {
 
 void readBoardTemperature(const char* port_name, VLNMPCA_Card& card) {
     AX_WWN wwn{};
-    if (!wwn_of_name(port_name, wwn))
+    if (!wwnOfName(port_name, wwn, VLN_DBG))
         return;
     const bool complete = run_guarded([&] {
         Attribute_Buffer buffer = fetchAdapterAttributes(wwn);
         // The bytes above the first are the temperature's thresholds.
         uint8 celsius = 0;
-        if (read_number(buffer, BOARD_TEMPERATURE,
-                        "ERROR: AX_GetttributeValue for _BoardTemperature", celsius))
+        if (getStatusNumber(buffer, AX_HA_BOARD_TEMPERATURE,
+                            "ERROR: AX_GetttributeValue for _BoardTemperature", celsius))
             card.BoardTemperature.set(celsius);
     });
     if (!complete)

@@ -12,25 +12,47 @@ namespace cimple {
 
 constexpr Attribute_Family ADAPTER_FAMILY = {Attribute_Family::ADAPTER, AX_STATUS_ERROR};
 constexpr Attribute_Family PORT_FAMILY = {Attribute_Family::PORT, AX_STATUS_OK};
+constexpr Attribute_Family STATUS_FAMILY = {Attribute_Family::STATUS, AX_STATUS_OK};
 
-const uint8* Attribute_Buffer::find(uint16 identifier, AX_STATUS& status, std::size_t& reported,
-                                    std::size_t& room) {
+struct Attribute_Buffer::Value {
+    const uint8* bytes;   // null for none
+    std::size_t reported; // its length as the library tells it
+    std::size_t room;     // what the buffer has from the value on
+};
+
+Attribute_Buffer::Value Attribute_Buffer::find(uint16 identifier, AX_STATUS& status) {
     uint16 length = 0;
     const auto* value =
         static_cast<const uint8*>(AX_GetAttributeValue(data(), identifier, &length, &status));
-    if (!value)
-        return nullptr;
+    if (!value || status != AX_STATUS_OK)
+        return {};
     const auto offset =
         reinterpret_cast<std::uintptr_t>(value) - reinterpret_cast<std::uintptr_t>(m_bytes.get());
     if (offset >= m_size) {
         VLN_LOG(VLN_ERR, "ERROR: AX_GetAttributeValue points outside of its buffer (%d)",
                 identifier);
         status = AX_STATUS_ERROR;
-        return nullptr;
+        return {};
     }
-    reported = length;
-    room = m_size - offset;
-    return value;
+    return {value, length, m_size - offset};
+}
+
+bool Attribute_Buffer::read(uint16 identifier, void* destination, std::size_t count,
+                            AX_STATUS& status) {
+    const Value value = find(identifier, status);
+    if (!value.bytes || value.room < count)
+        return false;
+    std::memcpy(destination, value.bytes, count);
+    return true;
+}
+
+bool Attribute_Buffer::readUpTo(uint16 identifier, void* destination, std::size_t count,
+                                AX_STATUS& status) {
+    const Value value = find(identifier, status);
+    if (!value.bytes)
+        return false;
+    std::memcpy(destination, value.bytes, std::min({value.reported, value.room, count}));
+    return true;
 }
 
 namespace {
@@ -41,52 +63,61 @@ AX_STATUS failure_of(AX_STATUS status) {
 }
 
 void log_number_failure(const Attribute_Family& family, const char* label, AX_STATUS status) {
-    if (family.kind == Attribute_Family::PORT)
-        VLN_LOG(VLN_DBG, "ERROR: AX_GetPortAttributes HA_%s call failed (%d)", label, status);
-    else
+    switch (family.kind) {
+    case Attribute_Family::ADAPTER:
         VLN_LOG(VLN_DBG, "ERROR: AX_GetHBAAttributeValue HA_%s call failed (%d)", label, status);
+        break;
+    case Attribute_Family::PORT:
+        VLN_LOG(VLN_DBG, "ERROR: AX_GetPortAttributes HA_%s call failed (%d)", label, status);
+        break;
+    case Attribute_Family::STATUS:
+        VLN_LOG(VLN_ERR, "%s call failed (%d)", label, status);
+        break;
+    }
+}
+
+AX_STATUS read_bytes(const Attribute_Family& family, Attribute_Buffer& buffer, uint16 identifier,
+                     const char* label, void* value, std::size_t count) {
+    AX_STATUS status = AX_STATUS_ERROR;
+    if (buffer.read(identifier, value, count, status))
+        return AX_STATUS_OK;
+    log_number_failure(family, label, status);
+    return failure_of(status);
 }
 
 } // namespace
 
+bool getAttributeBytes(const Attribute_Family& family, Attribute_Buffer& buffer, uint16 identifier,
+                       const char* label, void* value, std::size_t count) {
+    return read_bytes(family, buffer, identifier, label, value, count) == AX_STATUS_OK;
+}
+
 AX_STATUS getAttributeNumber(const Attribute_Family& family, Attribute_Buffer& buffer,
                              uint16 identifier, const char* label, uint32* destination) {
-    AX_STATUS status = AX_STATUS_ERROR;
-    std::size_t reported = 0;
-    std::size_t room = 0;
-    const uint8* value = buffer.find(identifier, status, reported, room);
-    if (status != AX_STATUS_OK || !value || room < sizeof *destination) {
-        log_number_failure(family, label, status);
-        return failure_of(status);
-    }
-    std::memcpy(destination, value, sizeof *destination);
-    VLN_LOG(VLN_DBG, "%s: [ %d ]", label, *destination);
-    return AX_STATUS_OK;
+    const AX_STATUS status =
+        read_bytes(family, buffer, identifier, label, destination, sizeof *destination);
+    if (status == AX_STATUS_OK)
+        VLN_LOG(VLN_DBG, "%s: [ %d ]", label, *destination);
+    return status;
 }
 
 AX_STATUS getAttributeText(const Attribute_Family& family, Attribute_Text& text,
                            Attribute_Buffer& buffer, uint16 identifier, const char* label) {
     std::memset(text, 0, sizeof text);
     AX_STATUS status = family.textStatus;
-    std::size_t reported = 0;
-    std::size_t room = 0;
-    const uint8* value = buffer.find(identifier, status, reported, room);
-    if (status != AX_STATUS_OK || !value) {
+    if (!buffer.readUpTo(identifier, text, sizeof text - 1, status)) {
         VLN_LOG(VLN_DBG, "ERROR: %s: AX_GetHBAAttributes call failed (%d)", label, status);
         return failure_of(status);
     }
-    std::memcpy(text, value, std::min({reported, room, sizeof text - 1}));
     VLN_LOG(VLN_DBG, "%s : [ %s ]", label, text);
     return AX_STATUS_OK;
 }
 
 AX_WWN wwnOfPort(const std::string& portName) {
-    HBA_WWN name{};
-    if (VLN_Identifiers::string2HBAName(&name, portName.c_str()) != 1) {
-        VLN_LOG(VLN_ERR, "VLN_MethodWrapper::string2HBAName failed");
+    AX_WWN wwn{};
+    if (!wwnOfName(portName.c_str(), wwn, VLN_ERR))
         throw std::exception();
-    }
-    return AX_WwnOf(&name);
+    return wwn;
 }
 
 // The library may change the size that it is told; what was allocated stays what counts.
@@ -101,15 +132,29 @@ Attribute_Buffer fetchAdapterAttributes(AX_WWN wwn) {
     return buffer;
 }
 
+AX_STATUS fetchPortAttributes(AX_WWN wwn, Attribute_Buffer& buffer) {
+    uint32 size = buffer.size();
+    return AX_GetPortAttributes(wwn, buffer.data(), &size);
+}
+
 Attribute_Buffer fetchPortAttributes(AX_WWN wwn) {
     Attribute_Buffer buffer(AX_PORT_ATTRIBUTES_SIZE);
-    uint32 size = buffer.size();
-    const AX_STATUS status = AX_GetPortAttributes(wwn, buffer.data(), &size);
+    const AX_STATUS status = fetchPortAttributes(wwn, buffer);
     if (status != AX_STATUS_OK) {
         VLN_LOG(VLN_ERR, "AX_GetPortAttributes call failed (%d)\n", status);
         throw std::exception();
     }
     return buffer;
+}
+
+bool fetchStatus(const char* portName, Attribute_Buffer& buffer, const char* what) {
+    AX_WWN wwn{};
+    if (!wwnOfName(portName, wwn, VLN_DBG))
+        return false;
+    const AX_STATUS status = fetchPortAttributes(wwn, buffer);
+    if (status != AX_STATUS_OK)
+        VLN_LOG(VLN_ERR, "%s call failed (%d)", what, static_cast<int>(status));
+    return status == AX_STATUS_OK;
 }
 
 void readDriverType(AX_WWN wwn, uint32& type) {

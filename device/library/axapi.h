@@ -193,25 +193,6 @@ enum {
     AX_FEATURE_LIST_SIZE = 512
 };
 
-/*
- * Attribute identifiers that no table of the system lists, all assumed. The boot state is the boot
- * code flag of the adapter attributes; the six of the port speed settings fill the gap between
- * their neighbours in the port attributes.
- */
-enum {
-    AX_HA_BOOTBIOS_STATE = 532,           /* number, 0 or 1 */
-    AX_HA_BOOT_METHOD = 592,              /* text, "PXE" or "iBFT" */
-    AX_HA_BOOT_METHODS_AVAILABLE = 593,   /* text, "PXE" or "PXE,iBFT" */
-    AX_PA_LINE_RATE_ADVERTISED = 825,     /* also written through AX_SetAdapterAttribute */
-    AX_PA_INTERFACE_TYPE = 847,           /* number */
-    AX_PA_AUTONEG_SUPPORTED_SPEEDS = 848, /* text */
-    AX_PA_FORCE_SUPPORTED_SPEEDS = 849,   /* text */
-    AX_PA_PORT_SPEED_MODE = 850,          /* number */
-    AX_PA_CONFIGURED_PORT_SPEED = 851,    /* text */
-    AX_PA_DAC_CABLE_LENGTH = 852,         /* number */
-    AX_PA_ISCSI_BOOT = 854                /* number, 0 or 1 */
-};
-
 /* The speed settings of a physical port. Assumed: the order of the fields. */
 typedef struct AX_PhyPortSpeed {
     uint32_t interfaceType;
@@ -309,6 +290,7 @@ AX_API AX_STATUS AX_SetDriverParam(AX_WWN wwn, const char* text, uint32_t contro
 
 AX_END_DECLS
 
+#include "device/library/axapi_attributes.h"
 #include "device/library/axapi_bridging.h"
 #include "device/library/axapi_channels.h"
 #include "device/library/axapi_diagnostics.h"

@@ -69,6 +69,29 @@ AX_WWN wwnOf(const HBA_WWN* name) {
     return name ? AX_WwnOf(name) : AX_WWN{};
 }
 
+bool wwnOfName(const char* name, AX_WWN& wwn, int level) {
+    HBA_WWN binary{};
+    if (VLN_Identifiers::string2HBAName(&binary, name) != 1) {
+        VLN_LOG(level, "VLN_MethodWrapper::string2HBAName failed");
+        return false;
+    }
+    wwn = AX_WwnOf(&binary);
+    return true;
+}
+
+bool nameOfDeviceId(const char* deviceId, HBA_WWN& name, const char* caller, int level) {
+    char colonForm[VLN_Identifiers::HBA_NAME_SIZE];
+    if (VLN_Identifiers::Id2HBAName(colonForm, deviceId) != 0) {
+        VLN_LOG(level, "%sId2HBAName failed", caller);
+        return false;
+    }
+    if (VLN_Identifiers::str2HBAName(&name, colonForm) != 0) {
+        VLN_LOG(level, "%sstr2HBAName failed", caller);
+        return false;
+    }
+    return true;
+}
+
 uint32 VLN_Identifiers::Id2HBAName(char* text, const char* deviceId) {
     VLN_LOG(VLN_DBG, "Entering VLN_MethodWrapper::Id2HBAName");
     if (!text || !deviceId) {

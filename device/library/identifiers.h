@@ -20,6 +20,14 @@ struct VLN_IpInfo {
 // which the library refuses.
 AX_WWN wwnOf(const HBA_WWN* name);
 
+// A name of 16 hexadecimal digits as the library takes it. False, with a line at the level, for a
+// text that is none.
+bool wwnOfName(const char* name, AX_WWN& wwn, int level);
+
+// A device identifier in binary. False, with the caller's line of the step that failed at the
+// level, for a text that is none.
+bool nameOfDeviceId(const char* deviceId, HBA_WWN& name, const char* caller, int level);
+
 // A device identifier is 16 hexadecimal digits, with or without a double quote in front; the
 // colon form is "XX:XX:XX:XX:XX:XX:XX:XX". Mind the senses of the results.
 struct VLN_Identifiers {

@@ -36,7 +36,7 @@ constexpr Attribute_Row<A> TABLE[] = {
 
 iSCSIPortAttributes::iSCSIPortAttributes(Adapter&, uint32, const HBAIdentifier&,
                                          const LocalHBAInfoV4& localHBAInfo)
-    : StoragePortAttributes(localHBAInfo) {
+    : StoragePortAttributes(localHBAInfo), EthernetPortFacts(0) {
     VLN_LOG(VLN_DBG, "Port 0's WWPN: %s", PortWWN.c_str());
     const AX_WWN wwn = wwnOfPort(PortWWN);
     Attribute_Buffer buffer = fetchPortAttributes(wwn);

@@ -48,7 +48,7 @@ constexpr Attribute_Row<A> TABLE[] = {
 
 NICPortAttributes::NICPortAttributes(Adapter&, uint32, const HBAIdentifier&,
                                      const LocalHBAInfoV4& localHBAInfo)
-    : PortName(VLN_Common::wwnText(localHBAInfo.portWWN)),
+    : EthernetPortFacts(1), PortName(VLN_Common::wwnText(localHBAInfo.portWWN)),
       SpecialFeature(localHBAInfo.SpecialFeatures) {
     VLN_LOG(VLN_DBG, "Port 0's WWPN: %s", PortName.c_str());
     VLN_LOG(VLN_DBG, "Port MAC Address : [%s]", PortName.c_str());

@@ -25,7 +25,27 @@ protected:
     PortAttributes() = default;
 };
 
-class NICPortAttributes : public PortAttributes {
+// What NIC and iSCSI functions tell of their Ethernet port.
+struct EthernetPortFacts {
+    explicit EthernetPortFacts(uint32 functionalState) : FunctionalPortState(functionalState) {}
+
+    uint32 FunctionalPortState;
+    uint32 PortSupportedSpeed = 0;
+    uint32 PortSpeed = 0;
+    uint32 MaximumMTU = 0;
+    uint32 PhysicalPortState = 1;
+    bool tellsPhysicalPortState = false;
+    std::string PermanentMACAddress;
+    uint32 CurrentMTU = 0;
+    std::string FuncPortSpeed;
+    std::string FuncQosBandwidth;
+    std::string CurrentMACAddress;
+    uint32 PhyLinkDownReason = 0;
+    std::string FuncQosMinBandwidth;
+    std::string IPV6GatewayAddr;
+};
+
+class NICPortAttributes : public PortAttributes, public EthernetPortFacts {
 public:
     NICPortAttributes(Adapter& adapter, uint32 portIndex, const HBAIdentifier& hbaIdentifier,
                       const LocalHBAInfoV4& localHBAInfo);
@@ -34,16 +54,8 @@ public:
     uint32 SpecialFeature = 0;
     uint32 PortType = 1;
 
-    uint32 FunctionalPortState = 1;
-    uint32 PortSupportedSpeed = 0;
-    uint32 PortSpeed = 0;
-    uint32 MaximumMTU = 0;
     uint32 FunctionType = 0;
-    uint32 PhysicalPortState = 1;
-    bool tellsPhysicalPortState = false;
     std::string IfName;
-    std::string PermanentMACAddress;
-    uint32 CurrentMTU = 0;
     std::string ProtocolIFType;
     std::string LinkTechnology;
     std::string Capabilities;
@@ -53,9 +65,6 @@ public:
     std::string IPv4Address;
     std::string SubnetMask;
     std::string AddressOrigin;
-    std::string FuncPortSpeed;
-    std::string FuncQosBandwidth;
-    std::string CurrentMACAddress;
     uint32 vNICEnabledState = 0;
     std::string VNICName;
     uint32 vNICOuterVLANId = 0;
@@ -63,9 +72,6 @@ public:
     std::string VNICMaxBandwidth;
     std::string GatewayAddress;
     uint32 SRIOVState = 3;
-    uint32 PhyLinkDownReason = 0;
-    std::string FuncQosMinBandwidth;
-    std::string IPV6GatewayAddr;
     uint32 VEPAState = 2;
 };
 
@@ -82,29 +88,15 @@ protected:
     explicit StoragePortAttributes(const LocalHBAInfoV4& localHBAInfo);
 };
 
-class iSCSIPortAttributes : public StoragePortAttributes {
+class iSCSIPortAttributes : public StoragePortAttributes, public EthernetPortFacts {
 public:
     iSCSIPortAttributes(Adapter& adapter, uint32 portIndex, const HBAIdentifier& hbaIdentifier,
                         const LocalHBAInfoV4& localHBAInfo);
 
-    uint32 FunctionalPortState = 0;
-    uint32 PortSupportedSpeed = 0;
-    uint32 PortSpeed = 0;
-    uint32 MaximumMTU = 0;
     uint32 LDTO = 0;
     uint32 DefaultETO = 0;
     uint32 MaxCDBLength = 0;
-    uint32 PhysicalPortState = 1;
-    bool tellsPhysicalPortState = false;
-    std::string PermanentMACAddress;
-    uint32 CurrentMTU = 0;
-    std::string FuncPortSpeed;
-    std::string FuncQosBandwidth;
-    std::string CurrentMACAddress;
     uint32 PhysicalPortSpeed = 0;
-    uint32 PhyLinkDownReason = 0;
-    std::string FuncQosMinBandwidth;
-    std::string IPV6GatewayAddr;
 
     // From the initiator properties.
     std::string InitiatorName;

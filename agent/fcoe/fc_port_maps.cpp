@@ -90,7 +90,7 @@ Ref<VLNMPCA_FCPortStatistics> port_statistics_instance(const FC_Function& functi
     auto statistics = make_instance<VLNMPCA_FCPortStatistics>();
     statistics->ElementName.set(function.serial_and_name);
     statistics->Description.set("Statistics for the FCOE port.");
-    statistics->InstanceID.set(format_text("VLNMPCA :FC Statistics:%s", function.name.c_str()));
+    statistics->InstanceID.set(fc_statistics_name(function.name));
     return statistics;
 }
 

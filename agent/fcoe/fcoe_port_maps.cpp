@@ -44,9 +44,9 @@ bool is_virtual(const ProviderAgent& agent, const VLNMPCA_EthernetPort& port) {
     if (!serial)
         return false;
     const String name = format_text("%s:%s", serial->c_str(), port.DeviceID.value.c_str());
-    return find_first(agent.m_VLNMPCA_VLANEndpoint_map, [&](const VLNMPCA_VLANEndpoint& endpoint) {
-        return endpoint.OtherTypeDescription.value == "vNIC" && endpoint.Name.value == name;
-    });
+    const auto* endpoint =
+        find_in_system(agent, agent.m_VLNMPCA_VLANEndpoint_map, &VLNMPCA_VLANEndpoint::Name, name);
+    return endpoint && endpoint->OtherTypeDescription.value == "vNIC";
 }
 
 } // namespace

@@ -36,9 +36,7 @@ void Adapter_Map_Builder::findOrMakeChip(NIC_Function& function) {
     if (function.chip)
         return;
     const String key = asic_name(*function.attributes);
-    function.chip = find_last(_agent.m_VLNMPCA_Chip_map, [&](const VLNMPCA_Chip& candidate) {
-        return candidate.Tag.value == key;
-    });
+    function.chip = find_by_key(_agent.m_VLNMPCA_Chip_map, &VLNMPCA_Chip::Tag, key);
     if (!function.chip && CreateMPCAChipInstance(function) != MAP_OK)
         VLN_LOG(VLN_CRIT, "CreateMPCAChipInstance failed");
 }

@@ -21,9 +21,8 @@ inline VLNMPCA_PhysicalConnector* find_connector(const ProviderAgent& agent, con
 
 inline VLNMPCA_PortController* find_port_controller(const ProviderAgent& agent,
                                                     const String& name) {
-    return find_last(
-        agent.m_VLNMPCA_PortController_map,
-        [&](const VLNMPCA_PortController& candidate) { return candidate.DeviceID.value == name; });
+    return find_in_system(agent, agent.m_VLNMPCA_PortController_map,
+                          &VLNMPCA_PortController::DeviceID, name);
 }
 
 } // namespace cimple

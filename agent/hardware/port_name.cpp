@@ -24,4 +24,8 @@ String tcp_endpoint_name(const String& port_name) {
                        static_cast<int>(ISCSI_TCP_PORT));
 }
 
+String fc_statistics_name(const String& port_name) {
+    return format_text("VLNMPCA :FC Statistics:%s", port_name.c_str());
+}
+
 } // namespace cimple

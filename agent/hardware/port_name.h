@@ -23,6 +23,9 @@ inline constexpr uint16 ISCSI_TCP_PORT = 3260; // RFC 7143
 // The TCP endpoint of an iSCSI port.
 String tcp_endpoint_name(const String& port_name);
 
+// The key of an FC port's statistics.
+String fc_statistics_name(const String& port_name);
+
 } // namespace cimple
 
 #endif // VLN_AGENT_HARDWARE_PORT_NAME_H

@@ -98,9 +98,7 @@ Ref<C> transceiver_instance(const String& serial_and_number, const M& module) {
 // Made with the first function of the port that tells of a transceiver.
 void Adapter_Map_Builder::createTransceiver(const NIC_Port& port) {
     auto& transceivers = _agent.m_VLNMPCA_Transceiver_map;
-    const auto known = find_last(transceivers, [&](const C& candidate) {
-        return candidate.Tag.value == port.serial_and_number;
-    });
+    const auto known = find_by_key(transceivers, &C::Tag, port.serial_and_number);
     M module;
     if (known || !port.port_controller || !read_module(port.name, module))
         return;

@@ -119,10 +119,8 @@ uint32 VPD_Maps::UpdateFRUToCard(VLNMPCA_Card& card, std::span<const FRU_Source>
 }
 
 VLNMPCA_FRUVitalProductData* VPD_Maps::findFRUData(const VLNMPCA_Card& card) const {
-    return find_first(_agent.m_VLNMPCA_FRUVitalProductData_map,
-                      [&](const VLNMPCA_FRUVitalProductData& candidate) {
-                          return candidate.InstanceID.value == card.VLNSerialNumber.value;
-                      });
+    return find_by_key(_agent.m_VLNMPCA_FRUVitalProductData_map,
+                       &VLNMPCA_FRUVitalProductData::InstanceID, card.VLNSerialNumber.value);
 }
 
 uint32 VPD_Maps::takeFRUData(VLNMPCA_Card& card, const FRU_Source& function, uint32 index) {
@@ -152,10 +150,8 @@ uint32 VPD_Maps::takeFRUData(VLNMPCA_Card& card, const FRU_Source& function, uin
 // The store finds the card by the key that it came with: it is taken out and put back.
 void VPD_Maps::setCardTag(VLNMPCA_Card& card, const String& tag) {
     auto& cards = _agent.m_VLNMPCA_Card_map;
-    const auto taken = [&](const VLNMPCA_Card& other) {
-        return &other != &card && other.Tag.value == tag;
-    };
-    if (tag.empty() || find_first(cards, taken))
+    const auto* taken = find_by_key(cards, &VLNMPCA_Card::Tag, tag);
+    if (tag.empty() || taken)
         return;
     uint32 place = 0;
     while (place < cards.size() && cards[place] != &card)
@@ -256,10 +252,8 @@ uint32 VPD_Maps::GetSoftwareInstanceName(const char* portAddress, String& name) 
         VLN_LOG(VLN_DBG, "Invalid PortAddress");
         return VLN_NOT_FOUND;
     }
-    const auto* port =
-        find_first(_agent.m_VLNMPCA_EthernetPort_map, [&](const VLNMPCA_EthernetPort& candidate) {
-            return candidate.DeviceID.value == portAddress;
-        });
+    const auto* port = find_in_system(_agent, _agent.m_VLNMPCA_EthernetPort_map,
+                                      &VLNMPCA_EthernetPort::DeviceID, portAddress);
     if (!port)
         return VLN_NOT_FOUND;
     const auto* software = find_first(

@@ -136,11 +136,8 @@ bool IP_Interface_Maps::joinGateway(const IP_Interface& interface) {
 const VLNMPCA_RemoteServiceAccessPoint*
 IP_Interface_Maps::findOrMakeGateway(const String& address) {
     auto& gateways = _agent.m_VLNMPCA_RemoteServiceAccessPoint_map;
-    const auto* known =
-        find_first(gateways, [&](const VLNMPCA_RemoteServiceAccessPoint& candidate) {
-            return candidate.Name.value == address;
-        });
-    if (known)
+    if (const auto* known =
+            find_in_system(_agent, gateways, &VLNMPCA_RemoteServiceAccessPoint::Name, address))
         return known;
     const auto* gateway = insert_instance(gateways, gateway_instance(address, *_system));
     if (gateway)

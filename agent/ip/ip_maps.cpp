@@ -136,10 +136,8 @@ void Adapter_Map_Builder::createIPEndpoint(NICAdapter& adapter, Port& port,
 }
 
 void Adapter_Map_Builder::joinIPEndpoint(const IP_Interface& interface) {
-    const auto* lan_endpoint =
-        find_first(_agent.m_VLNMPCA_LANEndpoint_map, [&](const VLNMPCA_LANEndpoint& candidate) {
-            return candidate.Name.value == interface.port_name;
-        });
+    const auto* lan_endpoint = find_in_system(_agent, _agent.m_VLNMPCA_LANEndpoint_map,
+                                              &VLNMPCA_LANEndpoint::Name, interface.port_name);
     if (lan_endpoint)
         associate(_agent.m_VLNMPCA_BindsToLANEndpoint_map, lan_endpoint, interface.endpoint);
     const uint32 status = IP_Interface_Maps(_agent, _system).CreateIPInterfaceInstances(interface);

@@ -122,10 +122,8 @@ VLNMPCA_RegisteredProfile* Profile_Maps::find(Profile profile) const {
 
 VLNMPCA_RegisteredProfile* Profile_Maps::find(const char* name) const {
     const String key = profile_key(name);
-    return find_first(_agent.m_VLNMPCA_RegisteredProfile_map,
-                      [&](const VLNMPCA_RegisteredProfile& candidate) {
-                          return candidate.InstanceID.value == key;
-                      });
+    return find_by_key(_agent.m_VLNMPCA_RegisteredProfile_map,
+                       &VLNMPCA_RegisteredProfile::InstanceID, key);
 }
 
 // Called for each new profile, so that a reference is made with the later of its two ends.

@@ -71,15 +71,11 @@ void ISCSI_SAN_Maps::findEnds(ISCSI_View& view) const {
     const auto& controllers = _agent.m_VLNMPCA_SCSIProtocolController_map;
     view.system = systems.size() == 0 ? nullptr : systems[0];
     view.controller = controllers.size() == 0 ? nullptr : controllers[0];
-    view.ethernet_port =
-        find_first(_agent.m_VLNMPCA_EthernetPort_map, [&](const VLNMPCA_EthernetPort& candidate) {
-            return candidate.DeviceID.value == view.port_name;
-        });
-    const String endpoint = tcp_endpoint_name(view.port_name);
-    view.tcp_endpoint = find_first(_agent.m_VLNMPCA_TCPProtocolEndpoint_map,
-                                   [&](const VLNMPCA_TCPProtocolEndpoint& candidate) {
-                                       return candidate.ElementName.value == endpoint;
-                                   });
+    view.ethernet_port = find_in_system(_agent, _agent.m_VLNMPCA_EthernetPort_map,
+                                        &VLNMPCA_EthernetPort::DeviceID, view.port_name);
+    view.tcp_endpoint =
+        find_in_system(_agent, _agent.m_VLNMPCA_TCPProtocolEndpoint_map,
+                       &VLNMPCA_TCPProtocolEndpoint::Name, tcp_endpoint_name(view.port_name));
 }
 
 uint32 ISCSI_SAN_Maps::walkTargets(const ISCSI_View& view) {

@@ -144,9 +144,7 @@ Adapter_Map_Builder::CreateFirmwareIdentityInstance(const NICAdapterAttributes& 
     if (!firmware)
         return nullptr;
     const String key = asic_name(adapter);
-    if (const auto* chip = find_last(_agent.m_VLNMPCA_Chip_map, [&](const VLNMPCA_Chip& each) {
-            return each.Tag.value == key;
-        }))
+    if (const auto* chip = find_by_key(_agent.m_VLNMPCA_Chip_map, &VLNMPCA_Chip::Tag, key))
         set_software_status(
             associate(_agent.m_VLNMPCA_FirmwareElementSoftwareIdentity_map, firmware, chip,
                       "Insert Failed (CNA): m_VLNMPCA_FirmwareElementSoftwareIdentity_map"),
@@ -177,8 +175,7 @@ void Adapter_Map_Builder::joinFlashImage(const NIC_Port& port) {
     const NICAdapterAttributes& adapter = *port.function.attributes;
     auto& images = _agent.m_VLNMPCA_FlashImageSoftwareIdentity_map;
     const String key = format_text("VLN CNA Flash Contents:%s", adapter.FirmwareVersion.c_str());
-    const auto* image =
-        find_first(images, [&](const Flash& each) { return each.InstanceID.value == key; });
+    const auto* image = find_by_key(images, &Flash::InstanceID, key);
     if (!image)
         image = insert_instance(images, flash_instance(adapter, key));
     if (image && port.new_port_controller)

@@ -94,10 +94,7 @@ void Adapter_Map_Builder::createProviderIdentity() {
 
 VLNMPCA_SoftwareIdentity*
 find_provider_identity(const Instance_Map<VLNMPCA_SoftwareIdentity>& store) {
-    const String name = provider_element_name();
-    return find_first(store, [&](const VLNMPCA_SoftwareIdentity& each) {
-        return each.ElementName.value == name;
-    });
+    return find_by_key(store, &VLNMPCA_SoftwareIdentity::InstanceID, provider_element_name());
 }
 
 // All NIC functions run under one driver: the first one's.

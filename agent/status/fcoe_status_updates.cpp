@@ -1,5 +1,6 @@
 // Update routines of FCoE ports and their statistics.
 
+#include "agent/hardware/port_name.h"
 #include "agent/provider_agent.h"
 #include "agent/state_tables.h"
 #include "agent/status/dynamic_status.h"
@@ -10,16 +11,11 @@
 #include "classes/VLNMPCA_FCPortStatistics.h"
 #include "device/library/attribute_buffer.h"
 
-#include <cstring>
 #include <optional>
 
 namespace cimple {
 
 namespace {
-
-bool holds(const String& text, const std::string& port_name) {
-    return std::strstr(text.c_str(), port_name.c_str()) != nullptr;
-}
 
 // Calls update(port) for each port of the FCoE adapters.
 template <class Update>
@@ -82,9 +78,8 @@ void read_port(Attribute_Buffer& buffer, VLNMPCA_FCPort& port) {
 
 void update_port(const ProviderAgent& agent, const std::string& name) {
     VLN_LOG(VLN_DBG, "Fetching Port Speeds.");
-    auto* port = find_first(agent.m_VLNMPCA_FCPort_map, [&](const VLNMPCA_FCPort& candidate) {
-        return holds(candidate.DeviceID.value, name);
-    });
+    auto* port =
+        find_in_system(agent, agent.m_VLNMPCA_FCPort_map, &VLNMPCA_FCPort::DeviceID, text(name));
     if (!port)
         return;
     if (auto buffer = fetch_attributes(name))
@@ -145,10 +140,9 @@ void copy_counters(const PortStatistics& counters, VLNMPCA_FCPortStatistics& sta
 }
 
 void update_statistics(const ProviderAgent& agent, Port& port) {
-    auto* statistics = find_first(agent.m_VLNMPCA_FCPortStatistics_map,
-                                  [&](const VLNMPCA_FCPortStatistics& candidate) {
-                                      return holds(candidate.InstanceID.value, port.getPortName());
-                                  });
+    auto* statistics =
+        find_by_key(agent.m_VLNMPCA_FCPortStatistics_map, &VLNMPCA_FCPortStatistics::InstanceID,
+                    fc_statistics_name(text(port.getPortName())));
     if (!statistics)
         return;
     readFCoEPortStatistics(port, *statistics);

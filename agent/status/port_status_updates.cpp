@@ -30,36 +30,27 @@ const VLNMPCA_EthernetPort* find_port(const ProviderAgent& agent, const char* de
 
 // ---- Ethernet ports ----
 
-// Hands what the last scan read of a NIC or iSCSI port to take(attributes). False for a port that
-// the device model does not know.
-template <class Take>
-bool with_attributes(VLN_Data& data, const String& name, Take take) {
-    for (const auto& adapter : data.adapters) {
-        for (const auto& port : adapter->getPorts()) {
-            if (name != port->getPortName().c_str())
-                continue;
-            PortAttributes* attributes = port->getPortAttributes();
-            if (const auto* nic = dynamic_cast<const NICPortAttributes*>(attributes)) {
-                take(*nic);
-                return true;
-            }
-            if (const auto* iscsi = dynamic_cast<const iSCSIPortAttributes*>(attributes)) {
-                take(*iscsi);
-                return true;
-            }
-        }
-    }
-    return false;
+// What the last scan read of a NIC or iSCSI port; null for one that the device model does not know.
+const EthernetPortFacts* find_facts(VLN_Data& data, const String& name) {
+    for (const auto& adapter : data.adapters)
+        for (const auto& port : adapter->getPorts())
+            if (name == port->getPortName().c_str())
+                if (const auto* facts =
+                        dynamic_cast<const EthernetPortFacts*>(port->getPortAttributes()))
+                    return facts;
+    return nullptr;
 }
 
 // The row of a port as the last scan saw it. One that does not tell its physical state counts as
 // not read: it keeps what the refresh showed. False for a port that the device model does not know.
 bool find_states(VLN_Data& data, const String& name, Dynamic_Port_Row& row) {
-    return with_attributes(data, name, [&](const auto& attributes) {
-        row.functional_state = attributes.FunctionalPortState;
-        row.physical_state = attributes.PhysicalPortState;
-        row.scan_number = attributes.tellsPhysicalPortState ? data.scanNumber : 0;
-    });
+    const EthernetPortFacts* facts = find_facts(data, name);
+    if (!facts)
+        return false;
+    row.functional_state = facts->FunctionalPortState;
+    row.physical_state = facts->PhysicalPortState;
+    row.scan_number = facts->tellsPhysicalPortState ? data.scanNumber : 0;
+    return true;
 }
 
 // A port whose name is no port's, or is too long for a row, is never polled.
@@ -111,8 +102,8 @@ void show_status(VLN_Data& data, VLNMPCA_EthernetPort& port, const Dynamic_Port_
     port.DetailedStatus.set(static_cast<uint16>(row.functional_state));
     port.EnabledState.set(enabled_state(row.physical_state));
     if (row.physical_state == PHYSICAL_STATE_UP) {
-        with_attributes(data, port.DeviceID.value,
-                        [&](const auto& attributes) { set_port_speeds(port, attributes); });
+        if (const EthernetPortFacts* facts = find_facts(data, port.DeviceID.value))
+            set_port_speeds(port, *facts);
     } else {
         port.Speed.set(0);
         port.PhysicalPortSpeed.set(0);

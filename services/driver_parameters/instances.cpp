@@ -190,10 +190,8 @@ uint32 join_driver_parameters(const Map_Scope& scope) {
                       *kind);
         if (setting.ConfigurationName.value != LOCAL_CONFIGURATION)
             continue;
-        const auto* port =
-            find_first(agent.m_VLNMPCA_FCPort_map, [&](const VLNMPCA_FCPort& candidate) {
-                return candidate.DeviceID.value == setting.ElementName.value;
-            });
+        const auto* port = find_in_system(agent, agent.m_VLNMPCA_FCPort_map,
+                                          &VLNMPCA_FCPort::DeviceID, setting.ElementName.value);
         if (port)
             set_flags(associate(agent.m_VLNMPCA_LocalPortElementSettingData_map, port, &setting),
                       *kind);

@@ -1,6 +1,7 @@
 // The control interface: scenario, faults, counts, records.
 #include "simulator/call.h"
 #include "simulator/scenario.h"
+#include "simulator/state.h"
 
 #include <algorithm>
 #include <set>
@@ -43,43 +44,17 @@ int copy_line(const std::vector<std::string>& lines, std::size_t index, char* te
     return 0;
 }
 
-void set_attribute(Attribute_Map& map, std::span<const Identifier> table, const Node& value,
-                   const char* name) {
-    const std::uint32_t number = read_identifier(value, name, table);
-    const auto identifier = static_cast<std::uint16_t>(number);
-    if (value.is(Value::Kind::null))
-        map.erase(identifier);
-    else
-        map[identifier] = read_attribute(value, find_identifier(table, number));
-}
-
-void set_value(Function& function, const std::string& table, const char* name, const Node& value) {
-    if (table == "adapterAttributes") {
-        set_attribute(function.adapter_attributes, adapter_attribute_identifiers(), value, name);
-    } else if (table == "portAttributes") {
-        set_attribute(function.port_attributes, port_attribute_identifiers(), value, name);
-    } else if (table == "statistics") {
-        const auto id =
-            static_cast<std::uint16_t>(read_identifier(value, name, statistic_identifiers()));
-        if (value.is(Value::Kind::null))
-            function.statistics.erase(id);
-        else
-            function.statistics[id] = value.number();
-    } else if (table == "features") {
-        const std::uint32_t id = read_identifier(value, name, feature_identifiers());
-        if (value.is(Value::Kind::null))
-            function.features.erase(id);
-        else
-            function.features[id] = read_feature(value);
-    } else if (table == "driverParameters") {
-        set_driver_parameter(function.driver_parameters, name, value);
-    } else if (table == "globalDriverParameters") {
-        set_driver_parameter(function.global_driver_parameters, name, value);
-    } else {
-        value.fail("unknown table \"" + table +
-                   "\"; known are: adapterAttributes, portAttributes, statistics, features, "
-                   "driverParameters, globalDriverParameters");
-    }
+// Replaces the file at once, so that a process that is killed leaves the state before it.
+void write_file(const std::string& path, const std::string& text) {
+    const std::string fresh = path + ".new";
+    std::unique_ptr<std::FILE, int (*)(std::FILE*)> file(std::fopen(fresh.c_str(), "wb"),
+                                                         &std::fclose);
+    const bool written = file &&
+                         std::fwrite(text.data(), 1, text.size(), file.get()) == text.size() &&
+                         std::fflush(file.get()) == 0;
+    file.reset();
+    if (!written || std::rename(fresh.c_str(), path.c_str()) != 0)
+        throw Scenario_Error(path, 1, "", "cannot be written");
 }
 
 // The text stays for ever once it was handed out, so it is kept once per folder.
@@ -119,6 +94,28 @@ void vlnsim_reset(void) {
     simulator.scenario_chosen = false;
     simulator.trace = nullptr;
     simulator.recording = false;
+}
+
+int vlnsim_save_state(const char* path, char* error, size_t size) {
+    return guarded(error, size, [&] {
+        Simulator& simulator = Simulator::instance();
+        std::lock_guard lock(simulator.mutex);
+        const Host described = read_scenario(simulator.source, simulator.source_name);
+        write_file(path, state_text(simulator.host, described, simulator.source_name));
+        return 0;
+    });
+}
+
+int vlnsim_load_state(const char* path, char* error, size_t size) {
+    return guarded(error, size, [&] {
+        const std::string text = read_file(path);
+        Simulator& simulator = Simulator::instance();
+        std::lock_guard lock(simulator.mutex);
+        Host changed = simulator.host;
+        apply_state(changed, text, path, simulator.source_name);
+        simulator.host = std::move(changed);
+        return 0;
+    });
 }
 
 int vlnsim_set_value(const char* wwn, const char* table, const char* name, const char* value,

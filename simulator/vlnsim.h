@@ -55,6 +55,15 @@ VLNSIM_API void vlnsim_reset(void);
 VLNSIM_API int vlnsim_set_value(const char* wwn, const char* table, const char* name,
                                 const char* value, char* error, size_t size);
 
+/* Writes to a file what of the running host's state differs from its scenario, so that another
+ * process can go on with it: attributes, statistics, features, driver parameters and the records
+ * that calls set. Returns 0, or 1 with a text in error. */
+VLNSIM_API int vlnsim_save_state(const char* path, char* error, size_t size);
+
+/* Lays such a file over the host of the same scenario. Returns 0, or 1 with "file:line:
+ * path/in/json: what is wrong" in error, and then the host stays as it was. */
+VLNSIM_API int vlnsim_load_state(const char* path, char* error, size_t size);
+
 /* ---- Libraries ---------------------------------------------------------------------------------
  */
 

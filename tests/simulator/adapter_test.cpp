@@ -2,6 +2,8 @@
 #include "tests/simulator/simulated.h"
 
 #include <cstring>
+#include <fstream>
+#include <sstream>
 
 namespace {
 
@@ -197,10 +199,74 @@ TEST_F(Simulated, WhatIsSetIsReadBack) {
     ASSERT_EQ(0u, LOCAL(AX_GetPortAttributes)(wwn_of(0), port.data(), &size));
     EXPECT_EQ("1Gb", attribute_text(port, AX_PA_CONFIGURED_PORT_SPEED));
 
+    char error[512];
+    ASSERT_EQ(0, vlnsim_save_state("set.json", error, sizeof error)) << error;
     vlnsim_restart();
     LOCAL(AX_InitLib)();
     ASSERT_EQ(0u, LOCAL(AX_Ini_GetNetworkProperties)(iscsi, &network));
     EXPECT_EQ(20, network.vlanID) << "a restart forgets what calls have changed";
+
+    ASSERT_EQ(0, vlnsim_load_state("set.json", error, sizeof error)) << error;
+    ASSERT_EQ(0u, LOCAL(AX_Ini_GetNetworkProperties)(iscsi, &network));
+    EXPECT_EQ(33, network.vlanID);
+    ASSERT_EQ(0u, LOCAL(AX_DiagBeaconState)(wwn_of(0), &beacon));
+    EXPECT_EQ(3u, beacon);
+    ASSERT_EQ(0u, LOCAL(AX_GetPortAttributes)(wwn_of(0), port.data(), &size));
+    EXPECT_EQ("1Gb", attribute_text(port, AX_PA_CONFIGURED_PORT_SPEED));
+}
+
+std::string file_text(const char* path) {
+    std::ostringstream text;
+    text << std::ifstream(path).rdbuf();
+    return text.str();
+}
+
+// Every kind of value is kept, those that scenarios write in some other way as well.
+TEST_F(Simulated, AStateIsWhatDiffersAndReadsBackTheSame) {
+    start("fcoe-pair.json");
+    char error[512];
+    ASSERT_EQ(0, vlnsim_save_state("none.json", error, sizeof error));
+    EXPECT_EQ("{\n  \"scenario\": \"fcoe-pair.json\",\n  \"functions\": {}\n}\n",
+              file_text("none.json"));
+    const char* wwn = "100002564C000001";
+    const char* const changes[][3] = {
+        {"portAttributes", "FunctionalPortState", "6"},
+        {"portAttributes", "PermanentMACAddress", "null"},
+        {"portAttributes", "IfName", "\"{{x\\u00e9\""},
+        {"portAttributes", "999", "\"of no table\""},
+        {"portAttributes", "998", R"({"bytes": "00FF7B"})"},
+        {"adapterAttributes", "IEEEAddress", R"("010203040506")"},
+        {"adapterAttributes", "FirmwareVersion", R"({"bytes": "FFFE"})"},
+        {"statistics", "LinkFailures", "18446744073709551615"},
+        {"statistics", "1040", "null"},
+        {"features", "SRIOV", R"({"status": 190})"},
+        {"features", "35", "7"},
+        {"driverParameters", "nodev_tmo", "44"},
+    };
+    for (const auto& [table, name, value] : changes)
+        ASSERT_EQ(0, vlnsim_set_value(wwn, table, name, value, error, sizeof error)) << error;
+    ASSERT_EQ(0, vlnsim_save_state("some.json", error, sizeof error));
+    vlnsim_restart();
+    ASSERT_EQ(0, vlnsim_load_state("some.json", error, sizeof error)) << error;
+    ASSERT_EQ(0, vlnsim_save_state("again.json", error, sizeof error));
+    EXPECT_EQ(file_text("some.json"), file_text("again.json"));
+    EXPECT_NE(std::string::npos, file_text("some.json").find("\"nodev_tmo\": 44"));
+    vlnsim_restart();
+    ASSERT_EQ(0, vlnsim_save_state("again.json", error, sizeof error));
+    EXPECT_EQ(file_text("none.json"), file_text("again.json"));
+
+    const std::pair<const char*, const char*> wrong[] = {
+        {R"({"scenario": "x.json"})", "does not go with"},
+        {R"({"scenario": "fcoe-pair.json", "functions": {"77": {}}})", "no function"},
+        {R"({"scenario": "fcoe-pair.json", "functions": {"0": {"beacom": 1}}})", "unknown key"},
+        {R"({"scenario": "fcoe-pair.json", "functions": {"0": {"network": "00"}}})", "bytes"},
+        {"{", "bad.json:1: "},
+    };
+    for (const auto& [text, says] : wrong) {
+        std::ofstream("bad.json") << text;
+        EXPECT_EQ(1, vlnsim_load_state("bad.json", error, sizeof error)) << text;
+        EXPECT_NE(std::string::npos, std::string(error).find(says)) << error;
+    }
 }
 
 TEST_F(Simulated, HardwareChangesUnderARunningHost) {

@@ -1,0 +1,295 @@
+#include "simulator/state.h"
+
+#include "simulator/scenario.h"
+
+#include <algorithm>
+#include <concepts>
+#include <cstdio>
+#include <cstring>
+#include <nlohmann/json.hpp>
+
+namespace vlnsim {
+namespace {
+
+using Json = nlohmann::ordered_json;
+
+// ---- A value as JSON, and back ----
+
+std::string hexadecimal(const void* data, std::size_t size) {
+    std::string text;
+    char pair[4];
+    for (std::size_t i = 0; i < size; ++i) {
+        std::snprintf(pair, sizeof pair, "%02X", static_cast<const std::uint8_t*>(data)[i]);
+        text += pair;
+    }
+    return text;
+}
+
+template <class Record>
+concept Library_Record = std::is_class_v<Record> && std::is_trivially_copyable_v<Record>;
+
+template <std::unsigned_integral Number>
+Json to_json(Number number) {
+    return number;
+}
+
+// The records have fixed widths, so their bytes mean the same to both word sizes.
+template <Library_Record Record>
+Json to_json(const Record& record) {
+    return hexadecimal(&record, sizeof record);
+}
+
+template <class Value>
+Json to_json(const std::optional<Value>& value) {
+    return value ? to_json(*value) : Json(nullptr);
+}
+
+template <std::unsigned_integral Number>
+void from_json(const Node& node, Number& number) {
+    number = static_cast<Number>(node.number(std::numeric_limits<Number>::max()));
+}
+
+template <Library_Record Record>
+void from_json(const Node& node, Record& record) {
+    std::memcpy(&record, node.bytes(sizeof record).data(), sizeof record);
+}
+
+template <class Value>
+void from_json(const Node& node, std::optional<Value>& value) {
+    if (node.is(vlnsim::Value::Kind::null))
+        value.reset();
+    else
+        from_json(node, value.emplace());
+}
+
+// ---- Pieces of a function's state ----
+
+// One key of a function in a state.
+struct Piece {
+    std::string_view name;
+    // Nothing: as described.
+    std::optional<Json> (*change)(const Function& now, const Function& described);
+    void (*apply)(Function& function, const Node& value);
+    // One value of a table; null for a piece that has no parts.
+    void (*set)(Function& function, const std::string& name, const Node& value);
+};
+
+// A member as a whole: a number, a record, or either of them where it may be missing.
+template <auto member>
+constexpr Piece whole(std::string_view name) {
+    return {name,
+            [](const Function& now, const Function& described) -> std::optional<Json> {
+                Json value = to_json(now.*member);
+                if (value == to_json(described.*member))
+                    return std::nullopt;
+                return value;
+            },
+            [](Function& function, const Node& value) { from_json(value, function.*member); },
+            nullptr};
+}
+
+// Values by name, each of which changes by itself. list(function) gives them as a JSON object.
+template <Json (*list)(const Function&), void (*set)(Function&, const std::string&, const Node&)>
+constexpr Piece table(std::string_view name) {
+    return {name,
+            [](const Function& now, const Function& described) -> std::optional<Json> {
+                const Json values = list(now), before = list(described);
+                Json changed = Json::object();
+                for (const auto& [key, value] : values.items())
+                    if (!before.contains(key) || before[key] != value)
+                        changed[key] = value;
+                for (const auto& [key, value] : before.items())
+                    if (!values.contains(key))
+                        changed[key] = nullptr;
+                return changed.empty() ? std::nullopt : std::optional(changed);
+            },
+            [](Function& function, const Node& values) {
+                values.expect_any_object();
+                for (const auto& [key, value] : values.value().members)
+                    set(function, key, Node(value, values.scope()));
+            },
+            set};
+}
+
+using Identifiers = std::span<const Identifier> (*)();
+
+std::string key_of(Identifiers identifiers, std::uint32_t number) {
+    const Identifier* known = find_identifier(identifiers(), number);
+    return known ? std::string(known->name) : std::to_string(number);
+}
+
+// As read_attribute takes it: what is of the kind of its identifier as such, all else as bytes.
+Json attribute_to_json(const Attribute& attribute, const Identifier* identifier) {
+    const bool ends_with_nul = attribute.bytes.size() == attribute.length + std::size_t{1};
+    const Attribute_Kind kind = identifier      ? identifier->kind
+                                : ends_with_nul ? Attribute_Kind::text
+                                                : Attribute_Kind::bytes;
+    if (kind == Attribute_Kind::number && attribute.bytes.size() == sizeof(std::uint32_t))
+        return attribute.number();
+    if (kind == Attribute_Kind::text && ends_with_nul) {
+        std::string text;
+        bool plain = true;
+        for (const char c : attribute.text()) {
+            text += c == '{' ? "{{" : std::string(1, c); // a brace begins a placeholder
+            plain &= c >= ' ' && c <= '~';
+        }
+        if (plain)
+            return text;
+    }
+    return {{"bytes", hexadecimal(attribute.bytes.data(), attribute.bytes.size())}};
+}
+
+template <auto map, Identifiers identifiers>
+Json list_attributes(const Function& function) {
+    Json values = Json::object();
+    for (const auto& [number, attribute] : function.*map)
+        values[key_of(identifiers, number)] =
+            attribute_to_json(attribute, find_identifier(identifiers(), number));
+    return values;
+}
+
+template <auto map, Identifiers identifiers>
+void set_attribute(Function& function, const std::string& name, const Node& value) {
+    const std::uint32_t number = read_identifier(value, name, identifiers());
+    const auto identifier = static_cast<std::uint16_t>(number);
+    if (value.is(Value::Kind::null))
+        (function.*map).erase(identifier);
+    else
+        (function.*map)[identifier] = read_attribute(value, find_identifier(identifiers(), number));
+}
+
+Json list_statistics(const Function& function) {
+    Json values = Json::object();
+    for (const auto& [number, value] : function.statistics)
+        values[key_of(statistic_identifiers, number)] = value;
+    return values;
+}
+
+void set_statistic(Function& function, const std::string& name, const Node& value) {
+    const auto number =
+        static_cast<std::uint16_t>(read_identifier(value, name, statistic_identifiers()));
+    if (value.is(Value::Kind::null))
+        function.statistics.erase(number);
+    else
+        function.statistics[number] = value.number();
+}
+
+Json list_features(const Function& function) {
+    Json values = Json::object();
+    for (const auto& [number, feature] : function.features)
+        values[key_of(feature_identifiers, number)] =
+            feature.status == AX_STATUS_OK ? Json(feature.value) : Json{{"status", feature.status}};
+    return values;
+}
+
+void set_feature(Function& function, const std::string& name, const Node& value) {
+    const std::uint32_t number = read_identifier(value, name, feature_identifiers());
+    if (value.is(Value::Kind::null))
+        function.features.erase(number);
+    else
+        function.features[number] = read_feature(value);
+}
+
+template <auto parameters>
+Json list_parameters(const Function& function) {
+    Json values = Json::object();
+    if (function.*parameters)
+        for (const AX_DriverParam& each : *(function.*parameters))
+            values[std::string(each.name, strnlen(each.name, sizeof each.name))] = each.current;
+    return values;
+}
+
+template <auto parameters>
+void set_parameter(Function& function, const std::string& name, const Node& value) {
+    set_driver_parameter(function.*parameters, name, value);
+}
+
+// All that calls can change. A topic that lets callers set something adds its row here.
+constexpr Piece PIECES[] = {
+    table<list_attributes<&Function::adapter_attributes, adapter_attribute_identifiers>,
+          set_attribute<&Function::adapter_attributes, adapter_attribute_identifiers>>(
+        "adapterAttributes"),
+    table<list_attributes<&Function::port_attributes, port_attribute_identifiers>,
+          set_attribute<&Function::port_attributes, port_attribute_identifiers>>("portAttributes"),
+    table<list_statistics, set_statistic>("statistics"),
+    table<list_features, set_feature>("features"),
+    table<list_parameters<&Function::driver_parameters>,
+          set_parameter<&Function::driver_parameters>>("driverParameters"),
+    table<list_parameters<&Function::global_driver_parameters>,
+          set_parameter<&Function::global_driver_parameters>>("globalDriverParameters"),
+    whole<&Function::beacon>("beacon"),
+    whole<&Function::initiator>("initiator"),
+    whole<&Function::network>("network"),
+};
+
+void apply_pieces(Function& function, const Node& values) {
+    std::vector<std::string_view> names;
+    for (const Piece& piece : PIECES)
+        names.push_back(piece.name);
+    values.expect_object(names);
+    for (const auto& [name, value] : values.value().members)
+        for (const Piece& piece : PIECES)
+            if (piece.name == name)
+                piece.apply(function, Node(value, values.scope()));
+}
+
+// Folders may differ from call to call, the scenario's file may not.
+std::string file_name(const std::string& path) {
+    return path.substr(path.rfind('/') + 1);
+}
+
+} // namespace
+
+std::string state_text(const Host& now, const Host& described, const std::string& scenario) {
+    Json functions = Json::object();
+    for (std::size_t i = 0; i < now.functions.size(); ++i) {
+        Json changes = Json::object();
+        for (const Piece& piece : PIECES)
+            if (auto change = piece.change(now.functions[i], described.functions.at(i)))
+                changes[std::string(piece.name)] = std::move(*change);
+        if (!changes.empty())
+            functions[std::to_string(now.functions[i].instance)] = std::move(changes);
+    }
+    const Json state = {{"scenario", file_name(scenario)}, {"functions", std::move(functions)}};
+    return state.dump(2, ' ', true, Json::error_handler_t::replace) + "\n";
+}
+
+void apply_state(Host& host, const std::string& text, const std::string& name,
+                 const std::string& scenario) {
+    const Value source = parse_source(text, name);
+    const Scope scope;
+    const Node top(source, scope);
+    top.expect_object({"scenario", "functions"});
+    const std::string of = top.text("scenario", "");
+    if (of != file_name(scenario))
+        top.fail("the state of scenario \"" + of + "\" does not go with \"" + file_name(scenario) +
+                 "\"");
+    const auto functions = top.member("functions");
+    if (!functions)
+        return;
+    functions->expect_any_object();
+    for (const auto& [key, value] : functions->value().members) {
+        const auto number = parse_number(key);
+        const auto found =
+            std::find_if(host.functions.begin(), host.functions.end(),
+                         [&](const Function& function) { return function.instance == number; });
+        if (found == host.functions.end())
+            value.fail("the scenario has no function with this instance number");
+        apply_pieces(*found, Node(value, scope));
+    }
+}
+
+void set_value(Function& function, const std::string& table, const std::string& name,
+               const Node& value) {
+    std::vector<std::string_view> known;
+    for (const Piece& piece : PIECES) {
+        if (!piece.set)
+            continue;
+        if (piece.name == table)
+            return piece.set(function, name, value);
+        known.push_back(piece.name);
+    }
+    value.fail("unknown table \"" + table + "\"; " + known_list(known));
+}
+
+} // namespace vlnsim

@@ -26,6 +26,8 @@ Core::Core(Options given) try : options(std::move(given)), classes(mof_path(opti
     broker = make_broker(*this);
     if (!options.platform_path.empty())
         platform.read(options.platform_path, classes);
+    if (!options.registration_path.empty())
+        registration.read(options.registration_path);
     const std::lock_guard lock(managers_mutex);
     managers().push_back(this);
 } catch (const mof::Error& error) {

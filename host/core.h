@@ -7,6 +7,7 @@
 #include "host/module.h"
 #include "host/objects.h"
 #include "host/platform.h"
+#include "host/registration.h"
 
 #include <atomic>
 #include <memory>
@@ -25,6 +26,7 @@ public:
     const Options options;
     ClassRepository classes;
     Platform platform;
+    Registration registration;
     Module module;
     CMPIBroker broker;
     FaultList faults;

@@ -19,4 +19,15 @@ std::string catalogue_path() {
     return fs::exists(installed, error) ? installed.string() : VLN_HOST_CATALOGUE;
 }
 
+std::string registration_path() {
+    const fs::path share = fs::path(program_folder()) / "../share";
+    for (const char* name :
+         {"vorlan_mpca_provider/vorlan_mpca_provider.reg", "vorlan_mpca_provider.reg"}) {
+        std::error_code error;
+        if (fs::exists(share / name, error))
+            return (share / name).string();
+    }
+    return "";
+}
+
 } // namespace host

@@ -12,6 +12,10 @@ std::string program_folder();
 // The class catalogue: beside an installed program in ../share, else in the source tree.
 std::string catalogue_path();
 
+// The registration of the module, beside an installed program in ../share, else in the build's
+// ../share; "" where there is none.
+std::string registration_path();
+
 } // namespace host
 
 #endif // HOST_INSTALLATION_H

@@ -50,6 +50,10 @@ bool Manager::serves(const Class& known) const {
     return _core->module.serves(known);
 }
 
+bool Manager::serves(const Class& known, const std::string& name_space) const {
+    return _core->module.serves(known) && _core->registration.check(known.name, name_space).ok();
+}
+
 Parsed_Path Manager::parse_path(std::string_view text) const {
     return host::parse_path(_core->classes, text, _core->options.name_space);
 }

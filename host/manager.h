@@ -25,8 +25,9 @@
 namespace host {
 
 struct Options {
-    std::string mof_path;      // "": the catalogue of the build or installation
-    std::string platform_path; // instances for up-calls; "": none
+    std::string mof_path;          // "": the catalogue of the build or installation
+    std::string platform_path;     // instances for up-calls; "": none
+    std::string registration_path; // who is served where; "": the module's classes, everywhere
     std::string name_space = "root/vorlan";
     // Where, beside name_space, up-calls reach the providers of the module.
     std::vector<std::string> more_name_spaces = {"root/pg_interop"};
@@ -114,6 +115,7 @@ public:
     // The classes that the module has a provider for, in the order of the catalogue.
     std::vector<const Class*> provider_classes() const;
     bool serves(const Class& known) const;
+    bool serves(const Class& known, const std::string& name_space) const; // as registered
     // Text as `path_to_text` writes it; a path without a namespace is in options().name_space.
     Parsed_Path parse_path(std::string_view text) const;
 

@@ -12,7 +12,7 @@ Status find_target(Core& core, const std::string& class_name, const std::string&
     if (!target.known)
         return {CMPI_RC_ERR_INVALID_CLASS, "unknown class " + class_name};
     if (core.module.serves(*target.known))
-        return {};
+        return core.registration.check(target.known->name, target.name_space);
     target.platform = true;
     if (core.platform.has_name_space(target.name_space))
         return {};

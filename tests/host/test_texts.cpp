@@ -144,7 +144,7 @@ TEST(Json, IsExactAndReadsBack) {
                              {"Words", {"a", nullptr}},
                              {"Note", nullptr},
                              {"Inner", {{"class", "Test_Good"}, {"properties", {{"Level", 3}}}}}};
-    const host::Instance instance{{"root/test", "Test_Base", {}},
+    const host::Instance instance{host::ObjectPath{"root/test", "Test_Base", {}},
                                   host::properties_from_json(classes(), known, json, "root/test")};
     EXPECT_EQ(host::to_json(instance, "root/test")["properties"].dump(), json.dump());
     const host::Json wrong[] = {{{"Big", -1}},           {{"Level", 65536}},

@@ -28,6 +28,12 @@ public:
               (status.message.empty() ? host::rc_sentence(status.rc) : status.message)) {}
 };
 
+// A word of the user's as messages show it: an empty one can be seen, a long one is cut.
+inline std::string shown(const std::string& word) {
+    constexpr std::size_t longest = 200;
+    return word.empty() ? "\"\"" : word.size() > longest ? word.substr(0, longest) + "..." : word;
+}
+
 } // namespace mpcactl
 
 #endif // MPCACTL_FAILURE_H

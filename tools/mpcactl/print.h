@@ -15,7 +15,8 @@ struct Print_Context {
     Format format;
     std::string name_space;           // references in it are written without it
     std::vector<std::string> columns; // asked for, in this order; empty: what there is
-    std::size_t width;                // of the terminal, in characters
+    std::size_t width;                // of a row, in characters
+    bool cut_cells;                   // texts are shortened to the width of a cell
 };
 
 // JSON: a list. Tables: one for each class, keys first; instances that are too wide for a row are

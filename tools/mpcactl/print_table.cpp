@@ -40,21 +40,16 @@ bool any_has(const std::vector<const host::Instance*>& instances, const std::str
     });
 }
 
-// Columns in their order: those asked for, or keys and then what any instance has. Where nothing
-// that was asked for is there, as in one class of several, the keys stand for the instances.
+// Columns in their order: those asked for, or keys and then what any instance has. A class that has
+// nothing of what was asked for, one of several, shows the keys.
 std::vector<std::string> choose_columns(const Print_Context& context, const host::Class& known,
                                         const std::vector<const host::Instance*>& instances) {
     std::vector<std::string> columns;
-    bool filled = false;
-    for (const std::string& name : context.columns) {
-        if (const host::Property* property = known.find_property(name)) {
+    for (const std::string& name : context.columns)
+        if (const host::Property* property = known.find_property(name))
             columns.push_back(property->name);
-            filled |= any_has(instances, name);
-        }
-    }
-    if (filled)
+    if (!columns.empty())
         return columns;
-    columns.clear();
     for (const bool keys : {true, false})
         for (const host::Property& property : known.properties)
             if (property.key == keys && (keys || context.columns.empty()) &&
@@ -63,10 +58,13 @@ std::vector<std::string> choose_columns(const Print_Context& context, const host
     return columns;
 }
 
-std::string cell_of(const host::Instance& instance, const std::string& column,
-                    const std::string& name_space) {
+// A property that was asked for and is not there is null.
+std::string cell_of(const Print_Context& context, const host::Instance& instance,
+                    const std::string& column) {
     const host::Value* value = instance.property(column);
-    return value ? to_cell(*value, name_space) : "";
+    if (!value)
+        return context.columns.empty() ? "" : "NULL";
+    return to_cell(*value, context.name_space);
 }
 
 std::string padded(const std::string& text, std::size_t width) {
@@ -93,9 +91,8 @@ std::string rows_to_text(const Rows& rows, const std::vector<std::size_t>& width
 }
 
 // A line for each property, a blank line between instances.
-std::string to_list(const std::vector<std::string>& columns,
-                    const std::vector<const host::Instance*>& instances,
-                    const std::string& name_space) {
+std::string to_list(const Print_Context& context, const std::vector<std::string>& columns,
+                    const std::vector<const host::Instance*>& instances) {
     std::size_t width = 0;
     for (const std::string& column : columns)
         width = std::max(width, column.size());
@@ -104,8 +101,8 @@ std::string to_list(const std::vector<std::string>& columns,
         text += text.empty() ? "" : "\n";
         for (const std::string& column : columns)
             if (instance->property(column))
-                text += trimmed_line(padded(column, width + GAP) +
-                                     cell_of(*instance, column, name_space));
+                text +=
+                    trimmed_line(padded(column, width + GAP) + cell_of(context, *instance, column));
     }
     return text;
 }
@@ -148,8 +145,10 @@ std::string to_table(const Print_Context& context, const host::Class& known,
     Rows rows = {columns};
     for (const host::Instance* instance : instances) {
         rows.emplace_back();
-        for (const std::string& column : columns)
-            rows.back().push_back(cut(cell_of(*instance, column, context.name_space), CELL_WIDTH));
+        for (const std::string& column : columns) {
+            const std::string cell = cell_of(context, *instance, column);
+            rows.back().push_back(context.cut_cells ? cut(cell, CELL_WIDTH) : cell);
+        }
     }
     std::vector<std::size_t> widths(columns.size(), 0);
     for (const auto& row : rows)
@@ -159,7 +158,7 @@ std::string to_table(const Print_Context& context, const host::Class& known,
         std::accumulate(widths.begin(), widths.end(), columns.size() * GAP) - GAP;
     // Columns that were asked for stand side by side however wide they are.
     if (context.columns.empty() && total > context.width)
-        return to_list(columns, instances, context.name_space);
+        return to_list(context, columns, instances);
     return rows_to_text(rows, widths);
 }
 

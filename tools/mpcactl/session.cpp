@@ -10,7 +10,7 @@ namespace mpcactl {
 
 namespace {
 
-std::string module_path(const Settings& settings) {
+std::string module_path(const Session_Settings& settings) {
     if (!settings.module.empty())
         return settings.module.find('/') == std::string::npos ? "./" + settings.module
                                                               : settings.module;
@@ -19,11 +19,14 @@ std::string module_path(const Settings& settings) {
     return host::program_folder() + "/../lib/libvorlan_mpca_provider.so";
 }
 
-host::Options host_options(const Settings& settings) {
+host::Options host_options(const Session_Settings& settings, const std::string& name_space) {
     host::Options options;
     options.mof_path = settings.mof;
     options.platform_path = settings.platform;
-    options.name_space = settings.name_space;
+    options.registration_path = settings.registration;
+    if (settings.registration.empty() && settings.module.empty())
+        options.registration_path = host::registration_path();
+    options.name_space = name_space;
     options.more_name_spaces.push_back("root/vorlan");
     if (settings.trace_calls)
         options.trace = [](const std::string& line) { std::fprintf(stderr, "%s\n", line.c_str()); };
@@ -32,26 +35,35 @@ host::Options host_options(const Settings& settings) {
 
 } // namespace
 
-Session::Session(const Settings& given) : settings(given) {
-    if (!settings.host_root.empty() && settings.scenario.empty())
-        throw Usage_Error("--host-root goes with --simulate");
+Session::Session(const Session_Settings& settings, const std::string& name_space) {
+    for (const auto& [name, value] :
+         {std::pair("--host-root", &settings.host_root), std::pair("--keep", &settings.keep)})
+        if (!value->empty() && settings.scenario.empty())
+            throw Usage_Error(std::string(name) + " goes with --simulate");
+    if (!settings.host_root.empty() && !settings.keep.empty())
+        throw Usage_Error("--keep has the host's files in DIR/root; leave out --host-root");
     try {
-        _manager = std::make_unique<host::Manager>(host_options(settings));
+        _manager = std::make_unique<host::Manager>(host_options(settings, name_space));
     } catch (const host::Setup_Error& error) {
         throw Usage_Error(error.what());
     }
     if (!settings.scenario.empty())
-        _simulation = std::make_unique<Simulation>(settings.scenario, settings.host_root,
-                                                   settings.trace_calls);
+        _simulation = std::make_unique<Simulation>(settings);
     if (const host::Status status = _manager->load(module_path(settings)); !status.ok())
         throw Usage_Error("the module cannot be loaded: " + status.message);
 }
 
+Simulation& Session::simulation() {
+    if (!_simulation)
+        throw Usage_Error("there is no simulated hardware without --simulate");
+    return *_simulation;
+}
+
 const host::Class& Session::known_class(const std::string& name) const {
-    const host::Class* known = _manager->classes().find(name);
+    const host::Class* known = classes().find(name);
     if (!known)
-        throw Usage_Error("unknown class " + name +
-                          host::did_you_mean(name, _manager->classes().names()) +
+        throw Usage_Error("unknown class " + shown(name) +
+                          host::did_you_mean(name, classes().names()) +
                           "\nmpcactl classes lists those of the module");
     return *known;
 }
@@ -61,7 +73,7 @@ const host::Class& Session::known_association(const std::string& name) const {
     if (known.is_association)
         return known;
     std::vector<std::string> associations;
-    for (const auto& candidate : _manager->classes().classes())
+    for (const auto& candidate : classes().classes())
         if (candidate->is_association)
             associations.push_back(candidate->name);
     throw Usage_Error(known.name + " is no association" + host::did_you_mean(name, associations));
@@ -74,30 +86,20 @@ const host::Method& Session::known_method(const host::Class& known, const std::s
     for (const host::Method& method : known.methods)
         names.push_back(method.name);
     throw Usage_Error(
-        known.name + " has no method " + name + host::did_you_mean(name, names) +
+        known.name + " has no method " + shown(name) + host::did_you_mean(name, names) +
         (names.empty() ? "\nIt has no methods." : "\nIts methods: " + host::join_or(names)));
 }
 
-host::ObjectPath Session::path() const {
-    host::Parsed_Path parsed = _manager->parse_path(settings.path);
+host::ObjectPath Session::path(const Command& command) const {
+    host::Parsed_Path parsed = host::parse_path(classes(), command.path, command.name_space);
     if (!parsed.error.empty())
         throw Usage_Error("object path: " + parsed.error);
     return std::move(parsed.path);
 }
 
-host::Property_List Session::properties(const host::Class* known) const {
-    if (settings.properties.empty())
-        return std::nullopt;
-    for (const std::string& name : settings.properties)
-        if (known && !known->find_property(name))
-            throw Usage_Error(known->name + " has no property " + name +
-                              host::did_you_mean(name, known->property_names()));
-    return settings.properties;
-}
-
-int Session::finish() {
-    _manager->close();
+int Session::report() {
     int status = EXIT_FINE;
+    std::fflush(stdout);
     if (const std::size_t count = _manager->fault_count(); count > 0) {
         status = EXIT_CIM;
         std::fprintf(stderr, "%zu provider fault%s:\n", count, count == 1 ? "" : "s");
@@ -106,17 +108,26 @@ int Session::finish() {
             std::fprintf(stderr, "  %s\n", host::to_string(fault).c_str());
         if (faults.size() < count)
             std::fprintf(stderr, "  and %zu more\n", count - faults.size());
+        _manager->clear_faults();
     }
-    if (!_simulation)
-        return status;
-    if (const std::vector<std::string> breaches = _simulation->violations(); !breaches.empty()) {
+    const std::vector<std::string> breaches =
+        _simulation ? _simulation->violations(_breaches_told) : std::vector<std::string>();
+    if (!breaches.empty()) {
         status = EXIT_CIM;
+        _breaches_told += breaches.size();
         std::fprintf(stderr, "%zu breach%s of the libraries' contract:\n", breaches.size(),
                      breaches.size() == 1 ? "" : "es");
         for (const std::string& breach : breaches)
             std::fprintf(stderr, "  %s\n", breach.c_str());
     }
     return status;
+}
+
+int Session::finish() {
+    _manager->close();
+    if (_simulation)
+        _simulation->keep();
+    return report();
 }
 
 } // namespace mpcactl

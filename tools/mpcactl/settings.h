@@ -1,4 +1,4 @@
-// What the command line says, read but not yet looked at.
+// What the command line or a line of a script says, read but not yet looked at.
 #ifndef MPCACTL_SETTINGS_H
 #define MPCACTL_SETTINGS_H
 
@@ -9,31 +9,53 @@ namespace mpcactl {
 
 enum class Format { table, json, mof };
 
-struct Settings {
-    // For every command
-    std::string module;   // "": the one beside the program
-    std::string scenario; // "": no simulation
+// Of a run of the program.
+struct Session_Settings {
+    std::string module;       // "": the one beside the program
+    std::string registration; // "": the one beside the program, for its module
+    std::string scenario;     // "": no simulation
+    std::string keep;
     std::string host_root;
-    std::string name_space = "root/vorlan";
     std::string platform;
     std::string mof;
-    Format format = Format::table;
     bool trace_calls = false;
+};
+
+struct Command {
+    std::string name; // "": none was given
+
+    // For every command; a line of a script may differ from the command line
+    std::string name_space = "root/vorlan";
+    Format format = Format::table;
+    bool wide = false;
 
     // Of single commands
-    std::string command;
     std::string class_name;
     std::string path;
     std::string method;
     std::vector<std::string> assignments; // name=value
     std::vector<std::string> properties;
     bool all = false;
+    bool check = false;
     std::string via, role, result_role, result_class;
+    std::string script;
+    bool stop = false;
+    bool quiet = false;
+    std::string port, table, value_name, value;
+};
+
+struct Settings {
+    Session_Settings session;
+    Command command;
 };
 
 // Reads the arguments of main. Prints help and answers false if that was asked for. Throws
 // Usage_Error.
 bool read_command_line(int argc, char** argv, Settings& settings);
+// The same for a line of a script, whose command has the defaults of the command line.
+bool read_line(std::vector<std::string> words, const Command& defaults, Command& command);
+// What a line may begin with.
+std::vector<std::string> line_commands();
 
 } // namespace mpcactl
 

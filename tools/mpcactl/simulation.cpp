@@ -4,12 +4,16 @@
 
 #include "host/installation.h"
 #include "host/text.h"
+#include "host/value_json.h"
 
 #include <algorithm>
+#include <cerrno>
 #include <cstdlib>
+#include <cstring>
 #include <dlfcn.h>
-#include <filesystem>
-#include <vector>
+#include <fcntl.h>
+#include <sys/file.h>
+#include <unistd.h>
 
 namespace mpcactl {
 
@@ -60,26 +64,55 @@ Function* Simulation::function(const char* name) const {
     return reinterpret_cast<Function*>(found);
 }
 
-Simulation::Simulation(const std::string& scenario, const std::string& host_root, bool trace) {
-    const std::string path = find_scenario(scenario);
+Simulation::Simulation(const Session_Settings& settings) {
+    const std::string path = find_scenario(settings.scenario);
     _library = dlopen((simulator_folder() / "libvlnsim.so").c_str(), RTLD_NOW | RTLD_GLOBAL);
     if (!_library)
         throw Usage_Error(std::string("the simulator cannot be loaded: ") + dlerror());
-    char error[1024] = "";
+    char error[4096] = "";
     if (function<decltype(vlnsim_load_scenario)>("vlnsim_load_scenario")(path.c_str(), error,
                                                                          sizeof error) != 0)
         throw Usage_Error(error);
     if (function<decltype(vlnsim_open_libraries)>("vlnsim_open_libraries")(error, sizeof error) !=
         0)
         throw Usage_Error(error);
-    if (trace)
+    if (settings.trace_calls)
         function<decltype(vlnsim_trace)>("vlnsim_trace")(stderr);
-    prepare_root(host_root);
+    if (!settings.keep.empty())
+        open_kept(settings.keep);
+    prepare_root(settings.keep.empty() ? fs::path(settings.host_root)
+                                       : fs::path(settings.keep) / "root");
 }
 
-void Simulation::prepare_root(const std::string& given) {
-    fs::path root = given;
-    if (given.empty()) {
+// Two processes at a time would each keep its own changes and undo those of the other.
+void Simulation::open_kept(const fs::path& folder) {
+    std::error_code error;
+    fs::create_directories(folder, error);
+    if (error)
+        throw Usage_Error("the folder " + folder.string() + " cannot be made: " + error.message());
+    _lock = open(folder.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC);
+    if (_lock < 0 || flock(_lock, LOCK_EX | LOCK_NB) != 0)
+        throw Usage_Error(errno == EWOULDBLOCK
+                              ? "another mpcactl keeps a host in " + folder.string()
+                              : folder.string() + ": " + std::strerror(errno));
+    const fs::path state = folder / "state.json";
+    char text[4096] = "";
+    if (fs::exists(state, error) && function<decltype(vlnsim_load_state)>("vlnsim_load_state")(
+                                        state.c_str(), text, sizeof text) != 0)
+        throw Usage_Error(std::string(text) + "\nGive another folder, or remove " +
+                          folder.string() + " to begin with the scenario as it is.");
+    _state = state.string();
+}
+
+void Simulation::keep() {
+    char error[4096] = "";
+    if (!_state.empty() && function<decltype(vlnsim_save_state)>("vlnsim_save_state")(
+                               _state.c_str(), error, sizeof error) != 0)
+        throw Usage_Error(error);
+}
+
+void Simulation::prepare_root(fs::path root) {
+    if (root.empty()) {
         const char* folder = std::getenv("TMPDIR");
         std::string pattern =
             (fs::path(folder && *folder ? folder : "/tmp") / "mpcactl-XXXXXX").string();
@@ -103,13 +136,27 @@ Simulation::~Simulation() {
     std::error_code error;
     if (!_temporary_root.empty())
         fs::remove_all(_temporary_root, error);
+    if (_lock >= 0)
+        close(_lock);
 }
 
-std::vector<std::string> Simulation::violations() const {
+void Simulation::set_value(const std::string& port, const std::string& table,
+                           const std::string& name, const std::string& value) {
+    const bool is_json = value == "null" || value.starts_with("{");
+    const std::string json =
+        is_json ? value
+                : host::Json(value).dump(-1, ' ', true, host::Json::error_handler_t::replace);
+    char error[4096] = "";
+    if (function<decltype(vlnsim_set_value)>("vlnsim_set_value")(
+            port.c_str(), table.c_str(), name.c_str(), json.c_str(), error, sizeof error) != 0)
+        throw Usage_Error(error);
+}
+
+std::vector<std::string> Simulation::violations(std::size_t from) const {
     auto* const count = function<decltype(vlnsim_violations)>("vlnsim_violations");
     auto* const text_of = function<decltype(vlnsim_violation)>("vlnsim_violation");
     std::vector<std::string> texts;
-    for (size_t i = 0, n = count(); i < n; ++i) {
+    for (size_t i = from, n = count(); i < n; ++i) {
         char text[512] = "";
         if (text_of(i, text, sizeof text) == 0)
             texts.emplace_back(text);

@@ -3,7 +3,9 @@
 #define MPCACTL_SIMULATION_H
 
 #include "simulator/vlnsim.h"
+#include "tools/mpcactl/settings.h"
 
+#include <filesystem>
 #include <string>
 #include <vector>
 
@@ -12,25 +14,36 @@ namespace mpcactl {
 // Lives longer than the module that uses it.
 class Simulation {
 public:
-    // scenario is a path, or the name of a scenario with or without ".json". An empty host_root
-    // gives the host a fresh temporary folder, which goes with the simulation. Throws Usage_Error.
-    Simulation(const std::string& scenario, const std::string& host_root, bool trace);
+    // The scenario is a path, or the name of a scenario with or without ".json". The host's files
+    // stand in the root folder given, in that of the kept state, or in a fresh temporary folder,
+    // which goes with the simulation. Throws Usage_Error.
+    explicit Simulation(const Session_Settings& settings);
     ~Simulation();
     Simulation(const Simulation&) = delete;
     Simulation& operator=(const Simulation&) = delete;
 
     // The module that is built for simulation.
     static std::string module_path();
-    // Breaches of the libraries' contract by the provider.
-    std::vector<std::string> violations() const;
+
+    // Changes a value of the hardware; a value that is neither null nor a JSON object is a text,
+    // which numbers may be as well. Throws Usage_Error.
+    void set_value(const std::string& port, const std::string& table, const std::string& name,
+                   const std::string& value);
+    // Breaches of the libraries' contract by the provider, from that of this number on.
+    std::vector<std::string> violations(std::size_t from) const;
+    // Writes the state that is to be kept, if any. Throws Usage_Error.
+    void keep();
 
 private:
     template <class Function>
     Function* function(const char* name) const;
-    void prepare_root(const std::string& given);
+    void open_kept(const std::filesystem::path& folder);
+    void prepare_root(std::filesystem::path root);
 
     void* _library = nullptr;
     std::string _temporary_root; // "": the root is the user's
+    std::string _state;          // the file of the kept state; "": none
+    int _lock = -1;              // of the folder of the kept state
 };
 
 } // namespace mpcactl

@@ -89,11 +89,12 @@ void vln_bench_san_refresh() {
     wait_for_refresh(*agent);
 }
 
-unsigned vln_bench_instances() {
+unsigned vln_bench_instances(bool san) {
     ProviderAgent* agent = ProviderAgent::current();
     Auto_Mutex lock(agent->m_DataMutex);
     unsigned count = 0;
     for (const Store_Row& row : store_table)
-        count += row.store(*agent).size();
+        if (san || (row.group != Store_Group::SAN_FCOE && row.group != Store_Group::SAN_ISCSI))
+            count += row.store(*agent).size();
     return count;
 }

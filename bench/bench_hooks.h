@@ -25,7 +25,7 @@ VLN_BENCH_HOOK bool vln_bench_refresh();
 // One SAN pass, without a scan of the adapters.
 VLN_BENCH_HOOK void vln_bench_san_refresh();
 
-// Instances in all stores.
-VLN_BENCH_HOOK unsigned vln_bench_instances();
+// Instances in all stores, or in all but those that a SAN pass fills.
+VLN_BENCH_HOOK unsigned vln_bench_instances(bool san);
 
 #endif // BENCH_BENCH_HOOKS_H

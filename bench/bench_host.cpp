@@ -1,7 +1,7 @@
 // What a blade of four cards with four functions each costs, and the same host with more cards.
 //
 //   bench_host walk names|instances FACTOR   prints the number of sources and of answers
-//   bench_host refresh FACTOR                prints instances made, refreshes, microseconds of each
+//   bench_host refresh FACTOR                prints instances made, microseconds of each refresh
 //   bench_host latency FACTOR                prints median, 99 % and longest, in microseconds
 //   bench_host memory FACTOR                 prints bytes taken per instance
 //
@@ -43,8 +43,8 @@ bool refresh() {
     return run();
 }
 
-unsigned stored_instances() {
-    return hook<decltype(&vln_bench_instances)>("vln_bench_instances")();
+unsigned stored_instances(bool san) {
+    return hook<decltype(&vln_bench_instances)>("vln_bench_instances")(san);
 }
 
 std::vector<host::ObjectPath> every_instance(host::Manager& manager) {
@@ -94,8 +94,7 @@ void time_refreshes() {
     for (int i = 0; i < REFRESHES; ++i)
         refresh();
     const double time = microseconds_since(start) / REFRESHES;
-    std::printf("%u %d %.0f\n", stored_instances(), REFRESHES + 2,
-                time); // the first two are warm-up
+    std::printf("%u %.0f\n", stored_instances(false), time);
 }
 
 // One thread keeps a refresh running; this one enumerates.
@@ -124,7 +123,7 @@ void measure_memory(host::Manager& manager, std::size_t before) {
     manager.enumerate("VLNMPCA_EthernetPort");
     refresh(); // so that nothing of the first one is still being made
     const std::size_t taken = mallinfo2().uordblks - before;
-    std::printf("%.0f\n", static_cast<double>(taken) / stored_instances());
+    std::printf("%.0f\n", static_cast<double>(taken) / stored_instances(true));
 }
 
 } // namespace

@@ -58,7 +58,7 @@ void measure_resident(host::Manager& manager, unsigned long before) {
         manager.enumerate(known->name);
     const unsigned long after = resident_kilobytes();
     std::printf("%lu %lu %u\n", before, after,
-                hook<decltype(&vln_bench_instances)>("vln_bench_instances")());
+                hook<decltype(&vln_bench_instances)>("vln_bench_instances")(true));
 }
 
 } // namespace

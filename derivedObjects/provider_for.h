@@ -1,8 +1,7 @@
 // Which type serves a class: the pattern, unless a hand-written provider is named here for it.
 //
 // A class with a provider of its own in services/ specialises Provider_For in that provider's
-// header, and this header includes it, so that the generated procedures see every specialisation
-// before use.
+// header, which services/providers.h names.
 #ifndef VLN_DERIVED_OBJECTS_PROVIDER_FOR_H
 #define VLN_DERIVED_OBJECTS_PROVIDER_FOR_H
 
@@ -16,8 +15,5 @@ struct Provider_For {
 };
 
 } // namespace cimple
-
-#include "services/configuration/provider.h"
-#include "services/profiles/provider.h"
 
 #endif // VLN_DERIVED_OBJECTS_PROVIDER_FOR_H

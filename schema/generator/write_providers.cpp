@@ -35,7 +35,7 @@ std::string provider_types(const Catalogue& catalogue) {
     for (const mof::Schema_Class* each : catalogue.providers)
         out << "struct " << each->name() << "_Provider : Provider_For<" << each->name()
             << ">::type {};\n";
-    return guarded("PROVIDER_TYPES_H", "#include \"derivedObjects/provider_for.h\"\n", out.str());
+    return guarded("PROVIDER_TYPES_H", "#include \"services/providers.h\"\n", out.str());
 }
 
 // Rows in the order of the chain; who includes the file defines what a row is.

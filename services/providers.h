@@ -1,0 +1,9 @@
+// Every provider that does more than the pattern. The generated procedures include this, so that
+// they see each specialisation of Provider_For before its use.
+#ifndef VLN_SERVICES_PROVIDERS_H
+#define VLN_SERVICES_PROVIDERS_H
+
+#include "services/configuration/provider.h"
+#include "services/profiles/provider.h"
+
+#endif // VLN_SERVICES_PROVIDERS_H

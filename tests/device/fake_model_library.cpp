@@ -192,7 +192,6 @@ AX_STATUS AX_IsLocalHBA(AX_WWN, uint32_t*) {
     return AX_STATUS_ERROR;
 }
 
-
 // ---- The HBA API ----
 
 HBA_STATUS HBA_LoadLibrary(void) {

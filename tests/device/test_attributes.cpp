@@ -25,63 +25,6 @@ private:
     std::unique_ptr<NICAdapter> m_owner;
 };
 
-TEST_F(Attributes_Test, NicAdapter) {
-    Fake_Instance& instance = fake_library.add(1, NIC);
-    instance.adapterValues = {{514, "Vorlan"},           {515, "SN1"},     {532, number(7)},
-                              {551, number(0xAA554B32)}, {559, number(1)}, {586, "2"},
-                              {591, "10.2.261.13"}};
-    const NICAdapterAttributes a(identifier, info());
-    EXPECT_EQ(a.PortWWN, "10000090FA000001");
-    EXPECT_EQ(a.NodeWWN, "20000090FA000001");
-    EXPECT_EQ(a.numberOfPorts, 1U);
-    EXPECT_EQ(a.Manufacturer, "Vorlan");
-    EXPECT_EQ(a.SerialNumber, "SN1");
-    EXPECT_TRUE(a.BootCodeEnabled);
-    EXPECT_EQ(a.BoardTemperature, 0x32);
-    EXPECT_EQ(a.ThresholdCriticalTemp, 0x55);
-    EXPECT_EQ(a.ThresholdWarningTemp, 0x4B);
-    EXPECT_EQ(a.PortNumber, 1U);
-    EXPECT_EQ(a.Subadapter_number, "2");
-    EXPECT_EQ(a.FirmwareOnFlash, "10.2.261.13");
-    EXPECT_EQ(a.Model, "");
-    EXPECT_EQ(a.DeviceID, 0U);
-    const auto lines = log_capture::take();
-    EXPECT_EQ(log_capture::count(lines, "5:Port 0's WWPN: 10000090FA000001"), 1);
-    EXPECT_EQ(log_capture::count(lines, "5:_SerialNumber : [ SN1 ]"), 1);
-    EXPECT_EQ(log_capture::count(lines, "5:_PortNumber: [ 1 ]"), 1);
-    EXPECT_EQ(log_capture::count(lines,
-                                 "5:ERROR: AX_GetHBAAttributeValue HA__DeviceID call failed (251)"),
-              1);
-    EXPECT_EQ(log_capture::count(lines, "5:ERROR: _Model: AX_GetHBAAttributes call failed (251)"),
-              1);
-}
-
-TEST_F(Attributes_Test, ConvergedAdapters) {
-    Fake_Instance& instance = fake_library.add(1, FCOE);
-    instance.adapterValues = {{520, "A1"},
-                              {528, "4.6"},
-                              {531, std::string("\x00\x90\xFA\x01\x02\x03", 6)},
-                              {534, "boot"},
-                              {551, number(41)}};
-    const FCoEAdapterAttributes o(identifier, info());
-    EXPECT_EQ(o.HWVersion, "A1");
-    EXPECT_EQ(o.IEEEAddress, "00:90:fa:01:02:03");
-    EXPECT_EQ(o.BoardTemperature, 41U);
-    EXPECT_EQ(o.DriverType, 3U);
-    EXPECT_EQ(logged("5:_DriverType: [ 3 ]"), 1);
-    const iSCSIAdapterAttributes i(identifier, info());
-    EXPECT_EQ(i.OpertionalFirmwareVersion, "4.6");
-    EXPECT_EQ(i.OpertionalFirmwareVersion2, "4.6");
-    EXPECT_EQ(logged("5:_BootImageExpansionROMVersion : [ boot ]"), 1);
-
-    instance.adapterValues.clear();
-    instance.driverTypeStatus = 12;
-    const FCoEAdapterAttributes bare(identifier, info());
-    EXPECT_EQ(bare.IEEEAddress, "");
-    EXPECT_EQ(bare.DriverType, 0U);
-    EXPECT_EQ(logged("3:ERROR: AX_GetDriverType call failed (12)"), 1);
-}
-
 TEST_F(Attributes_Test, WholeBufferThatFailsFailsTheObject) {
     Fake_Instance& instance = fake_library.add(1, NIC);
     instance.adapterStatus = {2, 2, 2};
@@ -96,25 +39,6 @@ TEST_F(Attributes_Test, WholeBufferThatFailsFailsTheObject) {
     instance.networkStatus = 1;
     EXPECT_THROW(iscsiPort(), std::exception);
     EXPECT_EQ(logged("3:ERROR: ADPCMD_GetNetConfig: AX_iSCSI_GetNetConfig() Failed."), 1);
-}
-
-TEST_F(Attributes_Test, NicPort) {
-    Fake_Instance& instance = fake_library.add(1, NIC);
-    instance.portValues = {{774, number(2)},    {802, number(6)},           {803, "eth0"},
-                           {805, number(1500)}, {817, "00-90-fa-00-00-01"}, {853, number(2)}};
-    owner(); // has a port of its own
-    log_capture::take();
-    const NICPortAttributes a = nicPort();
-    EXPECT_EQ(a.PortName, "10000090FA000001");
-    EXPECT_EQ(a.SpecialFeature, NIC);
-    EXPECT_EQ(a.FunctionalPortState, 2U);
-    EXPECT_EQ(a.PhysicalPortState, 6U);
-    EXPECT_EQ(a.IfName, "eth0");
-    EXPECT_EQ(a.CurrentMTU, 1500U);
-    EXPECT_EQ(a.CurrentMACAddress, "00-90-fa-00-00-01");
-    EXPECT_EQ(a.SRIOVState, 2U);
-    EXPECT_EQ(a.VEPAState, 2U) << "not offered: the default";
-    EXPECT_EQ(logged("3: hbaInfo.SpecialFeatures : (8) _SpecialFeature : 8 \n"), 1);
 }
 
 TEST_F(Attributes_Test, DefaultsStandWhenNothingIsOffered) {
@@ -133,26 +57,6 @@ TEST_F(Attributes_Test, DefaultsStandWhenNothingIsOffered) {
     const iSCSIPortAttributes i = iscsiPort();
     EXPECT_EQ(i.PhysicalPortState, 1U);
     EXPECT_EQ(i.PortType, 1U);
-}
-
-TEST_F(Attributes_Test, FcoePort) {
-    Fake_Instance& instance = fake_library.add(1, FCOE);
-    const uint8 fabric[8] = {0x10, 0, 0, 5, 0x1E, 0xAA, 0xBB, 0x0C};
-    std::memcpy(instance.info.fabricName, fabric, sizeof fabric);
-    instance.info.nFlags = 0xBEEF;
-    std::string types(32, '\0');
-    types[2] = 1;
-    instance.portValues = {{775, number(8)}, {776, types}, {777, std::string(types, 0, 3)}};
-    FCoEPort port(owner(), 0, identifier, info());
-    const auto& a = static_cast<const FCoEPortAttributes&>(*port.getPortAttributes());
-    EXPECT_EQ(a.FabricName, "10:00:00:05:1e:aa:bb:0c");
-    EXPECT_EQ(a.nFlags, "0000beef");
-    EXPECT_EQ(a.PORT_SERVICE_TYPE, 8U);
-    EXPECT_EQ(a.PortSupportedClassofService, 8U);
-    EXPECT_EQ(a.PortSupportedFc4Types[2], 1);
-    EXPECT_EQ(a.PortActiveFc4Types, a.PortSupportedFc4Types) << "a short value is no overrun";
-    EXPECT_EQ(port.getPortName(), "10000090FA000001");
-    EXPECT_EQ(port.getNodeName(), "20000090FA000001");
 }
 
 TEST_F(Attributes_Test, IscsiPort) {
@@ -198,17 +102,6 @@ TEST_F(Attributes_Test, AddressTexts) {
 }
 
 // ---- Values that lie ----
-
-TEST_F(Attributes_Test, TextsAreCutTo255Bytes) {
-    for (std::size_t length : {0U, 1U, 254U, 255U, 256U, 700U}) {
-        SetUp();
-        fake_library.add(1, NIC).adapterValues = {{516, std::string(length, 'x')},
-                                                  {517, std::string("ab\0cd", 5)}};
-        const NICAdapterAttributes a(identifier, info());
-        EXPECT_EQ(a.Model, std::string(std::min<std::size_t>(length, 255), 'x')) << length;
-        EXPECT_EQ(a.ModelDescription, "ab");
-    }
-}
 
 TEST_F(Attributes_Test, ValuesBesideTheBufferAreRefused) {
     static char elsewhere[] = "secret of the process";

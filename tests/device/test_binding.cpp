@@ -90,14 +90,6 @@ TEST_F(Binding, FallsBackToOtherNamesAndLibraries) {
     EXPECT_EQ(HBA_LoadLibrary(), 405U);
 }
 
-TEST_F(Binding, ManagementLibraryServesTheHbaApi) {
-    EXPECT_EQ(load("oldest"), 1U);
-    EXPECT_TRUE(VLN_Runtime_Loader::missing(SLOT_HBA));
-    EXPECT_EQ(feature(), 603U); // it has no LAX_ name
-    EXPECT_EQ(LAX_Ini_GetRouteTable(WWN, nullptr), 1U);
-    EXPECT_EQ(HBA_LoadLibrary(), 605U);
-}
-
 TEST_F(Binding, NoLibraryAtAll) {
     EXPECT_EQ(load("nowhere"), 0U);
     EXPECT_EQ(dlopenFailures(log_capture::take()), 4);
@@ -176,21 +168,4 @@ TEST_F(Binding, FirstCallsMayRace) {
         EXPECT_EQ(wrong, 0);
         unloadRuntimeLibraries();
     }
-}
-
-// Bound functions bear the names of library entry points. Were one of them visible, a search of the
-// default scope would find it and it would call itself.
-TEST(Binding_Module, LetsNoBoundFunctionOut) {
-    void* module = dlopen(TEST_HOSTS "/binding_module", RTLD_NOW | RTLD_GLOBAL);
-    ASSERT_NE(module, nullptr) << dlerror();
-    const char* const names[] = {
-#define VLN_BOUND(form, name, arguments, failure) #name,
-#include "device/library/bound_functions.inc"
-#undef VLN_BOUND
-    };
-    for (const char* name : names) {
-        EXPECT_EQ(dlsym(module, name), nullptr) << name;
-        EXPECT_EQ(dlsym(RTLD_DEFAULT, name), nullptr) << name;
-    }
-    dlclose(module);
 }

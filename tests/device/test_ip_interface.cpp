@@ -119,12 +119,4 @@ TEST_F(IP_Interface_Test, NamesAreCutToTheKernelsRecord) {
     EXPECT_EQ(kernel.asked.ifr_flags, 0);
 }
 
-// The machine's own kernel has a loopback interface, if it has any.
-TEST_F(IP_Interface_Test, AnInterfaceThatIsNotThereIsDown) {
-    VLN_IPInterfaceConfig::setCalls(nullptr);
-    VLN_IPInterfaceConfig interface;
-    EXPECT_FALSE(interface.GetInterfaceState("no-such-if"));
-    EXPECT_EQ(interface.GetIPv4Address("no-such-if"), "");
-}
-
 } // namespace cimple

@@ -45,52 +45,6 @@ protected:
     VLN_Data data;
 };
 
-TEST_F(San_Test, EachUnitCostsAnOpenFourCommandsAndAClose) {
-    for (uint64_t lun = 0; lun < 3; ++lun)
-        fake_san.add(lun);
-    scan();
-    Port* port = fcoePort();
-    ASSERT_NE(port, nullptr);
-    EXPECT_EQ(port->getTargetCount(), 0u);
-    data.buildSANData();
-    ASSERT_EQ(port->getTargetCount(), 3u);
-    for (uint32 lun = 0; lun < 3; ++lun)
-        EXPECT_EQ(port->getTarget(lun)->fcpLun, lun);
-    EXPECT_EQ(fake_san.rooms, std::vector<HBA_UINT32>{256});
-    EXPECT_EQ(fake_san.commands.size(), 12u);
-    EXPECT_EQ(fake_library.calls["HBA_OpenAdapter"], 1 + 3);
-    EXPECT_EQ(fake_library.calls["HBA_CloseAdapter"], 1 + 3);
-    EXPECT_EQ(fake_library.calls["HBA_RefreshInformation"], 0);
-    EXPECT_EQ(fake_library.openHandles, 0);
-    const auto lines = log_capture::take();
-    for (const char* line :
-         {"5:buildSANData", "5:Target Scan from adapter: Vorlan VT1234-03",
-          "5:FCoEAdapter::rescanTargets", "5:FCoEPort::rescanTargets", "5:MPCAadaptername:fcoe3",
-          "5:To retry the HBA_GetFcpTargetMapping command", "5:All Ok ...break ",
-          "5:Successful target info fetched", "5:found target mappings:3", "5:Number of targets:3",
-          "5:NICAdapter::rescanTargets", "5:Target Scanning for NICAdapter not supported"})
-        EXPECT_EQ(log_capture::count(lines, line), 1) << line;
-    const auto place = [&](const char* line) {
-        return std::find(lines.begin(), lines.end(), line) - lines.begin();
-    };
-    EXPECT_LT(place("5:found target mappings:3"), place("5:Creating Target..."));
-
-    // The former targets go before the new ones come.
-    data.buildSANData();
-    EXPECT_EQ(port->getTargetCount(), 3u);
-    EXPECT_EQ(logged("5:Freeing Target: 5006016446E01A2B"), 3);
-}
-
-TEST_F(San_Test, MappingGrowsToWhatTheLibraryHas) {
-    for (uint64_t lun = 0; lun < 300; ++lun)
-        fake_san.add(lun);
-    scan();
-    data.buildSANData();
-    EXPECT_EQ(fcoePort()->getTargetCount(), 300u);
-    EXPECT_EQ(fake_san.rooms, (std::vector<HBA_UINT32>{256, 300}));
-    EXPECT_EQ(logged("5:Increasing the buffer to = 300"), 1);
-}
-
 TEST_F(San_Test, ThreeTriesAndNoMore) {
     const struct {
         std::deque<HBA_STATUS> script;
@@ -168,29 +122,6 @@ TEST_F(San_Test, FailuresStayWithTheirPortAndTheirUnit) {
     EXPECT_EQ(fcoePort(0)->getTargetCount(), 0u);
     EXPECT_EQ(logged("3:target creation failed - moving to the next target"), 1);
     EXPECT_EQ(fake_library.openHandles, 0);
-}
-
-TEST_F(San_Test, AdapterWithoutANameInTheApiHasNoTargets) {
-    fake_library.hbas.clear();
-    fake_san.add(1);
-    scan();
-    data.buildSANData();
-    EXPECT_EQ(fcoePort()->getTargetCount(), 0u);
-    EXPECT_TRUE(fake_san.rooms.empty());
-    EXPECT_EQ(logged("3:HBA_OpenAdapter failed, skipping Adapter "), 1);
-}
-
-TEST_F(San_Test, OtherKindsHaveNoTargets) {
-    fake_library.instances.clear();
-    addFunction(5, ISCSI, nullptr);
-    fake_san.add(1);
-    scan();
-    data.buildSANData();
-    EXPECT_EQ(fake_library.calls["HBA_OpenAdapter"], 0);
-    const auto lines = log_capture::take();
-    EXPECT_EQ(log_capture::count(lines, "5:iSCSIAdapter::rescanTargets"), 1);
-    EXPECT_EQ(log_capture::count(lines, "5:iSCSI::rescanTargets"), 1);
-    EXPECT_EQ(log_capture::count(lines, "5:Nothing to do..."), 1);
 }
 
 // The mapping of a native FC adapter is read, but a target is made for FCoE adapters only.

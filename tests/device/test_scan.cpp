@@ -62,25 +62,6 @@ TEST_F(Scan_Test, FunctionsBecomeAdaptersOfTheirKinds) {
     EXPECT_EQ(data.adapters.size(), 5U) << "a rebuild replaces what was there";
 }
 
-TEST_F(Scan_Test, ThreeLooksAtAHostWithoutNicFunction) {
-    fake_library.add(1, ISCSI);
-    fake_library.add(2, 0x400 | FCOE); // makes a NIC adapter, but does not count as seen
-    data.buildAdapterData();
-    EXPECT_TRUE(data.adapters.empty());
-    EXPECT_EQ(sleeps, (std::vector<uint64>{1000000, 1000000}));
-    EXPECT_EQ(listings(), 4);
-    EXPECT_EQ(fake_library.calls["AX_GetHBAAttributes"], 0);
-}
-
-TEST_F(Scan_Test, EmptyHostTakesTwoSecondsAndIsNoError) {
-    data.buildAdapterData();
-    EXPECT_TRUE(data.adapters.empty());
-    EXPECT_EQ(data.adapterCount, 0);
-    EXPECT_EQ(sleeps.size(), 2U);
-    for (const std::string& line : log_capture::take())
-        EXPECT_EQ(line[0], '5') << line;
-}
-
 TEST_F(Scan_Test, NicFunctionThatComesLate) {
     for (int look : {2, 3}) {
         SCOPED_TRACE(look);
@@ -223,21 +204,6 @@ TEST_F(Scan_Test, AbsurdCountsAreRefused) {
             errors += line.rfind("3:ERROR: AX_GetAllLocalHBAInstances reports", 0) == 0;
         EXPECT_EQ(errors, 1);
     }
-}
-
-TEST_F(Scan_Test, ModelWithoutTerminator) {
-    Fake_Instance& instance = fake_library.add(1, NIC);
-    std::memset(instance.info.model, 'M', sizeof instance.info.model);
-    data.buildAdapterData();
-    ASSERT_EQ(data.adapters.size(), 1U);
-    EXPECT_EQ(data.adapters[0]->getAdapterName(), "Vorlan " + std::string(148, 'M') + "-01");
-}
-
-TEST_F(Scan_Test, LibraryIsLoadedOnce) {
-    data.buildAdapterData();
-    EXPECT_EQ(fake_library.calls["HBA_LoadLibrary"], 0);
-    VLN_Data another;
-    EXPECT_EQ(fake_library.calls["HBA_LoadLibrary"], 1);
 }
 
 // ---- Destruction ----

@@ -142,24 +142,6 @@ TEST_F(Vpd_Test, AnEntryCountsThatComesWithTheEnd) {
     EXPECT_STREQ(record.partNumber, "told");
 }
 
-TEST_F(Vpd_Test, PCIKeywordsComeInOrder) {
-    fake_vpd.entry("PN", "VT-1");
-    fake_vpd.entry("V0", "first");
-    fake_vpd.entry("CP", "\x10\x01 \xC3");
-    fake_vpd.entry("V0", "");
-    std::vector<PCI_VPD_Entry> entries;
-    ASSERT_EQ(VLN_Vpd().GetPCIVPD("10000090FA000003", &entries), AX_STATUS_OK);
-    std::string all;
-    for (const PCI_VPD_Entry& entry : entries)
-        all += entry.keyword + "=" + entry.value + ";";
-    EXPECT_EQ(all, "PN=VT-1;V0=first;CP=?? ?;V0=;");
-    EXPECT_EQ(fake_vpd.version, 0u);
-    fake_vpd.status = 251;
-    EXPECT_EQ(VLN_Vpd().GetPCIVPD("10000090FA000003", &entries), 251u);
-    EXPECT_EQ(VLN_Vpd().GetPCIVPD("10000090FA000003", nullptr), 4u);
-    EXPECT_EQ(log_capture::count(log_capture::take(), "5:ERROR: AX_GetVPD call failed : 251"), 1);
-}
-
 // The walk ends whatever the library answers, and stays in the buffer.
 TEST_F(Vpd_Test, CursorsAreNotBelieved) {
     const struct {

@@ -44,17 +44,6 @@ TEST_F(Config_File_Test, ObjectThatLoadedNothingWritesNothing) {
     EXPECT_TRUE(std::filesystem::is_empty(std::string(host_root()) + "/etc"));
 }
 
-TEST_F(Config_File_Test, SettersRefuseWhatIsOutOfRange) {
-    VlnConfigFile config;
-    for (sint32 value : {0, -1, 31, 1000})
-        EXPECT_EQ(config.set_cache_timeout(value), -1) << value;
-    for (sint32 value : {-1, 2}) {
-        EXPECT_EQ(config.set_refresh_adapter(value), -1) << value;
-        EXPECT_EQ(config.set_refresh_san(value), -1) << value;
-    }
-    EXPECT_EQ(config.get_cache_timeout(), 10U);
-}
-
 struct Tuning_Case {
     std::string text;
     uint32 timeout;

@@ -1,10 +1,8 @@
-// A well-behaved provider through every operation, alone and from many threads, without a leftover.
+// A well-behaved provider through every operation, without a leftover.
 
 #include "host/manager.h"
 
 #include <gtest/gtest.h>
-
-#include <thread>
 
 namespace {
 
@@ -134,31 +132,6 @@ TEST_F(Requests, AThreadOfTheProviderMayCallBack) {
         EXPECT_EQ(count("root/test", "Test_Numbered"), 0u);
     }
     EXPECT_EQ(manager.statistics().up_calls, 6u);
-}
-
-TEST_F(Requests, ManyCallsLeaveNothing) {
-    constexpr int calls = 100'000;
-    manager.get(good("a"));
-    const std::size_t before = manager.statistics().objects_created;
-    for (int i = 0; i < calls; ++i)
-        ASSERT_TRUE(manager.get(good("b"), std::vector<std::string>{"Level"}).ok());
-    EXPECT_EQ(manager.live_object_count(), 0u);
-    EXPECT_GT(manager.statistics().objects_created, before + 10u * calls);
-}
-
-TEST_F(Requests, ManyThreadsAtOnce) {
-    std::vector<std::thread> threads;
-    for (int t = 0; t < 4; ++t)
-        threads.emplace_back([this] {
-            for (int i = 0; i < 300; ++i) {
-                EXPECT_EQ(manager.enumerate("Test_Good").value.size(), 3u);
-                EXPECT_EQ(manager.associator_names(good("b")).value.size(), 2u);
-                EXPECT_TRUE(manager.invoke(good("a"), "Version", {}).ok());
-            }
-        });
-    for (std::thread& thread : threads)
-        thread.join();
-    EXPECT_EQ(manager.live_object_count(), 0u);
 }
 
 TEST(Loading, AMissingModuleAndABadCatalogueAreTold) {

@@ -7,8 +7,6 @@
 
 #include <gtest/gtest.h>
 
-#include <random>
-
 namespace {
 
 using host::Value;
@@ -88,32 +86,6 @@ TEST(PathText, SaysWhatIsWrong) {
     for (int i = 0; i < 12; ++i)
         nested = "Test_Link.First=" + host::quote(nested) + ",Second=" + host::quote("Test_Good");
     EXPECT_NE(parse(nested).error, "");
-}
-
-TEST(PathText, SurvivesMutatedTexts) {
-    const std::string seeds[] = {
-        "root/"
-        "test:Test_Link.First=\"Test_Good.Name=\\\"a\\\"\",Second=\"Test_Good.Name=\\\"b\\\"\"",
-        "Test_Numbered.Small=7,Large=18446744073709551615,On=TRUE",
-        "Test_Good.Name=\"\\x0041\\n\\\\\""};
-    const std::string alphabet = "\\\"=,.:x0Aa\n\xff_";
-    std::mt19937 random(1);
-    for (int round = 0; round < 30'000; ++round) {
-        std::string text = seeds[random() % std::size(seeds)];
-        for (unsigned edits = random() % 4 + 1; edits > 0; --edits) {
-            const std::size_t at = random() % text.size();
-            if (random() % 2)
-                text[at] = alphabet[random() % alphabet.size()];
-            else
-                text.erase(at, random() % 3);
-            if (text.empty())
-                text = "x";
-        }
-        const host::Parsed_Path parsed = parse(text);
-        if (parsed.error.empty()) {
-            EXPECT_EQ(parse(print(parsed.path)).path, parsed.path) << text;
-        }
-    }
 }
 
 TEST(ScalarText, NumbersAreExact) {

@@ -70,20 +70,6 @@ AX_STATUS AX_GetDriverParamsGlobal(AX_WWN, AX_DriverParam* table, uint32_t* coun
     return answer(table, count);
 }
 
-TEST_F(Driver_Parameters, ATableThatIsTooSmallIsTakenAgainOnce) {
-    for (const bool global : {false, true}) {
-        for (const AX_STATUS tooSmall : {AX_STATUS_MORE_DATA, AX_STATUS_LIST_TOO_SMALL}) {
-            EXPECT_EQ(get(global, {{tooSmall, 60}, {AX_STATUS_OK, 60}}), AX_STATUS_OK);
-            EXPECT_EQ(asked_global, global);
-            EXPECT_EQ(rooms, (std::vector<uint32>{52, 60}));
-            ASSERT_EQ(parameters.size(), 60u);
-            EXPECT_EQ(parameters[59].current, 59u);
-            EXPECT_EQ(get(global, {{tooSmall, 60}, {tooSmall, 61}, {AX_STATUS_OK, 1}}), tooSmall);
-            EXPECT_TRUE(parameters.empty());
-        }
-    }
-}
-
 TEST_F(Driver_Parameters, WhatIsTold) {
     EXPECT_EQ(get(true, {{AX_STATUS_OK, 2}}), AX_STATUS_OK);
     EXPECT_EQ(lines(),
@@ -104,15 +90,6 @@ TEST_F(Driver_Parameters, WhatIsTold) {
                      "(a) (190)"}));
     EXPECT_EQ(get(false, {{190, 0}}), 190u);
     EXPECT_EQ(lines()[1], "5:AX_GetDriverParams: status=190");
-}
-
-// Counts that no adapter can mean, with success or as the room wanted.
-TEST_F(Driver_Parameters, CountsBeyondReason) {
-    EXPECT_EQ(get(false, {{AX_STATUS_OK, 53}}), AX_STATUS_ERROR);
-    EXPECT_TRUE(parameters.empty());
-    EXPECT_EQ(get(false, {{AX_STATUS_LIST_TOO_SMALL, 0xFFFFFFFF}, {AX_STATUS_OK, 1}}),
-              AX_STATUS_ERROR);
-    EXPECT_EQ(rooms.size(), 1u);
 }
 
 TEST_F(Driver_Parameters, ABadNameCostsNoCall) {

@@ -107,25 +107,4 @@ TEST(Enumeration, ALargeAnswerHoldsNoMoreObjectsThanASmallOne) {
     EXPECT_LT(manager.statistics().objects_peak, 50u);
 }
 
-TEST(Enumeration, PatternClassesRefuseChanges) {
-    Road road;
-    const auto cards = road.enumerate("VLNMPCA_Card");
-    ASSERT_EQ(cards.size(), 1u);
-    EXPECT_EQ(road.manager().create(cards[0]).status.rc, CMPI_RC_ERR_NOT_SUPPORTED);
-    EXPECT_EQ(road.manager().modify(cards[0]).rc, CMPI_RC_ERR_NOT_SUPPORTED);
-    EXPECT_EQ(road.manager().remove(cards[0].path).rc, CMPI_RC_ERR_NOT_SUPPORTED);
-    EXPECT_EQ(road.manager().enumerate("VLNMPCA_Crad").status.rc, CMPI_RC_ERR_INVALID_CLASS);
-}
-
-TEST(Enumeration, MethodsNobodyWroteAreNotSupported) {
-    Road road;
-    const auto cards = road.enumerate("VLNMPCA_Card");
-    ASSERT_EQ(cards.size(), 1u);
-    const auto known = road.manager().invoke(cards[0].path, "ConnectorPower",
-                                             {{"PoweredOn", host::Value::boolean(true)}});
-    EXPECT_EQ(known.status.rc, CMPI_RC_ERR_NOT_SUPPORTED);
-    EXPECT_EQ(road.manager().invoke(cards[0].path, "Explode", {}).status.rc,
-              CMPI_RC_ERR_METHOD_NOT_FOUND);
-}
-
 } // namespace

@@ -34,9 +34,9 @@ TEST(Lifecycle, ARefreshShowsWhatChanged) {
     road.wait_for_refreshes(1);
     char error[256];
     for (const char* wwn : {"100002564C000000", "100002564C000101"})
-        ASSERT_EQ(vlnsim_set_value(wwn, "adapterAttributes", "HWVersion", "\"9\"", error,
-                                   sizeof error),
-                  0)
+        ASSERT_EQ(
+            vlnsim_set_value(wwn, "adapterAttributes", "HWVersion", "\"9\"", error, sizeof error),
+            0)
             << error;
     EXPECT_EQ(road::text_of(road.enumerate("VLNMPCA_Product")[0], "Version"), "7");
     vlnsim_advance(11 * MINUTE);

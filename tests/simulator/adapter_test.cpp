@@ -1,4 +1,4 @@
-// Instances, records and attributes of the scenarios that come with the simulator.
+// What the simulated libraries refuse, and note as a breach of their contract.
 #include "tests/simulator/simulated.h"
 
 #include <cstring>
@@ -6,51 +6,6 @@
 #include <sstream>
 
 namespace {
-
-TEST_F(Simulated, TheTableOfInstancesIsTakenInTwoCalls) {
-    start("two-port-cna.json");
-    std::uint32_t table[8] = {77, 77, 77, 77, 77, 77, 77, 77};
-    std::uint32_t count = 1;
-    EXPECT_EQ(7u, LOCAL(AX_GetAllLocalHBAInstances)(&count, table));
-    EXPECT_EQ(6u, count);
-    EXPECT_EQ(77u, table[0]);
-    EXPECT_EQ(0u, LOCAL(AX_GetAllLocalHBAInstances)(&count, table));
-    EXPECT_EQ(0u, table[0]);
-    EXPECT_EQ(5u, table[5]);
-    EXPECT_EQ(77u, table[6]) << "written beyond the stated room";
-    EXPECT_EQ(4u, LOCAL(AX_GetAllLocalHBAInstances)(nullptr, table));
-}
-
-TEST_F(Simulated, ScenariosDescribeTheHostsThatTheyAreNamedAfter) {
-    const struct {
-        const char* file;
-        std::vector<std::uint32_t> features; // of the instances, in order
-        AX_STATUS v4;
-    } rows[] = {
-        {"two-port-cna.json", {8, 8, 4, 4, 16, 16}, 0},
-        {"no-adapters.json", {}, 0},
-        {"no-nic.json", {4, 4, 16, 16}, 0},
-        {"old-records.json", {8, 8, 4, 4, 16, 16}, 190},
-        {"blade-16-functions.json", {8, 8, 16, 16, 8, 8, 16, 16, 8, 8, 4, 4, 8, 8, 4, 4}, 0},
-        {"san-4096-luns.json", {8, 8, 16, 16}, 0},
-    };
-    for (const auto& row : rows) {
-        start(row.file);
-        ASSERT_EQ(row.features.size(), LOCAL(AX_GetNumberOfLocalAdapters)()) << row.file;
-        for (std::uint32_t i = 0; i < row.features.size(); ++i) {
-            const HBAIdentifier identifier = identifier_of(i);
-            LocalHBAInfoV4 record{};
-            LocalHBAInfoV3 old{};
-            EXPECT_EQ(row.v4, LOCAL(AX_GetLocalHBAInfoV4)(&identifier, &record)) << row.file;
-            EXPECT_EQ(0u, LOCAL(AX_GetLocalHBAInfoV3)(&identifier, &old)) << row.file;
-            EXPECT_EQ(row.features[i], old.SpecialFeatures) << row.file << " " << i;
-            EXPECT_STREQ("VMC-2210", old.model);
-            EXPECT_TRUE(row.v4 != 0 || std::memcmp(&record, &old, sizeof old) == 0)
-                << "the forms differ";
-        }
-        EXPECT_EQ(0u, vlnsim_violations()) << row.file << ": " << violations().front();
-    }
-}
 
 TEST_F(Simulated, RecordCallsWantAnIdentifierOfTheEnumeration) {
     start("two-port-cna.json");
@@ -65,25 +20,6 @@ TEST_F(Simulated, RecordCallsWantAnIdentifierOfTheEnumeration) {
                   "AX_GetLocalHBAInfoV4: unknown instance 9",
                   "AX_GetLocalHBAInfoV4: the instance count 1 is not that of an enumeration"}),
               violations());
-}
-
-TEST_F(Simulated, AttributesAreReadOutOfABufferOfTheLibrarysOwn) {
-    start("two-port-cna.json");
-    std::vector<std::uint8_t> buffer(AX_ADAPTER_ATTRIBUTES_SIZE);
-    auto size = static_cast<std::uint32_t>(buffer.size());
-    ASSERT_EQ(0u, LOCAL(AX_GetHBAAttributes)(wwn_of(1), buffer.data(), &size));
-    EXPECT_LT(size, buffer.size());
-    EXPECT_EQ("VR10420117", attribute_text(buffer, 515));
-    EXPECT_EQ("VMC-2210", attribute_text(buffer, 516));
-    EXPECT_EQ(std::string("\x01\0\0\0", 4), attribute_text(buffer, 559)) << "port number";
-    EXPECT_EQ(std::string("\x02VL\0\x01\x01", 6), attribute_text(buffer, 531));
-    EXPECT_EQ("status 251", attribute_text(buffer, 529));
-    std::vector<std::uint8_t> port(AX_PORT_ATTRIBUTES_SIZE);
-    size = static_cast<std::uint32_t>(port.size());
-    ASSERT_EQ(0u, LOCAL(AX_GetPortAttributes)(wwn_of(1), port.data(), &size));
-    EXPECT_EQ("02:56:4c:00:01:01", attribute_text(port, 804));
-    EXPECT_EQ("vln0p1", attribute_text(port, 803));
-    EXPECT_EQ(0u, vlnsim_violations());
 }
 
 TEST_F(Simulated, AttributeBuffersThatAreTooSmallStayAsTheyAre) {
@@ -131,47 +67,6 @@ TEST_F(Simulated, UnknownNamesAndNullPointersAreRefusedAndNoted) {
     EXPECT_EQ(0u, local);
     EXPECT_EQ(0u, LOCAL(AX_IsLocalHBA)(wwn_of(5), &local));
     EXPECT_EQ(1u, local);
-}
-
-TEST_F(Simulated, StatisticsAreSixtyFourBitsWide) {
-    start("two-port-cna.json");
-    const AX_WWN wwn = wwn_of(4);
-    ASSERT_EQ(0, vlnsim_set_value("100002564C000004", "statistics", "LinkFailures",
-                                  "18446744073709551615", nullptr, 0));
-    ASSERT_EQ(0, vlnsim_set_value("100002564C000004", "statistics", "1040", nullptr, nullptr, 0));
-    std::vector<std::uint8_t> buffer(AX_PORT_STATISTICS_SIZE);
-    ASSERT_EQ(0u, LOCAL(AX_GetPortStatistics)(wwn, buffer.data(), AX_PORT_STATISTICS_SIZE));
-    EXPECT_EQ(std::string(8, '\xFF'), attribute_text(buffer, 1039));
-    EXPECT_EQ(std::string("\xE8\x03\0\0\0\0\0\0", 8), attribute_text(buffer, 1025));
-    EXPECT_EQ("status 251", attribute_text(buffer, 1040));
-}
-
-TEST_F(Simulated, VitalProductDataIsWalkedEntryByEntry) {
-    start("two-port-cna.json");
-    std::vector<char> buffer(AX_VPD_BUFFER_SIZE);
-    std::uint32_t size = AX_VPD_BUFFER_SIZE;
-    EXPECT_EQ(4u, LOCAL(AX_GetVPDV2)(wwn_of(0), 2, buffer.data(), &size));
-    ASSERT_EQ(0u, LOCAL(AX_GetVPDV2)(wwn_of(0), 1, buffer.data(), &size));
-    std::string tags;
-    std::string fru;
-    int card_function = 0;
-    char tag[AX_VPD_TAG_SIZE];
-    char value[AX_VPD_VALUE_SIZE];
-    void* cursor = buffer.data();
-    while ((cursor = LOCAL(AX_GetNextVpdEntry)(cursor, tag, sizeof tag, value, sizeof value))) {
-        tags += tag;
-        if (tags.ends_with("FN"))
-            fru = value;
-        if (tags.ends_with("CF"))
-            card_function = value[0];
-    }
-    EXPECT_EQ("PASNPNMNDMUUCFRIFNFW", tags);
-    EXPECT_EQ("00VM221", fru);
-    EXPECT_EQ(64, card_function);
-    // A value is cut to its room.
-    std::memset(value, 0x77, sizeof value);
-    LOCAL(AX_GetNextVpdEntry)(buffer.data(), tag, 2, value, 6);
-    EXPECT_EQ("Vorlan\x77", std::string(value, 7));
 }
 
 TEST_F(Simulated, WhatIsSetIsReadBack) {
@@ -269,46 +164,23 @@ TEST_F(Simulated, AStateIsWhatDiffersAndReadsBackTheSame) {
     }
 }
 
-TEST_F(Simulated, HardwareChangesUnderARunningHost) {
+TEST_F(Simulated, AHandleIsGoodUntilItIsClosed) {
     start("two-port-cna.json");
-    const char* wwn = "100002564C000000";
-    char error[256];
-    ASSERT_EQ(0, vlnsim_set_value(wwn, "portAttributes", "FunctionalPortState", "6", nullptr, 0));
-    ASSERT_EQ(0, vlnsim_set_value(wwn, "features", "SRIOV", R"({"status": 190})", nullptr, 0));
-    std::vector<std::uint8_t> buffer(AX_PORT_ATTRIBUTES_SIZE);
-    std::uint32_t size = AX_PORT_ATTRIBUTES_SIZE;
-    ASSERT_EQ(0u, LOCAL(AX_GetPortState)(wwn_of(0), buffer.data(), &size));
-    EXPECT_EQ(std::string("\x06\0\0\0", 4), attribute_text(buffer, 774));
-    std::uint32_t value = 77;
-    EXPECT_EQ(190u, LOCAL(AX_GetHBAFeature)(wwn_of(0), 35, &value));
-    EXPECT_EQ(1, vlnsim_set_value(wwn, "ports", "x", "1", error, sizeof error));
-    EXPECT_TRUE(std::string(error).find("unknown table \"ports\"") != std::string::npos) << error;
-    EXPECT_EQ(1, vlnsim_set_value("12", "features", "35", "1", error, sizeof error));
-}
-
-TEST_F(Simulated, DriverParametersComeInATableThatIsLargeEnough) {
-    start("fcoe-pair.json");
-    const AX_WWN wwn = wwn_of(1);
-    std::vector<AX_DriverParam> table(64);
-    std::uint32_t count = 59;
-    EXPECT_EQ(191u, LOCAL(AX_GetDriverParams)(wwn, table.data(), &count));
-    EXPECT_EQ(60u, count);
-    EXPECT_EQ(0, table[0].name[0]) << "nothing is written";
-    count = 61;
-    EXPECT_EQ(0u, LOCAL(AX_GetDriverParams)(wwn, table.data(), &count));
-    EXPECT_EQ(60u, count);
-    EXPECT_STREQ("nodev_tmo", table[0].name);
-    EXPECT_EQ(45u, table[0].current);
-    EXPECT_STREQ("tune_59", table[59].name);
-    EXPECT_EQ(0xA5, static_cast<std::uint8_t>(table[60].name[0])) << "room that is left is soiled";
-    EXPECT_EQ(0, table[61].name[0]) << "written beyond the stated room";
-    count = 64;
-    EXPECT_EQ(0u, LOCAL(AX_GetDriverParamsGlobal)(wwn, table.data(), &count));
-    EXPECT_EQ(2u, count);
-    EXPECT_EQ(251u, LOCAL(AX_GetDriverParams)(wwn_of(0), table.data(), &count)) << "a NIC";
-    EXPECT_TRUE(violations().empty());
-    EXPECT_EQ(4u, LOCAL(AX_GetDriverParams)(wwn, nullptr, &count));
-    EXPECT_EQ(1u, violations().size());
+    char name[256] = "kept";
+    EXPECT_EQ(HBA_STATUS_ERROR_ILLEGAL_INDEX, HBA(HBA_GetAdapterName)(2, name));
+    EXPECT_STREQ("kept", name);
+    ASSERT_EQ(0u, HBA(HBA_GetAdapterName)(1, name));
+    const HBA_HANDLE handle = HBA(HBA_OpenAdapter)(name);
+    HBA_PORTATTRIBUTES port{};
+    ASSERT_EQ(0u, HBA(HBA_GetAdapterPortAttributes)(handle, 0, &port));
+    EXPECT_EQ(HBA_STATUS_ERROR_ILLEGAL_INDEX, HBA(HBA_GetAdapterPortAttributes)(handle, 1, &port));
+    EXPECT_EQ(1u, vlnsim_open_handles());
+    HBA(HBA_CloseAdapter)(handle);
+    EXPECT_EQ(0u, vlnsim_open_handles());
+    EXPECT_EQ(0u, vlnsim_violations());
+    EXPECT_EQ(HBA_STATUS_ERROR_INVALID_HANDLE, HBA(HBA_GetAdapterPortAttributes)(handle, 0, &port));
+    HBA(HBA_CloseAdapter)(handle);
+    EXPECT_EQ(2u, vlnsim_violations());
 }
 
 } // namespace

@@ -1,9 +1,7 @@
-// The fault script, counts and records of calls, host root and clock.
+// The fault script, counts and records of calls.
 #include "tests/simulator/simulated.h"
 
-#include <atomic>
 #include <cstdio>
-#include <thread>
 
 namespace {
 
@@ -44,17 +42,6 @@ TEST_F(Fault, AStatusMeetsTheNthCallOrEveryCall) {
     EXPECT_EQ(8ul, vlnsim_calls("AX_GetVersion"));
     EXPECT_EQ(1, vlnsim_fault("AX_Nothing", 1, VLNSIM_STATUS, 1));
     EXPECT_EQ(1, vlnsim_fault("LAX_GetVersion", 1, VLNSIM_STATUS, 1)) << "a symbol, no function";
-}
-
-TEST_F(Fault, ABufferMayBeDeclaredTooSmall) {
-    std::uint32_t table[8];
-    std::uint32_t count = 8;
-    ASSERT_EQ(0, vlnsim_fault("AX_GetAllLocalHBAInstances", 1, VLNSIM_TOO_SMALL, 0));
-    EXPECT_EQ(7u, LOCAL(AX_GetAllLocalHBAInstances)(&count, table));
-    EXPECT_EQ(6u, count);
-    ASSERT_EQ(0, vlnsim_fault("AX_GetAllLocalHBAInstances", 1, VLNSIM_TOO_SMALL, 0x80000000));
-    EXPECT_EQ(7u, LOCAL(AX_GetAllLocalHBAInstances)(&count, table));
-    EXPECT_EQ(0x80000000u, count);
 }
 
 TEST_F(Fault, AValueMayBeMissing) {
@@ -134,62 +121,6 @@ TEST_F(Fault, CallsAreRecordedAndTracedWithTheirArguments) {
         traced.emplace_back(line, std::string(line).size() - 1);
     std::fclose(stream);
     EXPECT_EQ(expected, traced);
-}
-
-TEST_F(Fault, TheClockStandsStillUntilItIsMoved) {
-    vlnsim_use_virtual_clock(5 * second);
-    EXPECT_EQ(5 * second, vlnsim_now());
-    vlnsim_sleep(3600 * second);
-    vlnsim_advance(7);
-    EXPECT_EQ(3605 * second + 7, vlnsim_now());
-    vlnsim_use_system_clock();
-    EXPECT_GT(vlnsim_now(), 1000000000 * second);
-}
-
-// Each thread leaves its pause for one reason only: the clock, a stop, another clock.
-TEST_F(Fault, APauseWaitsForTheClockOrAStop) {
-    vlnsim_use_virtual_clock(5 * second);
-    std::atomic<int> stop{0};
-    const auto stopped = [](const void* flag) {
-        return static_cast<const std::atomic<int>*>(flag)->load();
-    };
-    const auto pause = [&] { vlnsim_pause(6 * second, stopped, &stop); };
-    const auto await = [](std::size_t count) {
-        while (vlnsim_paused() != count)
-            std::this_thread::yield();
-    };
-    std::thread sleeper(pause);
-    await(1);
-    vlnsim_advance(6 * second - 1);
-    EXPECT_EQ(1u, vlnsim_paused());
-    vlnsim_advance(1);
-    EXPECT_EQ(0u, vlnsim_paused());
-    sleeper.join();
-    EXPECT_EQ(11 * second, vlnsim_now());
-
-    sleeper = std::thread(pause);
-    await(1);
-    stop = 1;
-    vlnsim_wake();
-    sleeper.join();
-    pause();
-    stop = 0;
-    sleeper = std::thread(pause);
-    await(1);
-    vlnsim_use_system_clock();
-    sleeper.join();
-    EXPECT_EQ(0u, vlnsim_paused());
-}
-
-TEST_F(Fault, TheHostRootStaysReadableAfterItChanged) {
-    EXPECT_STREQ("", vlnsim_host_root());
-    vlnsim_set_host_root("somewhere");
-    const char* before = vlnsim_host_root();
-    vlnsim_set_host_root("elsewhere");
-    EXPECT_STREQ("somewhere", before);
-    EXPECT_STREQ("elsewhere", vlnsim_host_root());
-    vlnsim_set_host_root(nullptr);
-    EXPECT_STREQ("", vlnsim_host_root());
 }
 
 } // namespace

@@ -30,6 +30,9 @@ if(VLN_SANITIZE)
                         -fno-sanitize-recover=all)
     add_link_options(-fsanitize=${VLN_SANITIZE})
 endif()
+# No path of this machine in what is built, and the same bytes wherever that is done. Of two maps that
+# fit, the later one counts.
+add_compile_options("-ffile-prefix-map=${CMAKE_SOURCE_DIR}/=" "-ffile-prefix-map=${CMAKE_BINARY_DIR}=build")
 if(VLN_CHECK_LOCKS)
     add_compile_definitions(CIMPLE_CHECK_LOCKS)
 endif()

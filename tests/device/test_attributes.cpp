@@ -25,22 +25,6 @@ private:
     std::unique_ptr<NICAdapter> m_owner;
 };
 
-TEST_F(Attributes_Test, WholeBufferThatFailsFailsTheObject) {
-    Fake_Instance& instance = fake_library.add(1, NIC);
-    instance.adapterStatus = {2, 2, 2};
-    EXPECT_THROW(NICAdapterAttributes(identifier, info()), std::exception);
-    EXPECT_EQ(logged("3:ERROR: AX_GetHBAAttributes call failed (2)"), 1);
-    EXPECT_THROW(iSCSIAdapterAttributes(identifier, info()), std::exception);
-    EXPECT_THROW(FCoEAdapterAttributes(identifier, info()), std::exception);
-    instance.initiatorStatus = 1;
-    EXPECT_THROW(iscsiPort(), std::exception);
-    EXPECT_EQ(logged("3:ERROR: AX_iSCSI_GetInitiatorProperties() Failed."), 1);
-    instance.initiatorStatus = 0;
-    instance.networkStatus = 1;
-    EXPECT_THROW(iscsiPort(), std::exception);
-    EXPECT_EQ(logged("3:ERROR: ADPCMD_GetNetConfig: AX_iSCSI_GetNetConfig() Failed."), 1);
-}
-
 TEST_F(Attributes_Test, DefaultsStandWhenNothingIsOffered) {
     fake_library.add(1, NIC);
     const NICPortAttributes n = nicPort();
@@ -132,37 +116,6 @@ TEST_F(Attributes_Test, ValuesAtTheVeryEndAreCutThere) {
     const NICAdapterAttributes a(identifier, info());
     EXPECT_EQ(a.Model, "end");
     EXPECT_EQ(a.DeviceID, 0U) << "a number that does not fit is none";
-}
-
-// ---- Statistics ----
-
-TEST_F(Attributes_Test, StatisticsAreFetchedAnewAndKeptOnFailure) {
-    Fake_Instance& instance = fake_library.add(1, FCOE);
-    instance.statistics = {{1025, counter(1ULL << 40)},
-                           {1030, counter(~0ULL)},
-                           {1059, counter(0)},
-                           {1034, counter(5)}};
-    FCoEPort port(owner(), 0, identifier, info());
-    PortStatistics* statistics = port.getPortStatistics();
-    ASSERT_NE(statistics, nullptr);
-    EXPECT_EQ(statistics->counter(1025), 1ULL << 40);
-    EXPECT_EQ(statistics->counter(1030), 0xFFFFFFFFULL) << "all ones is no value";
-    EXPECT_EQ(statistics->counter(1031), 0xFFFFFFFFULL) << "not reported";
-    EXPECT_EQ(statistics->counter(1034), 0xFFFFFFFFULL) << "no counter of ours";
-    EXPECT_EQ(statistics->counter(1059), 0U);
-
-    instance.statistics[1031] = counter(9);
-    instance.statisticsStatus = {0, 4};
-    statistics = port.getPortStatistics();
-    EXPECT_EQ(statistics->counter(1031), 9U);
-    EXPECT_THROW(port.getPortStatistics(), std::exception);
-    EXPECT_EQ(statistics->counter(1031), 9U) << "the former object stays";
-    const auto lines = log_capture::take();
-    EXPECT_EQ(log_capture::count(lines, "3:ERROR: AX_GetPortStatistics call failed (4)"), 1);
-    EXPECT_EQ(log_capture::count(
-                  lines, "3:FCoE Port statistics error occurred,retain the old statistics !!!"),
-              1);
-    EXPECT_EQ(NICPort(owner(), 0, identifier, info()).getPortStatistics(), nullptr);
 }
 
 } // namespace cimple

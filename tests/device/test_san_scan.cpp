@@ -72,33 +72,6 @@ TEST_F(San_Test, ThreeTriesAndNoMore) {
     }
 }
 
-TEST_F(San_Test, CountsOfALibraryGoneWrongAreNotBelieved) {
-    fake_san.add(1);
-    scan();
-    // More entries than there was room for: what was written is read, and no more.
-    fake_san.onMapping = [](HBA_UINT32& entries) { entries = 100000; };
-    fake_san.mappingStatus = {0};
-    data.buildSANData();
-    EXPECT_EQ(fcoePort()->getTargetCount(), 256u);
-    EXPECT_EQ(logged("3:ERROR: HBA_GetFcpTargetMapping reports 100000 entries in room for 256"), 1);
-    // More entries than can be.
-    fake_san.onMapping = [](HBA_UINT32& entries) { entries = 0xFFFFFFFF; };
-    fake_san.mappingStatus = {7};
-    fake_san.rooms.clear();
-    data.buildSANData();
-    EXPECT_EQ(fcoePort()->getTargetCount(), 0u);
-    EXPECT_EQ(fake_san.rooms.size(), 1u);
-    EXPECT_EQ(logged("1:Could not allocate memory..break "), 1);
-    // No entries at all.
-    fake_san.onMapping = [](HBA_UINT32& entries) { entries = 0; };
-    data.buildSANData();
-    EXPECT_EQ(fcoePort()->getTargetCount(), 0u);
-    const auto lines = log_capture::take();
-    EXPECT_EQ(log_capture::count(lines, "5:HBA_GetFcpTargetMapping_t() found no target mappings"),
-              1);
-    EXPECT_EQ(log_capture::count(lines, "5:found target mappings:0"), 1);
-}
-
 TEST_F(San_Test, FailuresStayWithTheirPortAndTheirUnit) {
     addFunction(4, FCOE, "fcoe4");
     fake_san.add(1);

@@ -322,13 +322,11 @@ bool read_line(std::vector<std::string> words, const Command& defaults, Command&
     return parse(app, std::move(words), command, "\nTry help.");
 }
 
-std::vector<std::string> line_commands() {
+std::vector<std::string> command_names() {
     Command command;
     CLI::App app;
     Commands(app, command).add_all();
-    std::vector<std::string> names = command_names(app);
-    names.insert(names.end(), {"help", "quit"});
-    return names;
+    return command_names(app);
 }
 
 } // namespace mpcactl

@@ -18,10 +18,13 @@ int run(int argc, char** argv) {
     if (!read_command_line(argc, argv, settings))
         return EXIT_FINE;
     const Command& command = settings.command;
-    if (command.name.empty() && !isatty(STDIN_FILENO))
-        throw Usage_Error("a command is wanted. Commands: " + host::join_or(line_commands()) +
-                          " or run. run - reads commands from standard input.\n"
-                          "Try mpcactl --help.");
+    if (command.name.empty() && !isatty(STDIN_FILENO)) {
+        std::vector<std::string> names = command_names();
+        names.emplace_back("run");
+        throw Usage_Error("a command is wanted; run - reads commands from standard input\n"
+                          "Commands: " +
+                          host::join_or(names) + "\nTry mpcactl --help.");
+    }
     Session session(settings.session, command.name_space);
     int status = EXIT_FINE;
     if (command.name.empty())

@@ -181,7 +181,8 @@ int run_script(Session& session, const Command& command) {
 }
 
 int run_prompt(Session& session, const Command& defaults) {
-    std::vector<std::string> words = line_commands();
+    std::vector<std::string> words = command_names();
+    words.insert(words.end(), {"help", "quit"});
     for (const auto& known : session.classes().classes())
         words.push_back(known->name);
     Prompt prompt(std::move(words));

@@ -54,8 +54,8 @@ struct Settings {
 bool read_command_line(int argc, char** argv, Settings& settings);
 // The same for a line of a script, whose command has the defaults of the command line.
 bool read_line(std::vector<std::string> words, const Command& defaults, Command& command);
-// What a line may begin with.
-std::vector<std::string> line_commands();
+// The commands that a line may have.
+std::vector<std::string> command_names();
 
 } // namespace mpcactl
 

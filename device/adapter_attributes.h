@@ -92,13 +92,10 @@ public:
     std::string OpertionalFirmwareVersion2; // the same attribute, read a second time
 };
 
-class FCoEAdapterAttributes : public CNAAdapterAttributes {
-public:
-    FCoEAdapterAttributes(const HBAIdentifier& hbaIdentifier, const LocalHBAInfoV4& localHBAInfo);
-
+// What adapters tell that speak Fibre Channel, over Ethernet or not.
+struct FibreChannelFacts {
     uint32 DriverType = 0;
     std::string NodeSymbolicName;
-    uint32 VendorSpecificID = 0;
     std::string IEEEAddress; // "xx:xx:xx:xx:xx:xx"
     std::string FunctionalFirmwareVersion;
     std::string KernelFirmwareVersion;
@@ -110,28 +107,24 @@ public:
     std::string ULPFirmwareName;
 };
 
+class FCoEAdapterAttributes : public CNAAdapterAttributes, public FibreChannelFacts {
+public:
+    FCoEAdapterAttributes(const HBAIdentifier& hbaIdentifier, const LocalHBAInfoV4& localHBAInfo);
+
+    uint32 VendorSpecificID = 0;
+};
+
 // Reads the published record of the HBA API first, then the management library.
-class FCAdapterAttributes : public AdapterAttributes {
+class FCAdapterAttributes : public AdapterAttributes, public FibreChannelFacts {
 public:
     explicit FCAdapterAttributes(Adapter& adapter);
 
-    uint32 DriverType = 0;
-    std::string NodeSymbolicName;
     std::string SLI1FirmwareName;
     std::string SLI2FirmwareName;
-    std::string IEEEAddress;
     bool BootCodeEnabled = false;
     uint32 DiagVersionNumber = 0;
-    std::string FunctionalFirmwareVersion;
-    std::string KernelFirmwareVersion;
     std::string SLI3FirmwareName;
-    uint32 SLIMode = 0;
-    uint32 BoardTemperature = 0;
     uint32 FunctionType = 0;
-    std::string SPFirmwareVersion;
-    std::string SPFirmwareName;
-    std::string ULPFirmwareVersion;
-    std::string ULPFirmwareName;
     std::string FCUniversalVersion;
     std::string FC_X86_BIOSVersion;
     std::string FC_EFIVersion;

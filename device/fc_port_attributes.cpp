@@ -3,6 +3,7 @@
 #include "device/library/hba_api.h"
 #include "device/port_attributes.h"
 #include "foundation/common.h"
+#include "foundation/field_text.h"
 #include "foundation/log.h"
 
 #include <cstring>

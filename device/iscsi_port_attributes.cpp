@@ -1,7 +1,7 @@
 #include "device/attribute_table.h"
-#include "device/library/hba_api.h"
 #include "device/port_attributes.h"
 #include "foundation/common.h"
+#include "foundation/field_text.h"
 #include "foundation/log.h"
 
 #include <exception>

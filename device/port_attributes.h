@@ -121,16 +121,11 @@ private:
     void readNetworkProperties(AX_WWN wwn);
 };
 
-class FCoEPortAttributes : public StoragePortAttributes {
-public:
-    FCoEPortAttributes(Adapter& adapter, uint32 portIndex, const HBAIdentifier& hbaIdentifier,
-                       const LocalHBAInfoV4& localHBAInfo);
-
+// What ports tell that speak Fibre Channel, over Ethernet or not.
+struct FibreChannelPortFacts {
     std::string PortSymbolicName;
     uint32 PortFcId = 0;
-    uint32 FunctionalPortState = 0;
-    uint32 PORT_SERVICE_TYPE = 0;
-    uint32 PortSupportedClassofService = 0; // the same attribute, read a second time
+    uint32 PortSupportedClassofService = 0;
     Fc4_Types PortSupportedFc4Types{};
     Fc4_Types PortActiveFc4Types{};
     uint32 PortSupportedSpeed = 0;
@@ -138,6 +133,15 @@ public:
     uint32 PortMaxFrameSize = 0;
     std::string OSDeviceName;
     uint32 NumberofDiscoveredPorts = 0;
+};
+
+class FCoEPortAttributes : public StoragePortAttributes, public FibreChannelPortFacts {
+public:
+    FCoEPortAttributes(Adapter& adapter, uint32 portIndex, const HBAIdentifier& hbaIdentifier,
+                       const LocalHBAInfoV4& localHBAInfo);
+
+    uint32 FunctionalPortState = 0;
+    uint32 PORT_SERVICE_TYPE = 0; // the attribute of the class of service, read once more
     uint32 PhysicalPortState = 1;
     std::string FuncPortSpeed;
     std::string FuncQosBandwidth;
@@ -147,25 +151,15 @@ public:
 };
 
 // Reads the published record of the HBA API first, then the management library.
-class FCPortAttributes : public PortAttributes {
+class FCPortAttributes : public PortAttributes, public FibreChannelPortFacts {
 public:
     FCPortAttributes(Adapter& adapter, uint32 portIndex);
 
     std::string PortWWN;
     std::string NodeWWN;
     std::string FabricName; // 16 upper-case digits
-    uint32 PortFcId = 0;
     uint32 PortType = 1;
     uint32 PortState = 1; // the physical state, once the management library has told it
-    uint32 PortSupportedClassofService = 0;
-    Fc4_Types PortSupportedFc4Types{};
-    Fc4_Types PortActiveFc4Types{};
-    std::string OSDeviceName;
-    std::string PortSymbolicName;
-    uint32 PortSupportedSpeed = 0;
-    uint32 PortSpeed = 0;
-    uint32 PortMaxFrameSize = 0;
-    uint32 NumberofDiscoveredPorts = 0;
     uint32 FECState = 2;
 
 private:

@@ -3,6 +3,7 @@
 #include "device/fcoe_adapter.h"
 #include "device/library/hba_api.h"
 #include "foundation/common.h"
+#include "foundation/field_text.h"
 #include "foundation/log.h"
 
 #include <algorithm>
@@ -72,7 +73,7 @@ public:
     // The text in the field of the response, up to its end or a zero.
     std::string text(uint32 offset, uint32 size) const {
         const char* field = reinterpret_cast<const char*>(response) + offset;
-        return std::string(field, strnlen(field, std::min(size, RESPONSE_SIZE - offset)));
+        return fieldText(field, std::min(size, RESPONSE_SIZE - offset));
     }
 
     HBA_STATUS status = HBA_STATUS_OK; // of the last attempt

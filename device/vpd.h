@@ -12,7 +12,7 @@
 namespace cimple {
 
 // The texts are padded with zeros, and have no terminator when they fill their field: read them
-// with fieldText (device/library/hba_api.h).
+// with fieldText (foundation/field_text.h).
 struct FRUVPD {
     char manufacturer[256];
     char productName[256];

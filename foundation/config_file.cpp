@@ -1,6 +1,7 @@
 #include "foundation/config_file.h"
 
 #include "cimple/guard.h"
+#include "foundation/file_handle.h"
 #include "foundation/log.h"
 
 #include <cstdio>
@@ -19,11 +20,6 @@ constexpr const char* REFRESH_SAN_KEY = "VLN_PROVIDER_REFRESH_SANDATA";
 
 constexpr const char* BANNER_RULE = "##################################################\n";
 constexpr const char* BANNER_TITLE = "# Vorlan HBA CIM Provider Configuration Settings #\n";
-
-struct File_Closer {
-    void operator()(std::FILE* stream) const { std::fclose(stream); }
-};
-using File_Handle = std::unique_ptr<std::FILE, File_Closer>;
 
 // The next line without its end, cut to `longest` characters. False at the end of the file.
 bool read_line(std::FILE* stream, std::size_t longest, std::string& line) {

@@ -18,6 +18,7 @@ constexpr uint32 bit(sint32 level) {
 constexpr uint32 FFDC_LEVELS = bit(VLN_CRIT) | bit(VLN_ERR);
 constexpr uint32 FILE_LEVELS = bit(VLN_DBG + 1) - 1;
 constexpr uint32 RING_LEVELS = bit(VLN_INFO) - 1;
+// Meant: the provider's levels start at 1, so none of its lines floods the host's system log.
 constexpr uint32 SYSLOG_LEVELS = bit(VLN_INVALID);
 
 const char* level_word(sint32 level) {
@@ -27,8 +28,8 @@ const char* level_word(sint32 level) {
 }
 
 // "e": a child process of the object manager must not inherit the log.
-std::FILE* open_for_append(const char* path) {
-    return std::fopen(path, "a+e");
+File_Handle open_for_append(const char* path) {
+    return File_Handle(std::fopen(path, "a+e"));
 }
 
 } // namespace
@@ -41,27 +42,21 @@ VLN_FileLogger::VLN_FileLogger() {
 
 VLN_FileLogger::~VLN_FileLogger() {
     CLogger::instance().remove_logger(this);
-    if (stream)
-        std::fclose(stream);
 }
 
-void VLN_FileLogger::set_stream(std::FILE* opened) {
-    if (stream)
-        std::fclose(stream);
-    stream = opened;
+void VLN_FileLogger::set_stream(File_Handle opened) {
+    stream = std::move(opened);
     m_fileLevels = !stream ? 0 : ffdc ? FFDC_LEVELS : FILE_LEVELS;
 }
 
 void VLN_FileLogger::log(sint32 level, const char* file, uint32 line, const char* text) {
-    if (!mode_has_file(CLogger::instance().get_mode()) || !stream || level > VLN_DBG)
-        return;
-    if (ffdc && level != VLN_CRIT && level != VLN_ERR)
+    if (!wants(level))
         return;
     // The "l" after the thread's number is a letter of the line, known to those who parse it.
-    std::fprintf(stream, "[threadid =%ul] [%s] [%s:%u][%s] %s\n",
+    std::fprintf(stream.get(), "[threadid =%ul] [%s] [%s:%u][%s] %s\n",
                  static_cast<unsigned>(pthread_self()), Datetime::now().readable().c_str(), file,
                  line, level_word(level), text);
-    std::fflush(stream);
+    std::fflush(stream.get());
 }
 
 void VLN_FileLogger::open() {
@@ -78,8 +73,7 @@ void VLN_FileLogger::close() {
 
 void VLN_FileLogger::clear() {
     set_stream(nullptr);
-    if (std::FILE* emptied = std::fopen(path.c_str(), "we"))
-        std::fclose(emptied);
+    const File_Handle emptied(std::fopen(path.c_str(), "we"));
     set_stream(open_for_append(path.c_str()));
 }
 
@@ -93,7 +87,7 @@ sint32 VLN_FileLogger::validateAndSetPath(const char* newPath, bool isFfdc) {
     } else if (errno != ENOENT) {
         return -1;
     }
-    std::FILE* opened = open_for_append(newPath);
+    File_Handle opened = open_for_append(newPath);
     if (!opened)
         return -1;
 
@@ -101,7 +95,7 @@ sint32 VLN_FileLogger::validateAndSetPath(const char* newPath, bool isFfdc) {
     Auto_Mutex lock(logger.list_lock());
     path = newPath;
     ffdc = isFfdc;
-    set_stream(opened);
+    set_stream(std::move(opened));
     logger.refresh_interest();
     return 0;
 }
@@ -120,17 +114,16 @@ VLN_SysLogger::~VLN_SysLogger() {
 }
 
 void VLN_SysLogger::log(sint32 level, const char*, uint32, const char* text) {
-    // Meant: the provider's levels start at 1, so none of its lines floods the host's system log.
-    if (level > VLN_INVALID || !text)
+    if (!wants(level) || !text)
         return;
     const std::string line = std::string("[") + text + "]\n";
     // Meant for two chatty callers. With the bracket in front it holds back nothing.
     if (line.compare(0, 15, "GetInterfaceState", 15) == 0 ||
         line.compare(0, 13, "GetIPAddressType", 13) == 0)
         return;
-    static constexpr int PRIORITIES[] = {-1, LOG_CRIT, LOG_WARNING, LOG_ERR, LOG_INFO};
+    constexpr int NO_PRIORITY = -1; // of what is no level
     // Through "%s": a percent sign in the text of a device must not become a directive.
-    syslog(PRIORITIES[level < VLN_INVALID ? VLN_INVALID : level], "%s", line.c_str());
+    syslog(NO_PRIORITY, "%s", line.c_str());
 }
 
 // The ring.
@@ -141,7 +134,7 @@ VLN_CIMLogger::VLN_CIMLogger() {
 }
 
 void VLN_CIMLogger::log(sint32 level, const char*, uint32, const char* text) {
-    if (!text || level >= VLN_INFO || !mode_has_ring(CLogger::instance().get_mode()))
+    if (!text || !wants(level))
         return;
     VLN_CIMLogEntry entry{static_cast<uint32>(level), Datetime::now(), {}};
     std::snprintf(entry.message, sizeof entry.message, "[%s]", text);

@@ -24,11 +24,6 @@ namespace {
 // The system logger has the lines of a disabled logger, so it is known apart from the list.
 constinit std::atomic<VLN_SysLogger*> known_syslog{nullptr};
 
-struct File_Closer {
-    void operator()(std::FILE* stream) const { std::fclose(stream); }
-};
-using File_Handle = std::unique_ptr<std::FILE, File_Closer>;
-
 // A number as strtol reads it, held to 32 bits. False for a missing token or one without a number.
 bool read_number(const char* token, sint32& value) {
     if (!token)
@@ -60,6 +55,11 @@ void log_line(sint32 level, const char* file, uint32 line, const char* format, .
 uint32 VLN_LoggerInterface::interest(sint32 mode) const {
     return m_anyLevels | (mode_has_file(mode) ? m_fileLevels : 0U) |
            (mode_has_ring(mode) ? m_ringLevels : 0U);
+}
+
+bool VLN_LoggerInterface::wants(sint32 level) const {
+    return level >= VLN_INVALID && level <= VLN_DBG &&
+           (interest(CLogger::instance().get_mode()) >> level & 1U) != 0;
 }
 
 CLogger& CLogger::instance() {

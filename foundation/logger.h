@@ -9,9 +9,9 @@
 #include "cimple/datetime.h"
 #include "cimple/string.h"
 #include "cimple/thread.h"
+#include "foundation/file_handle.h"
 #include "foundation/log.h"
 
-#include <cstdio>
 #include <memory>
 #include <vector>
 
@@ -45,11 +45,14 @@ public:
     virtual void close() = 0;
     virtual void clear() = 0;
 
-    // The levels (bit n: level n) that log() would write in the given mode. A sink may claim more
-    // than it writes, never less.
+    // The levels (bit n: level n) that log() would write in the given mode: the one filter. A sink
+    // of a test may claim more than it writes, never less.
     uint32 interest(sint32 mode) const;
 
 protected:
+    // Whether log() writes a line of the level, in the logger's mode.
+    bool wants(sint32 level) const;
+
     VLN_LoggerInterface() = default;
     VLN_LoggerInterface(const VLN_LoggerInterface&) = delete;
     VLN_LoggerInterface& operator=(const VLN_LoggerInterface&) = delete;
@@ -139,10 +142,10 @@ public:
     const String& get_path() const { return path; }
 
 private:
-    void set_stream(std::FILE* opened);
+    void set_stream(File_Handle opened);
 
     String path;
-    std::FILE* stream = nullptr;
+    File_Handle stream;
     bool ffdc = false;
 };
 

@@ -1,6 +1,8 @@
 // VLN_Common: text forms of names, addresses and records.
 #include "foundation/common.h"
 
+#include "foundation/field_text.h"
+
 #include "cimple/instance.h"
 #include "foundation/log.h"
 
@@ -41,11 +43,6 @@ std::string mac_text(const uint8* mac) {
 bool is_digit_pair_text(const char* text, std::size_t length) {
     return std::strlen(text) == length &&
            std::all_of(text, text + length, [](unsigned char c) { return std::isxdigit(c) != 0; });
-}
-
-template <std::size_t N>
-std::string field_text(const char (&field)[N]) {
-    return std::string(field, strnlen(field, N));
 }
 
 } // namespace
@@ -155,14 +152,14 @@ sint32 VLN_Common::adapterAttributesText(const hba_AdapterAttributes* attributes
         return 0;
     if (!attributes)
         return VLN_GENERAL_ERROR;
-    *dst = "Manufacturer: " + field_text(attributes->Manufacturer) +
+    *dst = "Manufacturer: " + fieldText(attributes->Manufacturer) +
            "NodeWWN: " + wwnText(attributes->NodeWWN.wwn) +
-           "ModelDescription: " + field_text(attributes->ModelDescription) +
-           "NodeSymbolicName: " + field_text(attributes->NodeSymbolicName) +
-           "HardwareVersion: " + field_text(attributes->HardwareVersion) +
-           "DriverVersion: " + field_text(attributes->DriverVersion) +
-           "FirmwareVersion: " + field_text(attributes->FirmwareVersion) +
-           "DriverName: " + field_text(attributes->DriverName);
+           "ModelDescription: " + fieldText(attributes->ModelDescription) +
+           "NodeSymbolicName: " + fieldText(attributes->NodeSymbolicName) +
+           "HardwareVersion: " + fieldText(attributes->HardwareVersion) +
+           "DriverVersion: " + fieldText(attributes->DriverVersion) +
+           "FirmwareVersion: " + fieldText(attributes->FirmwareVersion) +
+           "DriverName: " + fieldText(attributes->DriverName);
     return 0;
 }
 

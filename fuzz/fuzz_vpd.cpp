@@ -1,6 +1,6 @@
 // Vital product data: the buffer, the entries in it, and cursors that lead astray.
-#include "device/library/hba_api.h"
 #include "device/vpd.h"
+#include "foundation/field_text.h"
 #include "fuzz/fuzz.h"
 
 using namespace cimple;

@@ -7,7 +7,6 @@
 #include "classes/VLNMPCA_EthernetPort.h"
 #include "classes/VLNMPCA_FRUVitalProductData.h"
 #include "classes/VLNMPCA_SoftwareIdentity.h"
-#include "device/library/hba_api.h"
 
 #include <algorithm>
 #include <cctype>
@@ -18,11 +17,6 @@ namespace {
 
 constexpr uint32 INSERT_FAILED = 32769;
 constexpr uint16 FIRMWARE = 10; // CIM_SoftwareIdentity.Classifications
-
-template <std::size_t N>
-String field(const char (&characters)[N]) {
-    return text({characters, strnlen(characters, N)});
-}
 
 void set_unless_empty(Property<String>& property, const String& value) {
     if (!value.empty())
@@ -36,10 +30,10 @@ bool contains(const Array<String>& values, const String& value) {
 // What the console shows for the card; left alone without a maker or a known function.
 void set_card_name(VLNMPCA_Card& card, const FRUVPD& record, uint32 index) {
     std::string function;
-    const String maker = field(record.manufacturer);
+    const String maker = field_text(record.manufacturer);
     if (maker.empty() || VLN_Vpd::GetCardFunctionText(record.cardFunction, function) != 0)
         return;
-    const String serial = field(record.serialNumber);
+    const String serial = field_text(record.serialNumber);
     card.Name.set(serial.empty() ? format_text("%s %s Onboard Adapter %d", maker.c_str(),
                                                function.c_str(), static_cast<int>(index))
                                  : format_text("%s %s Adapter %s", maker.c_str(), function.c_str(),
@@ -57,14 +51,14 @@ Ref<VLNMPCA_FRUVitalProductData> fru_instance(const VLNMPCA_Card& card, const St
     const String& serial = card.VLNSerialNumber.value;
     fru->InstanceID.set(serial);
     fru->ElementName.set(format_text("VLN MPCA FRU:%s", serial.c_str()));
-    fru->ProductName.set(field(record.productName));
-    fru->SerialNumber.set(field(record.serialNumber));
-    fru->PartNumber.set(field(record.partNumber));
-    fru->Manufacturer.set(field(record.manufacturer));
-    fru->Date.set(field(record.date));
-    fru->UUID.set(field(record.uuid));
-    fru->FRUNumber.set(field(record.fruNumber));
-    fru->FRUFirmwareDetail.append(field(record.firmware));
+    fru->ProductName.set(field_text(record.productName));
+    fru->SerialNumber.set(field_text(record.serialNumber));
+    fru->PartNumber.set(field_text(record.partNumber));
+    fru->Manufacturer.set(field_text(record.manufacturer));
+    fru->Date.set(field_text(record.date));
+    fru->UUID.set(field_text(record.uuid));
+    fru->FRUNumber.set(field_text(record.fruNumber));
+    fru->FRUFirmwareDetail.append(field_text(record.firmware));
     add_asic(*fru, asic_name);
     fru->CardFunction.set(record.cardFunction);
     fru->RevisionID.set(record.revisionId);
@@ -130,12 +124,12 @@ uint32 VPD_Maps::takeFRUData(VLNMPCA_Card& card, const FRU_Source& function, uin
         VLN_LOG(VLN_DBG, "Unable to get the FRU VPD for Card : %s ", card.Tag.value.c_str());
         return status;
     }
-    set_unless_empty(card.Manufacturer, field(record.manufacturer));
-    set_unless_empty(card.SerialNumber, field(record.serialNumber));
-    set_unless_empty(card.PartNumber, field(record.partNumber));
-    set_unless_empty(card.SKU, field(record.fruNumber));
+    set_unless_empty(card.Manufacturer, field_text(record.manufacturer));
+    set_unless_empty(card.SerialNumber, field_text(record.serialNumber));
+    set_unless_empty(card.PartNumber, field_text(record.partNumber));
+    set_unless_empty(card.SKU, field_text(record.fruNumber));
     set_card_name(card, record, index);
-    setCardTag(card, field(record.uuid));
+    setCardTag(card, field_text(record.uuid));
     // Data without an order number have been taken from another function before.
     if (auto* fru = findFRUData(card)) {
         add_asic(*fru, function.asicName);
@@ -205,9 +199,9 @@ uint32 VPD_Maps::updateFirmware(VLNMPCA_SoftwareIdentity& firmware) {
         return status;
 
     Datetime date;
-    if (release_date(field(record.firmwareDate), date))
+    if (release_date(field_text(record.firmwareDate), date))
         firmware.ReleaseDate.set(date);
-    set_unless_empty(firmware.VersionString, field(record.firmwareVersion));
+    set_unless_empty(firmware.VersionString, field_text(record.firmwareVersion));
 
     std::string function;
     std::string classification;

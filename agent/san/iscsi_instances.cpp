@@ -3,7 +3,6 @@
 #include "agent/state_tables.h"
 #include "agent/text.h"
 #include "device/library/attribute_buffer.h"
-#include "device/library/hba_api.h"
 
 #include <algorithm>
 
@@ -129,7 +128,7 @@ Ref<VLNMPCA_iSCSISession> session_instance(const String& id, const String& targe
 
 Ref<VLNMPCA_ISCSISessionStatistics> statistics_instance(const String& id,
                                                         const AX_iSCSI_SessionInfo& info) {
-    const String alias = text(fieldText(info.targetAlias));
+    const String alias = field_text(info.targetAlias);
     auto statistics = make_instance<VLNMPCA_ISCSISessionStatistics>();
     statistics->InstanceID.set(id);
     statistics->ElementName.set(id);

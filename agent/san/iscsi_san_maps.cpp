@@ -12,7 +12,6 @@
 #include "classes/VLNMPCA_SCSIProtocolController.h"
 #include "classes/VLNMPCA_TCPProtocolEndpoint.h"
 #include "device/library/bound_functions.h"
-#include "device/library/hba_api.h"
 #include "device/scan_end.h"
 
 #include <cstdlib>

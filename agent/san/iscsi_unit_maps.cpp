@@ -7,7 +7,6 @@
 #include "agent/text.h"
 #include "classes/VLNMPCA_iSCSITargetProtocolEndpoint.h"
 #include "device/library/bound_functions.h"
-#include "device/library/hba_api.h"
 #include "device/scan_end.h"
 #include "foundation/utf8.h"
 

@@ -39,12 +39,6 @@ HBA_HANDLE openHbaAdapter(const std::string& name);
 // would keep the scan busy for hours; it is cut, with a line at level 3.
 uint32 boundedHbaCount(uint32 count, const char* what);
 
-// The text of a fixed field, with or without a terminator.
-template <std::size_t N>
-std::string fieldText(const char (&field)[N]) {
-    return std::string(field, strnlen(field, N));
-}
-
 } // namespace cimple
 
 #endif // VLN_DEVICE_LIBRARY_HBA_API_H

@@ -2,36 +2,13 @@
 
 #include "agent/gates.h"
 #include "cimple/guard.h"
+#include "services/configuration/settings.h"
 
 namespace cimple {
 
 namespace {
 
-// A tuning value: how the configuration takes it, the agent's copy, and the lines of both outcomes.
-struct Setting {
-    sint32 (VlnConfigFile::*set)(sint32 value);
-    void (*update)(ProviderAgent& agent, uint32 value);
-    const char* done;
-    const char* refused;
-};
-
-// By the place of the instance in its store.
-constexpr Setting SETTINGS[] = {
-    {&VlnConfigFile::set_cache_timeout,
-     [](ProviderAgent& agent, uint32 value) { agent.m_CacheTimeout = value; },
-     "Cache time-out is modified successfully",
-     "The value provided for cache time-out is out of range"},
-    {&VlnConfigFile::set_refresh_adapter,
-     [](ProviderAgent& agent, uint32 value) { agent.m_bRefreshAdapterData = value != 0; },
-     "Adapter refresh is modified successfully",
-     "The value provided for adapter refresh out is out of range"},
-    {&VlnConfigFile::set_refresh_san,
-     [](ProviderAgent& agent, uint32 value) { agent.m_bRefreshSANData = value != 0; },
-     "SAN refresh is modified successfully",
-     "The value provided for SAN refresh out is out of range"},
-};
-
-sint32 change(ProviderAgent& agent, const Setting& setting, uint32 value) {
+sint32 change(ProviderAgent& agent, const Tuning_Setting& setting, uint32 value) {
     // A value beyond the signed range turns negative, and is refused as such.
     if ((agent.m_ConfigFile.*setting.set)(static_cast<sint32>(value)) != 0) {
         VLN_LOG(VLN_ERR, "%s", setting.refused);
@@ -55,8 +32,8 @@ sint32 modify(ProviderAgent& agent, const VLNMPCA_ProviderConfigSetting* model,
         if (model->current.is_null() || !key_eq(settings[i], model))
             continue;
         const uint32 value = instance->current.value;
-        if (i < std::size(SETTINGS))
-            if (const sint32 status = change(agent, SETTINGS[i], value))
+        if (i < NUM_TUNING_SETTINGS)
+            if (const sint32 status = change(agent, tuning_settings[i], value))
                 return status;
         settings[i]->current.set(value);
         return MODIFY_INSTANCE_OK;

@@ -54,12 +54,6 @@ constexpr Property<uint16> CIM_ElementSettingData::*FLAGS[] = {
     &CIM_ElementSettingData::IsMaximum,
 };
 
-// The library fills a field to its last byte.
-template <std::size_t N>
-String field_text(const char (&field)[N]) {
-    return text({field, strnlen(field, N)});
-}
-
 String setting_key(const char* word, Parameter_Scope scope, const String& port_name,
                    const String& parameter) {
     return scope == Parameter_Scope::GLOBAL

@@ -139,6 +139,24 @@ TEST_F(Forms, EveryFunctionFailsWithItsValue) {
     }
 }
 
+// The stand-in has what the product binds, in the libraries in which the product looks for it.
+TEST_F(Forms, TheSimulatorHasEveryFunction) {
+    std::set<std::string> simulated;
+#define VLNSIM_A(name, model) simulated.insert("A AX_" #name);
+#define VLNSIM_B(name, model) simulated.insert("B LAX_" #name);
+#define VLNSIM_C(name, model) simulated.insert("C AX_" #name);
+#define VLNSIM_D(name, model) simulated.insert("D HBA_" #name);
+#define VLNSIM_E(name, model) simulated.insert("E CPQFC_" #name);
+#define VLNSIM_F(name, model) simulated.insert("F " #name);
+#include "simulator/entry_points.def"
+    std::set<std::string> bound;
+#define VLN_BOUND(form, name, arguments, failure)                                                  \
+    bound.insert((#form[0] == 'M' ? "E " : #form " ") + std::string(#name));
+#include "device/library/bound_functions.inc"
+#undef VLN_BOUND
+    EXPECT_EQ(simulated, bound);
+}
+
 TEST_F(Forms, SearchOrder) {
     const struct {
         const char* name;

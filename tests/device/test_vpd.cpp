@@ -1,7 +1,7 @@
 // Reading the FRU data out of vital product data, and the text look-ups.
 
-#include "device/library/hba_api.h"
 #include "device/vpd.h"
+#include "foundation/field_text.h"
 #include "tests/device/log_capture.h"
 
 #include <gtest/gtest.h>

@@ -2,13 +2,10 @@
 
 #include "classes/VLNMPCA_Card.h"
 #include "classes/VLNMPCA_EthernetPort.h"
-#include "classes/VLNMPCA_FCPort.h"
-#include "classes/VLNMPCA_FCPortStatistics.h"
 #include "classes/VLNMPCA_PortController.h"
 #include "tests/agent/dynamic_fixture.h"
 
 #include <chrono>
-#include <cstring>
 
 namespace cimple {
 
@@ -81,43 +78,6 @@ TEST_F(Dynamic_Test, AFailedReadingLeavesTheRow) {
     sleep_nineteen_times();
     poll();
     expect_shown(*agent, 0, DOWN);
-}
-
-TEST_F(Dynamic_Test, AnUpdateWithinItsLimitIsFree) {
-    begin(R"({"use": "nic"}, {"use": "fcoe"})");
-    const struct {
-        const Meta_Class* meta_class;
-        uint64 limit;
-        const char* entry;
-        const char* not_yet;
-    } rows[] = {
-        {&VLNMPCA_EthernetPort::static_meta_class, 10 * SECOND,
-         "PERF: UpdateEthernetPortStatus: Entry", "PERF: Refresh Not yet required"},
-        {&VLNMPCA_FCPort::static_meta_class, 10 * SECOND, "PERF: UpdateFCoEPortStatus: Entry",
-         "PERF: Refresh Not yet required"},
-        {&VLNMPCA_FCPortStatistics::static_meta_class, 10 * SECOND, "Entering GetFCoEPortStats()",
-         "GetFCoEPortStats() :Refresh Not yet required"},
-        {&VLNMPCA_PortController::static_meta_class, 5 * SECOND, "UpdatePhyLinkDownReason(): Entry",
-         "UpdatePhyLinkDownReason:Refresh Not yet required"},
-        {&VLNMPCA_Card::static_meta_class, 10 * SECOND, "UpdateBoardTemp(): Entry",
-         "UpdateBoardTemp refresh Not yet required"},
-    };
-    for (const auto& row : rows) {
-        // The refresh decision says "not yet" in the same words as two of the routines.
-        const int others = std::strncmp(row.not_yet, "PERF", 4) == 0 ? 1 : 0;
-        const auto not_yet = [&](uint64 step) {
-            vlnsim_advance(step);
-            Log_Capture log;
-            EXPECT_GE(count_instances(*row.meta_class), 0);
-            EXPECT_EQ(log.count(VLN_DBG, row.entry), 1);
-            return log.count(VLN_DBG, row.not_yet) - others;
-        };
-        EXPECT_EQ(not_yet(0), 0) << row.entry;
-        const unsigned long calls = vlnsim_calls(nullptr);
-        EXPECT_EQ(not_yet(row.limit - 1), 1) << row.entry;
-        EXPECT_EQ(vlnsim_calls(nullptr), calls) << row.entry;
-        EXPECT_EQ(not_yet(1), 0) << row.entry;
-    }
 }
 
 TEST_F(Dynamic_Test, LinkDownReasonAndTemperatureFollowTheHardware) {

@@ -44,33 +44,6 @@ protected:
 
 } // namespace
 
-TEST_F(FCoE_Status_Test, PortShowsWhatTheLibraryTells) {
-    set_port("PhysicalPortState", "6");
-    set_port("FunctionalPortState", "258"); // one byte of it counts
-    set_port("PortType", "20");
-    set_port("PortSpeed", "16");
-    set_port("PhysicalPortSpeed", "8");
-    set_port("FuncPortSpeed", "\"8 Gbps\"");
-    for (int time = 0; time < 2; ++time) { // the states are replaced, not added to
-        look_at_port();
-        ASSERT_EQ(port->OperationalStatus.value.size(), 1u);
-        ASSERT_EQ(port->StatusDescriptions.value.size(), 1u);
-    }
-    EXPECT_EQ(port->OperationalStatus.value[0], 1);
-    EXPECT_STREQ(port->StatusDescriptions.value[0].c_str(), "Other");
-    EXPECT_EQ(port->DetailedStatus.value, 2);
-    EXPECT_EQ(port->PortType.value, 1);
-    EXPECT_STREQ(port->OtherPortType.value.c_str(), "Private Loop");
-    EXPECT_EQ(port->Speed.value, 8000000000u);
-    EXPECT_EQ(port->PhysicalPortSpeed.value, 4000000000u);
-    EXPECT_STREQ(port->FunctionalPortSpeed.value.c_str(), "8 Gbps");
-    EXPECT_FALSE(port->FunctionalPortSpeed.is_null());
-
-    set_port("PhysicalPortSpeed", "10000"); // no code
-    look_at_port();
-    EXPECT_EQ(port->PhysicalPortSpeed.value, 0u);
-}
-
 // A value that can't be read ends its port: what comes after it stays as it was.
 TEST_F(FCoE_Status_Test, AFailedReadingEndsThePort) {
     const struct {

@@ -69,23 +69,6 @@ TEST_F(Lifecycle_Test, LastReleaseDestroysAndTheNextLoadStartsAfresh) {
     EXPECT_EQ(next->m_CIM_ComputerSystem_map.size(), 0u);
 }
 
-TEST_F(Lifecycle_Test, ConfigurationIsReadAndWrittenBack) {
-    std::ofstream(host_path(Host_File::TUNING)) << "VLN_PROVIDER_CACHE_TIMEOUT = 7\n"
-                                                   "VLN_PROVIDER_REFRESH_ADAPTERDATA = TRUE\n"
-                                                   "VLN_PROVIDER_REFRESH_SANDATA = FALSE\n";
-    {
-        Loaded_Agent agent;
-        EXPECT_EQ(agent->m_CacheTimeout, 7u);
-        EXPECT_TRUE(agent->m_bRefreshAdapterData);
-        EXPECT_FALSE(agent->m_bRefreshSANData);
-        EXPECT_EQ(agent->m_OSName.rfind("Linux version 6.1.0", 0), 0u);
-        agent->m_ConfigFile.set_cache_timeout(9);
-    }
-    EXPECT_NE(contents(Host_File::TUNING).find("VLN_PROVIDER_CACHE_TIMEOUT = 9\n"),
-              std::string::npos);
-}
-
-// The small default log is nobody's setting; settings of an earlier run are kept.
 TEST_F(Lifecycle_Test, LogSettingsAreSavedOnlyIfThereWereSome) {
     { Loaded_Agent agent; }
     EXPECT_FALSE(std::filesystem::exists(host_path(Host_File::LOG_SETTINGS)));

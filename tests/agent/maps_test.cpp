@@ -87,43 +87,6 @@ uint16 ConnectorLayout = 12;
 )");
 }
 
-TEST_F(Properties_Test, EthernetPort) {
-    EXPECT_EQ(first(STORE_VLNMPCA_EthernetPort), R"(
-string __name_space = "root/vorlan";
-string InstanceID = "VMC-2210:100002564C000000";
-string Description = "Vorlan VMC-2210 10Gb 2-port PCIe Converged Network Adapter";
-string ElementName = "vln0p0";
-uint64 Generation = 0;
-string Name = "vln0p0";
-uint16 OperationalStatus = { 2 };
-string StatusDescriptions = { "OK" };
-uint16 EnabledState = 2;
-uint16 RequestedState = 12;
-string SystemCreationClassName = "CIM_ComputerSystem";
-string SystemName = "box";
-string CreationClassName = "VLNMPCA_EthernetPort";
-string DeviceID = "100002564C000000";
-string OtherIdentifyingInfo = { "VR10420117:03", "VR10420117:0", "VR10420117" };
-string IdentifyingDescriptions = { "SerialNumber + Sub-AdapterID", "SerialNumber:PhysicalPortNumber", "SerialNumber" };
-uint16 LocationIndicator = 3;
-uint64 Speed = 10000000000;
-uint64 MaxSpeed = 10000000000;
-uint16 PortType = 0;
-uint16 PortNumber = 0;
-uint16 LinkTechnology = 2;
-string PermanentAddress = "02564c000000";
-string NetworkAddresses = { "02564c000000" };
-uint64 SupportedMaximumTransmissionUnit = 9000;
-uint64 ActiveMaximumTransmissionUnit = 1500;
-uint16 Capabilities = { 2, 3, 4 };
-uint16 EnabledCapabilities = { 3, 4 };
-string FunctionalQosBandwidth = "10 Gbps";
-string FunctionalQosMinBandwidth = "1 Gbps";
-uint32 PCIBusNumber = 16;
-string FunctionalPortSpeed = "10 Gbps";
-)");
-}
-
 TEST_F(Properties_Test, LANEndpoint) {
     EXPECT_EQ(first(STORE_VLNMPCA_LANEndpoint), R"(
 string __name_space = "root/vorlan";
@@ -186,9 +149,12 @@ TEST_F(Maps_Test, StatesFollowTheLibrary) {
         const char* controller_status;
         const char* access;
     } rows[] = {
-        {6, "{ 3 }", "3", "{ 1 }", "2"},
-        {1, "{ 0 }", "0", "{ 0 }", "1"},
-        {21, "{ 32789 }", "3", "{ 0 }", "2"},
+        {0, "{ 0 }", "1", "{ 0 }", "2"},      {1, "{ 0 }", "0", "{ 0 }", "1"},
+        {2, "{ 2 }", "2", "{ 2 }", "1"},      {3, "{ 10 }", "3", "{ 10 }", "2"},
+        {4, "{ 1 }", "1", "{ 1 }", "2"},      {5, "{ 11 }", "7", "{ 11 }", "2"},
+        {6, "{ 3 }", "3", "{ 1 }", "2"},      {7, "{ 6 }", "1", "{ 6 }", "2"},
+        {8, "{ 32776 }", "1", "{ 11 }", "2"}, {20, "{ 32788 }", "1", "{ 0 }", "2"},
+        {21, "{ 32789 }", "3", "{ 0 }", "2"}, {22, "{ 32790 }", "3", "{ 0 }", "2"},
     };
     load(R"({"use": "nic"})");
     Loaded_Agent agent;

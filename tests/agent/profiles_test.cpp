@@ -50,27 +50,6 @@ TEST_F(Profiles_Test, EachIsMadeOnceWithTheReferencesOfItsStandard) {
     EXPECT_EQ(references.size(), 2u);
 }
 
-TEST_F(Profiles_Test, APlatformsSystemIsNotOursToConform) {
-    load(R"({"use": "nic"})");
-    Loaded_Agent agent;
-    EXPECT_EQ(refreshes_started(*agent), 1);
-    Auto_Mutex lock(agent->m_DataMutex);
-    auto& conforms = agent->m_VLNMPCA_ComputerSystemConformsToProfile_map;
-    const uint32 before = conforms.size();
-    EXPECT_EQ(before, 15u);
-    Log_Capture log;
-    agent->m_bOwnComputerSystem = false;
-    Profile_Maps(*agent).registerForSystem(PROFILE_DIAGNOSTICS);
-    EXPECT_EQ(conforms.size(), before);
-    EXPECT_EQ(log.count(VLN_DBG, "This is IBM/VMWare comp Sys - do nothing"), 1);
-    agent->m_bOwnComputerSystem = true;
-    Profile_Maps(*agent).registerForSystem(PROFILE_DIAGNOSTICS);
-    EXPECT_EQ(conforms.size(), before + 1);
-    EXPECT_EQ(log.count(VLN_DBG, "Generating VLNMPCA_ComputerSystemConformsToProfile (Computer "
-                                 "System,VLN:Diagnostics)"),
-              1);
-}
-
 // Without a NIC the pass goes on to the records all the same.
 TEST_F(Profiles_Test, AHostWithoutANicHasTheProfilesOfItsStorage) {
     load(R"({"use": "fcoe"})");

@@ -97,31 +97,6 @@ uint32 RevisionID = 3;
 )");
 }
 
-TEST_F(Vpd_Maps_Test, FurtherAsicsAreAdded) {
-    load(R"({"use": "nic"})");
-    refresh();
-    VPD_Maps maps(**agent);
-    const auto* fru = (*agent)->m_VLNMPCA_FRUVitalProductData_map[0];
-    const uint32 names = fru->ASICId.value.size();
-    vlnsim_clear_calls();
-    const auto update = [&](const String& asic) {
-        const FRU_Source function[] = {{asic, PORT}};
-        return maps.UpdateFRUToCard(*card(), function, 0);
-    };
-    EXPECT_EQ(update(fru->ASICId.value[0]), 0u);
-    EXPECT_EQ(update(""), 0u);
-    EXPECT_EQ(vlnsim_calls("AX_GetVPDV2"), 0u);
-    EXPECT_EQ(update("second"), 0u);
-    EXPECT_EQ(vlnsim_calls("AX_GetVPDV2"), 1u);
-    ASSERT_EQ(fru->ASICId.value.size(), names + 1);
-    EXPECT_EQ(fru->ASICId.value[names], "second");
-    ASSERT_EQ(vlnsim_fault("AX_GetVPDV2", 1, VLNSIM_STATUS, 190), 0);
-    EXPECT_EQ(update("third"), 190u);
-    EXPECT_EQ(fru->ASICId.value.size(), names + 1);
-    (*agent)->m_VLNMPCA_FRUVitalProductData_map.clear();
-    EXPECT_EQ(update("third"), 32768u);
-}
-
 TEST_F(Vpd_Maps_Test, CardWithoutFruDataKeepsWhatItHas) {
     load(R"({"use": "nic"})");
     ASSERT_EQ(vlnsim_fault("AX_GetVPDV2", VLNSIM_EVERY, VLNSIM_STATUS, 1), 0);
@@ -252,22 +227,6 @@ TEST_F(Vpd_Maps_Test, PortsAndSoftwareFindEachOther) {
     EXPECT_EQ(log.count(VLN_DBG, "Invalid PortAddress"), 1);
     (*agent)->m_VLNMPCA_EthernetPort_map.clear();
     EXPECT_EQ(maps.GetLogicalPortAddress("", 2, &text), 32768u);
-}
-
-TEST_F(Vpd_Maps_Test, SanPassFindsTheUnits) {
-    load(R"({"use": "nic"}, {"use": "fcoe", "targets":
-            {"wwpn": "50:25:64:C{port}:00:00:00:{target:02X}", "luns": 4}})");
-    Log_Capture log;
-    refresh();
-    uint32 units = 0;
-    for (const auto& adapter : (*agent)->m_pData->adapters)
-        for (const auto& port : adapter->getPorts())
-            units += port->getTargetCount();
-    EXPECT_EQ(units, 8u);
-    EXPECT_EQ(log.count(VLN_DBG, "PERF: Building SAN Data..."), 1);
-    EXPECT_EQ(vlnsim_calls("HBA_GetFcpTargetMapping"), 2u);
-    EXPECT_EQ(vlnsim_calls("HBA_SendScsiInquiry"), 3u * units);
-    EXPECT_EQ(vlnsim_calls("HBA_SendReadCapacity"), units);
 }
 
 } // namespace cimple

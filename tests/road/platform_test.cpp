@@ -10,6 +10,8 @@ namespace {
 constexpr const char* PLATFORM = R"([
   {"namespace": "root/ibmse", "class": "IBMSD_ComputerSystem",
    "properties": {"CreationClassName": "IBMSD_ComputerSystem", "Name": "rack7-node3"}},
+  {"namespace": "root/ibmse", "class": "IBMSD_ComputerSystem",
+   "properties": {"CreationClassName": "IBMSD_ComputerSystem", "Name": "a second one"}},
   {"namespace": "root/ibmse", "class": "IBMSD_Chassis",
    "properties": {"CreationClassName": "IBMSD_Chassis", "Tag": "chassis 12"}}
 ])";

@@ -1,10 +1,11 @@
 // From profiles to elements as a client walks, on the provider's own system and on a platform's,
 // and the tuning values that a client may change.
-#include "tests/road/road.h"
+#include "tests/road/properties.h"
 
 #include <fstream>
 #include <sstream>
 
+using road::expect_properties;
 using road::Road;
 using road::text_of;
 
@@ -148,6 +149,29 @@ TEST_F(Tuning, TheThreeValuesAreOnDiskAfterTheModuleIsUnloaded) {
     EXPECT_NE(text.find("VLN_PROVIDER_REFRESH_ADAPTERDATA = TRUE\n"), std::string::npos) << text;
     EXPECT_NE(text.find("VLN_PROVIDER_REFRESH_SANDATA = FALSE\n"), std::string::npos) << text;
     EXPECT_EQ(road.count_in_log("Cache time-out is modified successfully"), 1u);
+}
+
+TEST_F(Tuning, EachValueTellsItsRange) {
+    const struct {
+        const char* name;
+        const char* low;
+        const char* high;
+        const char* by_default;
+    } rows[] = {{"cachetimeout", "5", "30", "10"},
+                {"adapterrefresh", "0", "1", "0"},
+                {"sanrefresh", "0", "1", "1"}};
+    const auto settings = road.enumerate("VLNMPCA_ProviderConfigSetting");
+    ASSERT_EQ(settings.size(), std::size(rows));
+    for (std::size_t i = 0; i < std::size(rows); ++i)
+        expect_properties(
+            settings[i],
+            {{"InstanceID", ("Vorlan MPCA Provider:" + std::string(rows[i].name)).c_str()},
+             {"paramname", rows[i].name},
+             {"lowRange", rows[i].low},
+             {"highRange", rows[i].high},
+             {"def", rows[i].by_default},
+             {"current", rows[i].by_default},
+             {"ConfigurationName", "-"}});
 }
 
 TEST_F(Tuning, WhatIsOutOfRangeChangesNothing) {

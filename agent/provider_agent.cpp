@@ -196,7 +196,7 @@ void ProviderAgent::endThreadsOf(const void* provider) {
 void ProviderAgent::endRefreshOf(const void* provider) {
     {
         Auto_Mutex lock(m_DataFetchMutex);
-        if (!m_DataFetchThread.is_given_by(provider))
+        if (!m_DataFetchThread.is_given_by(provider) || isRefreshThread())
             return;
         if (m_bDataFetchRunning) {
             scan_is_to_end = true;
@@ -240,8 +240,9 @@ void ProviderAgent::endThreadsAtExit() noexcept {
         return;
     raise_flag(agent->m_bStopDynamicThread);
     Time::wake();
-    scan_is_to_end = true;
+    agent->m_bProcessEnds = true;
     agent->m_bLibraryLoaded = false;
+    scan_is_to_end = true;
     constexpr uint64 LONGEST_WAIT = 5 * Datetime::SECOND; // for each
     agent->m_DynamicPortThread.join_within(LONGEST_WAIT);
     agent->m_DataFetchThread.join_within(LONGEST_WAIT);

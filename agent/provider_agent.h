@@ -129,6 +129,7 @@ public:
     Mutex m_DataFetchMutex; // guards the refresh decision and the members around it
     // A start that failed leaves it set: the stores stay as they are.
     bool m_bDataFetchRunning = false;
+    std::atomic<bool> m_bProcessEnds = false; // no refresh starts any more
     // How many refreshes were told to end before they were done. Those whom such a refresh would
     // have let through the gates start another.
     std::atomic<uint32> m_CutRefreshes = 0;

@@ -58,7 +58,7 @@ bool ProviderAgent::claimRefresh() {
         VLN_LOG(VLN_DBG, "Diagnostics is running.. Skip the internal refresh till it ends");
         return false;
     }
-    if (m_bDataFetchRunning) {
+    if (m_bDataFetchRunning || m_bProcessEnds) {
         VLN_LOG(VLN_DBG, "DataFetch_Handler thread already running-BuildCimpleInfo");
         return false;
     }
@@ -118,6 +118,10 @@ void ProviderAgent::runAdapterPass() {
     Platform_Objects platform;
     if (m_bLibraryLoaded && !scan_is_to_end)
         guarded("up-calls", [&platform] { platform = find_platform_objects(); });
+    if (scan_is_to_end) {
+        m_bAdapterRefreshRequested = true; // nothing is begun: the stores stay readable
+        return;
+    }
     rebuildAdapterData();
     {
         // New adapter data always make the SAN stores stale.

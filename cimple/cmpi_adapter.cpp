@@ -194,6 +194,7 @@ void count_or_load(Provider_Static_Data* block, const Registration* registration
         factory_cond->wait(*factory_mutex);
     if (block->adapter) {
         block->adapter->load_count++;
+        block->adapter->broker = broker;
         return;
     }
     block->adapter = create_adapter(block, registration, broker, provider_name);
@@ -278,10 +279,13 @@ namespace {
 Answer run_body(CMPI_Adapter& adapter, const CMPIContext* context, const char* function,
                 Locking locking, Answer (*body)(const Call&, void*), void* closure) {
     const Pushed_Context pushed(adapter.broker, context, &adapter);
-    if (locking == Locking::ADAPTER)
+    // A call that an up-call of our own thread leads to does not wait for the clients of its
+    // provider: they may be waiting for that thread.
+    const bool locks = locking == Locking::ADAPTER && !Thread::is_ours();
+    if (locks)
         adapter.lock.lock();
-    const auto unlock = [locking](CMPI_Adapter* held) {
-        if (locking == Locking::ADAPTER)
+    const auto unlock = [locks](CMPI_Adapter* held) {
+        if (locks)
             held->lock.unlock();
     };
     const std::unique_ptr<CMPI_Adapter, decltype(unlock)> locked(&adapter, unlock);

@@ -47,7 +47,9 @@ struct CMPI_Adapter {
     const Registration* registration = nullptr;
     Provider_Proc proc = nullptr;
     void* provider = nullptr;
-    const CMPIBroker* broker = nullptr; // from the first factory call
+    // Of the latest factory call: an object manager that has dropped the module without a cleanup
+    // finds its adapters as they were, and their brokers are gone.
+    std::atomic<const CMPIBroker*> broker{nullptr};
     Provider_Static_Data* static_data = nullptr;
     uint32 load_count = 1;                // factory calls less cleanups
     std::atomic<bool> allow_unload{true}; // written by cimom::allow_unload

@@ -134,6 +134,8 @@ bool Cond::wait_until(Mutex& mutex, uint64 monotonic_usec) {
 
 namespace {
 
+thread_local bool started_here = false;
+
 struct Thread_Start {
     Thread_Proc proc;
     void* argument;
@@ -170,6 +172,7 @@ void* call_guarded(Thread_Proc proc, void* argument) {
 void* _thread_proc(void* start_record) {
     const Thread_Start start = *static_cast<Thread_Start*>(start_record);
     delete static_cast<Thread_Start*>(start_record);
+    started_here = true;
 
     Thread_Context* context = start.context;
     const Context_Holder holder(context);
@@ -233,6 +236,10 @@ void Thread::exit(void* value) {
     if (Thread_Context* context = Thread_Context::top())
         context->thread_exit_hook();
     pthread_exit(value);
+}
+
+bool Thread::is_ours() {
+    return started_here;
 }
 
 Thread Thread::self() {

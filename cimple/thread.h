@@ -110,6 +110,7 @@ public:
     static bool join_within(Thread& thread, uint64 usec);
     [[noreturn]] static void exit(void* value);
     static Thread self();
+    static bool is_ours(); // whether the present thread was started by one of the two above
     friend bool operator==(const Thread& a, const Thread& b) {
         return pthread_equal(a._thread, b._thread) != 0;
     }

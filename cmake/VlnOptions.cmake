@@ -37,7 +37,7 @@ if(VLN_CHECK_LOCKS)
     add_compile_definitions(CIMPLE_CHECK_LOCKS)
 endif()
 if(CMAKE_CXX_COMPILER_ID STREQUAL "GNU")
-    # A unique symbol would keep the module in memory after dlclose.
+    # A unique symbol would be one for all modules of a process.
     add_compile_options($<$<COMPILE_LANGUAGE:CXX>:-fno-gnu-unique>)
 endif()
 

@@ -95,10 +95,8 @@ function(vln_module target directory)
     if(NOT VLN_SANITIZE)
         target_link_options(${target} PRIVATE "LINKER:--no-undefined")
     endif()
-    # The thread sanitizer has no names for a module that was unloaded, and so none to suppress.
-    if(VLN_SANITIZE STREQUAL "thread")
-        target_link_options(${target} PRIVATE "LINKER:-z,nodelete")
-    endif()
+    # An object manager may drop the module while a thread of it, or a caller, is still inside.
+    target_link_options(${target} PRIVATE "LINKER:-z,nodelete")
     target_include_directories(${target} PRIVATE "${VLN_GENERATED_DIR}")
     add_dependencies(${target} vln_generate)
 endfunction()

@@ -1,6 +1,5 @@
 #include "host/core.h"
 
-#include "host/broker.h"
 #include "host/installation.h"
 
 #include <algorithm>
@@ -23,7 +22,6 @@ std::string mof_path(const Options& options) {
 } // namespace
 
 Core::Core(Options given) try : options(std::move(given)), classes(mof_path(options)) {
-    broker = make_broker(*this);
     if (!options.platform_path.empty())
         platform.read(options.platform_path, classes);
     if (!options.registration_path.empty())

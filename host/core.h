@@ -2,6 +2,7 @@
 #ifndef HOST_CORE_H
 #define HOST_CORE_H
 
+#include "host/broker.h"
 #include "host/call.h"
 #include "host/manager.h"
 #include "host/module.h"
@@ -10,6 +11,7 @@
 #include "host/registration.h"
 
 #include <atomic>
+#include <deque>
 #include <memory>
 #include <mutex>
 #include <vector>
@@ -28,7 +30,8 @@ public:
     Platform platform;
     Registration registration;
     Module module;
-    CMPIBroker broker;
+    std::mutex brokers_mutex;
+    std::deque<ProviderBroker> brokers; // of all providers there ever were
     FaultList faults;
     Counters counters;
 

@@ -34,6 +34,8 @@ const char* to_string(FaultKind kind) {
         return "stale array element";
     case FaultKind::unattached_thread:
         return "thread not attached";
+    case FaultKind::dead_broker:
+        return "dead broker";
     case FaultKind::attachment:
         return "attachment of a thread";
     case FaultKind::left_at_detach:

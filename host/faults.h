@@ -29,6 +29,7 @@ enum class FaultKind {
     unattached_thread,  // a call from a thread that was not attached
     attachment,         // attachThread and detachThread that do not match
     left_at_detach,     // objects of a thread that it had not released when it detached
+    dead_broker,        // a call through the broker of a provider that was cleaned up
     recursion,          // an up-call that leads back into the provider that makes it
     leak,               // an object still alive after everything was cleaned up
     interface,          // a factory or function table that is not as the interface demands

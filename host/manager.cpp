@@ -22,6 +22,17 @@ Status Manager::cleanup(bool terminating) {
     return _core->module.cleanup(*_core, terminating);
 }
 
+Status Manager::cleanup(const std::string& class_name, bool terminating) {
+    const Class* known = _core->classes.find(class_name);
+    if (!known)
+        return {CMPI_RC_ERR_INVALID_CLASS, "unknown class " + class_name};
+    return _core->module.cleanup(*_core, terminating, known);
+}
+
+void Manager::abandon() {
+    _core->module.close();
+}
+
 void Manager::close() {
     if (_core->module.is_open()) {
         cleanup(true);

@@ -107,6 +107,10 @@ public:
     // Calls cleanup for every interface that was made. Terminating or not, a provider that agrees
     // is made anew at its next call. Answers the first code that is not OK.
     Status cleanup(bool terminating);
+    // The same for the provider of one class.
+    Status cleanup(const std::string& class_name, bool terminating);
+    // Unloads the module as it stands: what a hasty object manager does.
+    void abandon();
     // Cleans up, unloads the module, records what is still alive as leaks and frees it.
     void close();
 

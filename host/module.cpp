@@ -71,10 +71,19 @@ bool is_usable(Core& core, const Class& known, const MI* made) {
 
 } // namespace
 
+static ProviderBroker& new_broker(Core& core, const Class& known) {
+    const std::lock_guard lock(core.brokers_mutex);
+    return core.brokers.emplace_back(core, known.name);
+}
+
 template <class MI>
 MI* Module::interface(Core& core, const Class& known, MI* Provider::*member, const char* kind,
                       Status& status) {
     Provider& mine = provider(known);
+    if (mine.is_leaving) {
+        status = {CMPI_RC_ERR_FAILED, "the provider of " + known.name + " is being unloaded"};
+        return nullptr;
+    }
     const std::lock_guard lock(mine.mutex);
     if (mine.*member)
         return mine.*member;
@@ -86,7 +95,9 @@ MI* Module::interface(Core& core, const Class& known, MI* Provider::*member, con
     }
     Request request(core, known, "factory", core.options.name_space);
     CMPIStatus cmpi_status = {CMPI_RC_OK, nullptr};
-    MI* made = factory(&core.broker, request.context(), &cmpi_status);
+    if (!mine.broker)
+        mine.broker = &new_broker(core, known);
+    MI* made = factory(&mine.broker->cmpi, request.context(), &cmpi_status);
     status = request.finish(cmpi_status);
     if (status.ok() && (!made || !is_usable(core, known, made)))
         status = {CMPI_RC_ERR_FAILED, "the factory of " + known.name + " made no interface"};
@@ -122,20 +133,27 @@ void Module::cleanup_one(Core& core, const Class& known, Provider& mine, MI* Pro
         first = status;
 }
 
-Status Module::cleanup(Core& core, bool terminating) {
+Status Module::cleanup(Core& core, bool terminating, const Class* only) {
     Status first;
     std::vector<std::pair<const Class*, Provider*>> all;
     {
         const std::lock_guard lock(_mutex);
         for (const auto& known : core.classes.classes())
-            if (const auto found = _providers.find(known.get()); found != _providers.end())
+            if (const auto found = _providers.find(known.get());
+                found != _providers.end() && (!only || only == known.get()))
                 all.emplace_back(known.get(), found->second.get());
     }
     for (const auto& [known, mine] : all) {
+        mine->is_leaving = true;
         const std::lock_guard lock(mine->mutex);
         cleanup_one(core, *known, *mine, &Provider::instance, terminating, first);
         cleanup_one(core, *known, *mine, &Provider::association, terminating, first);
         cleanup_one(core, *known, *mine, &Provider::method, terminating, first);
+        if (mine->broker && !mine->instance && !mine->association && !mine->method) {
+            mine->broker->is_dead = true;
+            mine->broker = nullptr;
+        }
+        mine->is_leaving = false;
     }
     return first;
 }

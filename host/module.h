@@ -7,6 +7,7 @@
 
 #include "host/class_repository.h"
 
+#include <atomic>
 #include <map>
 #include <memory>
 #include <mutex>
@@ -17,6 +18,7 @@
 namespace host {
 
 class Core;
+struct ProviderBroker;
 
 // The interfaces of one class; each is null until its factory was called, and when there is none.
 struct Provider {
@@ -24,6 +26,10 @@ struct Provider {
     CMPIInstanceMI* instance = nullptr;
     CMPIAssociationMI* association = nullptr;
     CMPIMethodMI* method = nullptr;
+    ProviderBroker* broker = nullptr; // for as long as any of these is there
+    // While a cleanup runs, requests are refused: one that comes of an up-call would wait for a
+    // cleanup that waits for the up-call.
+    std::atomic<bool> is_leaving{false};
 };
 
 class Module {
@@ -36,7 +42,7 @@ public:
     // Says what is wrong, or nothing.
     std::string open(const std::string& path, const ClassRepository& classes);
     bool is_open() const { return _library != nullptr; }
-    // Clean up first.
+    // Clean up first: what is left makes calls that nobody answers any more.
     void close();
 
     // Whether the module exports a factory for the class.
@@ -48,9 +54,9 @@ public:
     CMPIAssociationMI* association(Core& core, const Class& known, Status& status);
     CMPIMethodMI* method(Core& core, const Class& known, Status& status);
 
-    // Calls cleanup of every interface; those that agree are forgotten. The first code that is not
-    // OK.
-    Status cleanup(Core& core, bool terminating);
+    // Calls cleanup of every interface, of one class or of all if null; those that agree are
+    // forgotten. The first code that is not OK.
+    Status cleanup(Core& core, bool terminating, const Class* only = nullptr);
 
 private:
     void* symbol(const Class& known, const char* kind) const;

@@ -4,6 +4,8 @@
 #include "tests/road/road.h"
 
 #include <dlfcn.h>
+#include <pthread.h>
+#include <thread>
 
 using road::Road;
 
@@ -14,14 +16,13 @@ const std::string SCENARIO = R"({"include": ")" VLN_SCENARIOS R"(/parts/cna.json
     "cards": [{"use": "cna", "functions": [{"use": "nic"}, {"use": "iscsi"},
         {"use": "fcoe", "targets": {"luns": 2, "wwpn": "50:25:64:C{port}:00:00:00:{target:02X}"}}]}]})";
 
-using Starve = decltype(&starve);
-
-Starve find_hook() {
+template <class Hook>
+Hook* find_hook(const char* name) {
     void* module = dlopen(VLN_MODULE, RTLD_LAZY | RTLD_NOLOAD);
-    void* hook = module ? dlsym(module, "starve") : nullptr;
+    void* hook = module ? dlsym(module, name) : nullptr;
     if (module)
         dlclose(module);
-    return reinterpret_cast<Starve>(hook);
+    return reinterpret_cast<Hook*>(hook);
 }
 
 // A fresh agent, a look at every shape of class and of request, and the end of the agent. Answers
@@ -46,7 +47,7 @@ std::size_t one_life(Road& road) {
 
 TEST(Starvation, AnyOneAllocationMayFail) {
     Road road({.scenario = SCENARIO});
-    const Starve starve_hook = find_hook();
+    auto* const starve_hook = find_hook<decltype(starve)>("starve");
     ASSERT_NE(starve_hook, nullptr);
     one_life(road); // what is made once for the process
     starve_hook(0);
@@ -68,6 +69,57 @@ TEST(Starvation, AnyOneAllocationMayFail) {
         ASSERT_EQ(road.manager().fault_count(), 0u) << host::to_string(road.manager().faults()[0]);
         ASSERT_EQ(one_life(road), healthy) << "the next life is not whole";
     }
+}
+
+// Without memory for the agent a class is loaded without a share in it: its cleanup takes nothing
+// from the class that has found memory since.
+TEST(Starvation, ACleanupUndoesWhatItsLoadTook) {
+    Road road({.scenario = SCENARIO});
+    auto* const starve_hook = find_hook<decltype(starve)>("starve");
+    ASSERT_NE(starve_hook, nullptr);
+    bool agent_failed = false;
+    for (unsigned long number = 1; number <= 20; ++number) {
+        SCOPED_TRACE("allocation " + std::to_string(number));
+        vlnsim_restart();
+        starve_hook(number);
+        road.manager().enumerate("VLNMPCA_Product");
+        starve_hook(0);
+        agent_failed |= vlnsim_calls("AX_InitLib") == 0;
+        const std::size_t cards = road.manager().enumerate("VLNMPCA_Card").value.size();
+        EXPECT_TRUE(road.manager().cleanup("VLNMPCA_Product", true).ok());
+        const unsigned long agents = vlnsim_calls("AX_InitLib");
+        EXPECT_EQ(road.manager().enumerate("VLNMPCA_Card").value.size(), cards);
+        EXPECT_EQ(vlnsim_calls("AX_InitLib"), agents);
+        EXPECT_TRUE(road.manager().cleanup(true).ok());
+    }
+    EXPECT_TRUE(agent_failed);
+}
+
+// The refresh cannot be started: its client waits, everybody else's process goes on, and the next
+// agent is whole. The status thread is tried again at the next look.
+TEST(Starvation, AThreadThatCannotBeStarted) {
+    Road road({.scenario = SCENARIO, .log = true});
+    auto* const refuse = find_hook<decltype(refuse_threads)>("refuse_threads");
+    ASSERT_NE(refuse, nullptr);
+    refuse(true);
+    std::thread client([&] { road.manager().enumerate("VLNMPCA_Product"); });
+    while (road.count_in_log("DataFetch_Handler thread could not be started") == 0)
+        std::this_thread::yield();
+    pthread_cancel(client.native_handle());
+    client.join();
+    EXPECT_TRUE(road.manager().cleanup(true).ok());
+
+    refuse(false);
+    EXPECT_EQ(road.enumerate("VLNMPCA_Product").size(), 1u);
+    refuse(true);
+    EXPECT_EQ(road.enumerate("VLNMPCA_EthernetPort").size(), 2u);
+    EXPECT_EQ(road.count_in_log("PERF: Thread DynamicDataFetch_Handler Creation failed"), 1u);
+    EXPECT_EQ(vlnsim_paused(), 0u);
+    refuse(false);
+    vlnsim_advance(11ull * 1000000);
+    EXPECT_EQ(road.enumerate("VLNMPCA_EthernetPort").size(), 2u);
+    while (vlnsim_paused() == 0)
+        std::this_thread::yield();
 }
 
 } // namespace

@@ -4,13 +4,16 @@
 #include "tests/hostile/starving.h"
 
 #include <atomic>
+#include <cerrno>
 #include <cstddef>
 #include <new>
+#include <pthread.h>
 
 namespace {
 
 std::atomic<unsigned long> made{0};
 std::atomic<unsigned long> refused{0};
+std::atomic<bool> threads_refused{false};
 
 bool may_allocate() {
     return ++made != refused;
@@ -23,6 +26,10 @@ unsigned long starve(unsigned long number) {
     return made.exchange(0);
 }
 
+void refuse_threads(bool are_refused) {
+    threads_refused = are_refused;
+}
+
 // operator new and its array form, by the letter that size_t has in their names.
 #if __SIZEOF_SIZE_T__ == 8
 #define NEW(prefix) prefix##_Znwm
@@ -33,6 +40,13 @@ unsigned long starve(unsigned long number) {
 #endif
 
 extern "C" {
+
+int __real_pthread_create(pthread_t* thread, const pthread_attr_t* attributes, void* (*proc)(void*),
+                          void* argument);
+int __wrap_pthread_create(pthread_t* thread, const pthread_attr_t* attributes, void* (*proc)(void*),
+                          void* argument) {
+    return threads_refused ? EAGAIN : __real_pthread_create(thread, attributes, proc, argument);
+}
 
 void* __real_malloc(std::size_t size);
 void* __real_calloc(std::size_t count, std::size_t size);

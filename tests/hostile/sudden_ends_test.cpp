@@ -2,8 +2,12 @@
 // puts the provider there.
 #include "tests/hostile/sudden_ends.h"
 
+#include <atomic>
+#include <fcntl.h>
 #include <pthread.h>
-#include <thread>
+#include <semaphore.h>
+#include <sys/wait.h>
+#include <unistd.h>
 
 namespace {
 
@@ -24,9 +28,10 @@ TEST(SuddenEnds, ACancelledClientHoldsUpNobody) {
     };
     for (const auto& row : rows) {
         SCOPED_TRACE(row.where);
-        Held_Road road(row.held);
+        Held_Road road;
+        hold(row.held);
         std::thread first([&] { road->manager().enumerate("VLNMPCA_Card"); });
-        road.wait_until_held();
+        wait_until_held();
         std::thread client([&] { road->manager().enumerate(row.class_name); });
         rest();
         pthread_cancel(client.native_handle());
@@ -36,6 +41,168 @@ TEST(SuddenEnds, ACancelledClientHoldsUpNobody) {
         first.join();
         EXPECT_GT(road->enumerate(row.class_name).size(), 0u);
     }
+}
+
+// ---- Classes ----
+
+const std::string ENDED_EARLY = "PERF: Clearing the previous thread...with join";
+
+// The refresh has the broker of the class whose call started it, and ends before that goes. A
+// client of another class gets the whole of what it waits for all the same.
+TEST(SuddenEnds, AClassTakesItsRefreshAlongAndNobodyElses) {
+    Held_Road road(true);
+    road->enumerate("VLNMPCA_Product");
+    road.stand_in_san_pass("VLNMPCA_Card");
+    // Not the refresh's class: goes at once, while the pass stands.
+    EXPECT_TRUE(road->manager().cleanup("VLNMPCA_Product", true).ok());
+    std::thread client([&] { EXPECT_EQ(road->enumerate("VLNMPCA_StorageVolume").size(), UNITS); });
+    rest();
+    std::thread letting_go = road.let_go_after(ENDED_EARLY);
+    EXPECT_TRUE(road->manager().cleanup("VLNMPCA_Card", true).ok());
+    client.join();
+    letting_go.join();
+    EXPECT_EQ(road->enumerate("VLNMPCA_Card").size(), 1u);
+    EXPECT_EQ(vlnsim_calls("AX_InitLib"), 1u);
+}
+
+TEST(SuddenEnds, TheStatusThreadGoesWithThePortsAndComesBackWithThem) {
+    road::Road road({.scenario = SCENARIO});
+    road.enumerate("VLNMPCA_Card");
+    for (int life = 0; life < 3; ++life) {
+        road.enumerate("VLNMPCA_EthernetPort");
+        while (vlnsim_paused() == 0)
+            std::this_thread::yield();
+        EXPECT_TRUE(road.manager().cleanup("VLNMPCA_EthernetPort", true).ok());
+        EXPECT_EQ(vlnsim_paused(), 0u);
+        vlnsim_advance(STALE);
+    }
+    EXPECT_EQ(road.enumerate("VLNMPCA_Card").size(), 1u);
+}
+
+// Eight clients of the SAN, before and during a pass and twice after it.
+TEST(SuddenEnds, ABusyConsoleSettlesAfterOnePass) {
+    Held_Road road(true);
+    hold("HBA_SendReadCapacity");
+    std::vector<std::thread> clients;
+    for (int client = 0; client < 8; ++client)
+        clients.emplace_back([&road, client] {
+            if (client >= 4)
+                wait_until_held();
+            for (int look = 0; look < 3; ++look)
+                EXPECT_EQ(road->enumerate("VLNMPCA_StorageVolume").size(), UNITS);
+        });
+    wait_until_held();
+    rest();
+    vlnsim_clear_faults();
+    for (std::thread& client : clients)
+        client.join();
+    road->close();
+    EXPECT_EQ(road->count_in_log("PERF: Building SAN Data..."), 1u);
+}
+
+// ---- Up-calls ----
+
+constexpr const char* PLATFORM = R"([
+  {"namespace": "root/ibmse", "class": "IBMSD_ComputerSystem",
+   "properties": {"CreationClassName": "IBMSD_ComputerSystem", "Name": "rack7-node3"}}])";
+
+// A provider of the platform that asks for our classes before it answers: on the same thread, and,
+// once there is something to see, through another one.
+TEST(SuddenEnds, APlatformProviderMayAskUsOnItsWay) {
+    host::Manager* manager = nullptr;
+    int asked = 0;
+    const auto ask = [&](const std::string& line) {
+        if (line.find("up-call enumerateInstances root/ibmse:IBMSD_ComputerSystem") != 0)
+            return;
+        const std::size_t present = asked++ == 0 ? 0 : 1;
+        for (const char* name : {"VLNMPCA_Product", "VLNMPCA_Card", "VLNMPCA_FCPortStatistics"})
+            EXPECT_EQ(manager->enumerate(name).value.size(), present) << name;
+        manager->enumerate("VLNMPCA_StorageVolume");
+        if (!present)
+            return;
+        std::thread other(
+            [&] { EXPECT_EQ(manager->enumerate("VLNMPCA_Product").value.size(), present); });
+        other.join();
+    };
+    road::Road road({.scenario = SCENARIO, .platform = PLATFORM, .log = true, .trace = ask});
+    manager = &road.manager();
+    for (std::size_t refresh = 1; refresh <= 2; ++refresh) {
+        EXPECT_EQ(road.enumerate("VLNMPCA_Product").size(), 1u);
+        road.wait_for_refreshes(refresh);
+        vlnsim_advance(STALE);
+    }
+    EXPECT_EQ(asked, 2);
+}
+
+// ---- Processes ----
+
+// Both semaphores are gone when all that the provider had to do at the end is done.
+void check_names() {
+    for (const char* prefix : {"/VLN_AX_INIT_LIB_", "/VLN_AX_INIT_LIB_DONE_"})
+        if (sem_open((prefix + std::to_string(getpid())).c_str(), 0) != SEM_FAILED)
+            _exit(7);
+}
+
+// A process with both threads alive: the refresh stands in a call, the status thread rests.
+Held_Road& busy_process() {
+    std::atexit(check_names); // registered first, so run last
+    static Held_Road* const road = new Held_Road;
+    (*road)->enumerate("VLNMPCA_EthernetPort");
+    road->stand_in_san_pass("VLNMPCA_Card");
+    return *road;
+}
+
+void let_go_soon() {
+    std::thread([] {
+        rest();
+        vlnsim_clear_faults();
+    }).detach();
+}
+
+class Process_Ends : public testing::Test {
+protected:
+    void SetUp() override { GTEST_FLAG_SET(death_test_style, "threadsafe"); }
+};
+
+TEST_F(Process_Ends, WithAPassUnderWay) {
+    const auto end = [] {
+        busy_process();
+        let_go_soon();
+        std::exit(0);
+    };
+    EXPECT_EXIT(end(), testing::ExitedWithCode(0), "");
+}
+
+// A child has the provider's memory and none of its threads: it waits for none, and takes nothing
+// from its parent.
+TEST_F(Process_Ends, AsAForkedChild) {
+    const auto end = [] {
+        Held_Road& road = busy_process();
+        const pid_t child = fork();
+        if (child == 0)
+            std::exit(0);
+        int status = 1;
+        waitpid(child, &status, 0);
+        vlnsim_clear_faults();
+        const bool is_served = road->enumerate("VLNMPCA_Card").size() == 1;
+        std::exit(WIFEXITED(status) && is_served ? WEXITSTATUS(status) : 1);
+    };
+    EXPECT_EXIT(end(), testing::ExitedWithCode(0), "");
+}
+
+// The object manager drops the module without a word, and takes it up again.
+TEST_F(Process_Ends, AfterTheModuleWasDropped) {
+    const auto end = [] {
+        Held_Road& road = busy_process();
+        road->manager().abandon();
+        vlnsim_clear_faults();
+        host::Manager next;
+        const bool is_served = next.load(VLN_MODULE).ok() &&
+                               next.enumerate("VLNMPCA_Card").value.size() == 1 &&
+                               next.fault_count() == 0;
+        std::exit(is_served ? 0 : 1);
+    };
+    EXPECT_EXIT(end(), testing::ExitedWithCode(0), "");
 }
 
 } // namespace

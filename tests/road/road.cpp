@@ -59,6 +59,7 @@ Road::Road(const Setup& setup) : _root(fresh_folder()) {
                                                               << _root.native() << TRACE_FILE;
     host::Options options;
     options.elements_marked_null = setup.elements_marked_null;
+    options.trace = setup.trace;
     if (!setup.platform.empty()) {
         options.platform_path = _root / "platform.json";
         std::ofstream(options.platform_path) << setup.platform;

@@ -12,6 +12,7 @@
 #include <gtest/gtest.h>
 
 #include <filesystem>
+#include <functional>
 #include <map>
 #include <string>
 
@@ -23,6 +24,7 @@ struct Setup {
     bool libraries = true;                      // false: the host has none of the closed libraries
     bool log = false;                           // level 5 to the provider's log file
     bool elements_marked_null = false;          // as host::Options has it
+    std::function<void(const std::string&)> trace = {}; // see host::Options
 };
 
 class Road {

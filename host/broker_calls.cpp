@@ -378,7 +378,6 @@ CMPIContext* prepare_thread(const CMPIBroker* broker, const CMPIContext* context
     copy->attached = false;
     Object* object =
         create_object(*core, Kind::context, &ContextBody::table, std::move(copy), core->contexts);
-    object->parameter = true; // goes with detachThread, not with release
     return reinterpret_cast<CMPIContext*>(object);
 }
 
@@ -397,6 +396,8 @@ CMPIStatus attach_thread(const CMPIBroker* broker, const CMPIContext* context) n
     if (!Call::attach(*core, context))
         return attachment_fault(core, "attachThread on a thread that is known already");
     body->attached = true;
+    // From now on it goes with detachThread, and not with release.
+    reinterpret_cast<Object*>(const_cast<CMPIContext*>(context))->parameter = true;
     return answer(CMPI_RC_OK);
 }
 

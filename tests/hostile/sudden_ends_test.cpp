@@ -86,20 +86,31 @@ TEST(SuddenEnds, TheStatusThreadGoesWithThePortsAndComesBackWithThem) {
     EXPECT_EQ(road.enumerate("VLNMPCA_Card").size(), 1u);
 }
 
-// Eight clients of the SAN, before and during a pass and twice after it.
+// Eight clients of the SAN, each of another class, before and during a pass and twice after it.
 TEST(SuddenEnds, ABusyConsoleSettlesAfterOnePass) {
+    constexpr const char* CLASSES[] = {"VLNMPCA_StorageVolume",
+                                       "VLNMPCA_SCSIProtocolEndpoint",
+                                       "VLNMPCA_LocalHostedAccessPoint",
+                                       "VLNMPCA_StorageVolumeSystemDevice",
+                                       "VLNMPCA_SCSIInitiatorTargetStorageVolumePath",
+                                       "VLNMPCA_TapeDrive",
+                                       "VLNMPCA_LogicalDisk",
+                                       "VLNMPCA_StorageExtent"};
     Held_Road road(true);
     hold("HBA_SendReadCapacity");
     std::vector<std::thread> clients;
-    for (int client = 0; client < 8; ++client)
-        clients.emplace_back([&road, client] {
-            if (client >= 4)
+    for (std::size_t client = 0; client < std::size(CLASSES); ++client)
+        clients.emplace_back([&, client] {
+            if (client >= 2)
                 wait_until_held();
-            for (int look = 0; look < 3; ++look)
-                EXPECT_EQ(road->enumerate("VLNMPCA_StorageVolume").size(), UNITS);
+            const std::size_t first = road->enumerate(CLASSES[client]).size();
+            EXPECT_EQ(first > 0, client < 5) << CLASSES[client];
+            for (int look = 0; look < 2; ++look)
+                EXPECT_EQ(road->enumerate(CLASSES[client]).size(), first);
         });
     wait_until_held();
-    rest();
+    while (road->count_in_log(" Entering BuildCimpleInfo()") < std::size(CLASSES))
+        std::this_thread::yield();
     vlnsim_clear_faults();
     for (std::thread& client : clients)
         client.join();

@@ -1,6 +1,5 @@
 #include "classes/VLNMPCA_Card.h"
 #include "classes/VLNMPCA_Product.h"
-#include "classes/VLNMPCA_RecordLog.h"
 #include "classes/VLNMPCA_StorageVolume.h"
 #include "derivedObjects/pattern.h"
 #include "tests/agent/agent_fixture.h"
@@ -72,17 +71,6 @@ TEST_F(Pattern_Test, DeliversClonesInOrder) {
     EXPECT_EQ(taken.names.size(), 1u) << "the handler has asked to stop";
 }
 
-// Can only come of a fault: a member's key that was changed after its insertion.
-TEST_F(Pattern_Test, EqualKeysMakeTheResultEmpty) {
-    put_product("a");
-    put_product("b")->Name.set("a");
-    put_product("c");
-    Log_Capture log;
-    EXPECT_EQ(count_instances(VLNMPCA_Product::static_meta_class), 0);
-    EXPECT_EQ(log.count(VLN_CRIT, "Insert failed for 1"), 1);
-    EXPECT_EQ(log.count(VLN_DBG, "VLNMPCA_Product_Provider::enum_instances()"), 1);
-}
-
 TEST_F(Pattern_Test, ExceptionsEndInTheGuardOfTheShape) {
     put_product("a");
     agent->m_VLNMPCA_StorageVolume_map.insert(create<VLNMPCA_StorageVolume>());
@@ -102,20 +90,6 @@ TEST_F(Pattern_Test, ExceptionsEndInTheGuardOfTheShape) {
         EXPECT_EQ(log.count(VLN_CRIT, row.line), 1);
         EXPECT_EQ(count_instances(*pattern_table[row.id].meta_class), 1) << "a lock is still held";
     }
-}
-
-TEST_F(Pattern_Test, RecordLogsComeFromThreeStores) {
-    const char* const ids[] = {"provider", "driver", "iscsi"};
-    Instance_Map<VLNMPCA_RecordLog>* const stores[] = {&agent->m_VLNMPCA_RecordLog_map,
-                                                       &agent->m_VLNMPCA_DriverRecordLog_map,
-                                                       &agent->m_VLNMPCA_ISCSIRecordLog_map};
-    for (int i = 0; i < 3; ++i) {
-        auto* log = create<VLNMPCA_RecordLog>();
-        log->InstanceID.set(ids[i]);
-        stores[i]->clear();
-        stores[i]->insert(log);
-    }
-    EXPECT_EQ(count_instances(VLNMPCA_RecordLog::static_meta_class), 3);
 }
 
 } // namespace cimple

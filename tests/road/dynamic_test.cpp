@@ -103,6 +103,50 @@ TEST(Dynamic, APortWithoutAPhysicalStateIsNoPortWithoutALink) {
     expect_first_port(road, "{2}", "{OK}", "10000000000", "10 Gbps");
 }
 
+// One of the states alone is no reading; a library without the short call is asked for everything.
+TEST(Dynamic, AFailedReadingLeavesThePort) {
+    Road road({.log = true});
+    const auto polled = [&road](const char* status, const char* description, const char* speed,
+                                const char* speed_text) {
+        poll();
+        expect_first_port(road, status, description, speed, speed_text);
+        vlnsim_clear_faults();
+    };
+    expect_first_port(road, "{2}", "{OK}", "10000000000", "10 Gbps");
+    set("portAttributes", "FunctionalPortState", "6");
+    set("portAttributes", "PhysicalPortState", "6");
+    vlnsim_fault("AX_GetPortState", VLNSIM_EVERY, VLNSIM_STATUS, 190);
+    vlnsim_fault("AX_GetPortAttributes", VLNSIM_EVERY, VLNSIM_STATUS, 190);
+    polled("{2}", "{OK}", "10000000000", "10 Gbps");
+    vlnsim_fault("AX_GetAttributeValue", VLNSIM_EVERY, VLNSIM_MISSING, 802);
+    polled("{2}", "{OK}", "10000000000", "10 Gbps");
+    vlnsim_fault("AX_GetPortState", VLNSIM_EVERY, VLNSIM_STATUS, 1);
+    polled("{3}", "{Link Down}", "0", "Not Available");
+    road.close();
+    EXPECT_EQ(road.count_in_log("Error occurred while retrieving NicPort status..."), 2 * PORTS);
+}
+
+// Rows stay with the names of the ports at the start of the thread.
+TEST(Dynamic, PortsMayComeAndGo) {
+    Road road({.log = true});
+    const auto refresh = [&road](std::size_t number) {
+        vlnsim_advance(600 * SECOND);
+        road.enumerate("VLNMPCA_Card");
+        road.wait_for_refreshes(number);
+    };
+    expect_first_port(road, "{2}", "{OK}", "10000000000", "10 Gbps");
+    road.wait_for_refreshes(1);
+    vlnsim_fault("AX_GetAllLocalHBAInstances", VLNSIM_EVERY, VLNSIM_STATUS, 1);
+    refresh(2);
+    EXPECT_TRUE(road.enumerate("VLNMPCA_EthernetPort").empty());
+    vlnsim_clear_faults();
+    set("portAttributes", "FunctionalPortState", "6");
+    set("portAttributes", "PhysicalPortState", "6");
+    refresh(3);
+    poll();
+    expect_first_port(road, "{3}", "{Link Down}", "0", "Not Available");
+}
+
 // Cards that a refresh made anew while the last reading is recent.
 TEST(Dynamic, ANewCardHasItsTemperature) {
     Road road({.log = true});
@@ -130,6 +174,11 @@ TEST(Dynamic, TheTemperatureIsReadAtMostEveryTenSeconds) {
     vlnsim_advance(1);
     EXPECT_EQ(text_of(road.enumerate("VLNMPCA_Card").at(0), "BoardTemperature"), "61");
     EXPECT_EQ(vlnsim_calls("AX_GetHBAAttributes"), calls + 1);
+    set("adapterAttributes", "BoardTemperature", "62");
+    vlnsim_fault("AX_GetHBAAttributes", VLNSIM_EVERY, VLNSIM_STATUS, 190);
+    vlnsim_advance(10 * SECOND);
+    EXPECT_EQ(text_of(road.enumerate("VLNMPCA_Card").at(0), "BoardTemperature"), "61");
+    EXPECT_EQ(vlnsim_calls("AX_GetHBAAttributes"), calls + 2);
 }
 
 TEST(Dynamic, TheReasonOfALinkDownIsReadAtMostEveryFiveSeconds) {
@@ -142,6 +191,10 @@ TEST(Dynamic, TheReasonOfALinkDownIsReadAtMostEveryFiveSeconds) {
     vlnsim_advance(5 * SECOND - 1);
     EXPECT_EQ(reason(), "0");
     vlnsim_advance(1);
+    EXPECT_EQ(reason(), "3");
+    set("portAttributes", "PhyLinkDownReason", "7");
+    vlnsim_fault("AX_GetPortAttributes", VLNSIM_EVERY, VLNSIM_STATUS, 190);
+    vlnsim_advance(5 * SECOND);
     EXPECT_EQ(reason(), "3");
 }
 
@@ -163,6 +216,16 @@ TEST(Dynamic, UnloadWakesTheSleepingThread) {
     }
     road.close();
     EXPECT_EQ(road.count_in_log("PERF: DynamicDataFetch_Handler Thread END"), 2u);
+}
+
+// The unload waits for no further port.
+TEST(Dynamic, UnloadDuringAPoll) {
+    Road road;
+    EXPECT_EQ(road.enumerate("VLNMPCA_EthernetPort").size(), PORTS);
+    for (int i = 0; i < 20; ++i)
+        advance(6 * SECOND);
+    EXPECT_TRUE(road.manager().cleanup(true).ok());
+    EXPECT_EQ(vlnsim_calls("AX_GetPortState"), 1u);
 }
 
 // Clients and refreshes go on while polls run, each library call taking its time.

@@ -1,6 +1,7 @@
 // What a client sees of FCoE ports: the ports, what they stand beside, and what changes on them.
 #include "tests/road/properties.h"
 
+#include <array>
 #include <fstream>
 
 using road::end_of;
@@ -294,6 +295,94 @@ TEST(FCoE, ThePortsStatusIsReadAtMostEveryTenSeconds) {
                                {"FunctionalPortSpeed", "4 Gbps"}});
     expect_properties(find(road, "VLNMPCA_FCPort", "DeviceID", "100002564C000004"),
                       {{"OperationalStatus", "{2}"}, {"Speed", "10000000000"}});
+}
+
+// A value that can't be read ends its port: what comes after it stays as it was.
+TEST(FCoE, AFailedReadingEndsThePort) {
+    const struct {
+        std::uint64_t missing;
+        const char* line;
+        std::array<const char*, 4> shown; // status, detail, type and speed
+    } rows[] = {
+        {802, "AX_GetttributeValue for PortState", {"{2}", "2", "10", "10000000000"}},
+        {774, "AX_GetttributeValue for PortState", {"{32790}", "2", "10", "10000000000"}},
+        {773, "AX_GetttributeValue for PortType", {"{32790}", "6", "10", "10000000000"}},
+        {779, "AX_GetttributeValue for PortSpeed", {"{32790}", "6", "1", "10000000000"}},
+        {842, "AX_GetttributeValue for PhysicalPortSpeed", {"{32790}", "6", "1", "4000000000"}},
+    };
+    for (const auto& row : rows) {
+        SCOPED_TRACE(row.missing);
+        Road road({.log = true});
+        find(road, "VLNMPCA_FCPort", "DeviceID", PORT);
+        set_value(PORT, "portAttributes", "PhysicalPortState", "22");
+        set_value(PORT, "portAttributes", "FunctionalPortState", "6");
+        set_value(PORT, "portAttributes", "PortType", "21");
+        set_value(PORT, "portAttributes", "PortSpeed", "8");
+        set_value(PORT, "portAttributes", "PhysicalPortSpeed", "8");
+        vlnsim_fault("AX_GetAttributeValue", VLNSIM_EVERY, VLNSIM_MISSING, row.missing);
+        vlnsim_advance(10 * SECOND);
+        expect_properties(find(road, "VLNMPCA_FCPort", "DeviceID", PORT),
+                          {{"OperationalStatus", row.shown[0]},
+                           {"DetailedStatus", row.shown[1]},
+                           {"PortType", row.shown[2]},
+                           {"Speed", row.shown[3]},
+                           {"PhysicalPortSpeed", "10000000000"}});
+        road.close();
+        EXPECT_EQ(road.count_in_log(row.line + std::string(" call failed (251)")), 2u);
+    }
+}
+
+TEST(FCoE, EveryCounterHasItsProperty) {
+    const std::pair<const char*, const char*> plain[] = {
+        {"1025", "PacketsTransmitted"},
+        {"1032", "PacketsReceived"},
+        {"1033", "LIPCount"},
+        {"1036", "NOSCount"},
+        {"1037", "ErrorFrames"},
+        {"1038", "DumpedFrames"},
+        {"1039", "LinkFailures"},
+        {"1041", "LossOfSignalCounter"},
+        {"1040", "LossOfSyncCounter"},
+        {"1042", "PrimitiveSeqProtocolErrCount"},
+        {"1044", "CRCErrors"},
+        {"1043", "InvalidTransmissionWords"},
+        {"1045", "TxSequences"},
+        {"1028", "RxSequences"},
+        {"1029", "ExCountOrig"},
+        {"1026", "ExCountResp"},
+        {"1027", "ActiveXRIs"},
+        {"1048", "ActiveRPIs"},
+        {"1047", "ElasticBufOverruns"},
+        {"1058", "LinkTransitions"},
+        {"1046", "PrimitiveSeqTimesouts"},
+        {"1057", "ArbitrationTimeouts"},
+    };
+    Road road;
+    const auto statistics = [&road] {
+        vlnsim_advance(10 * SECOND);
+        return find(road, "VLNMPCA_FCPortStatistics", "InstanceID",
+                    std::string("VLNMPCA :FC Statistics:") + PORT);
+    };
+    EXPECT_EQ(text_of(statistics(), "LIPCount"), "4294967295") << "one that is not reported";
+    for (const auto& [identifier, property] : plain)
+        set_value(PORT, "statistics", identifier, identifier);
+    set_value(PORT, "statistics", "1030", "1073741824");
+    set_value(PORT, "statistics", "1031", "9000000000");
+    const host::Instance read = statistics();
+    for (const auto& [identifier, property] : plain)
+        EXPECT_EQ(text_of(read, property), identifier) << property;
+    expect_properties(read, {{"BytesTransmitted", "4294967296"}, {"BytesReceived", "36000000000"}});
+
+    // Two counters are copied only when the library reports them.
+    set_value(PORT, "statistics", "1038", "4294967295");
+    set_value(PORT, "statistics", "1033", "6");
+    expect_properties(statistics(), {{"DumpedFrames", "1038"}, {"LIPCount", "6"}});
+    const std::string time = text_of(statistics(), "StatisticTime");
+    set_value(PORT, "statistics", "1033", "7");
+    vlnsim_fault("AX_GetPortStatistics", VLNSIM_EVERY, VLNSIM_STATUS, 190);
+    expect_properties(statistics(), {{"LIPCount", "6"}, {"StatisticTime", time.c_str()}});
+    vlnsim_clear_faults();
+    EXPECT_NE(text_of(statistics(), "StatisticTime"), time);
 }
 
 } // namespace

@@ -16,6 +16,157 @@ std::string card(const std::string& functions, const std::string& more = "") {
            more + R"("functions": [)" + functions + "]}]}";
 }
 
+// Each object of the first port, also what tells its states by codes of the library.
+TEST(Hardware, TheCardAndItsPorts) {
+    Road road({.scenario = card(R"({"use": "nic"})", R"("subAdapter": 3, )")});
+    constexpr const char* MODEL = "Vorlan VMC-2210 10Gb 2-port PCIe Converged Network Adapter";
+    const auto expect_first = [&road](const char* name,
+                                      std::initializer_list<road::Property_Text> rows) {
+        SCOPED_TRACE(name);
+        expect_properties(road.enumerate(name).at(0), rows);
+    };
+    expect_first("VLNMPCA_Card", {{"Description", MODEL},
+                                  {"ElementName", "VLN MPCA:VMC-2210:VR10420117"},
+                                  {"Name", "Vorlan Ethernet Adapter VR10420117"},
+                                  {"Tag", "0f4a2c117d3e4b529a0102564c000001"},
+                                  {"CreationClassName", "VLNMPCA_Card"},
+                                  {"Manufacturer", "Vorlan"},
+                                  {"Model", "VMC-2210"},
+                                  {"SerialNumber", "VR10420117"},
+                                  {"SKU", "00VM221"},
+                                  {"Version", "7"},
+                                  {"PartNumber", "VMC-2210"},
+                                  {"PackageType", "9"},
+                                  {"HostingBoard", "FALSE"},
+                                  {"VendorSpecID", "1453984283"},
+                                  {"DeviceID", "8720"},
+                                  {"ModelID", "2587"},
+                                  {"BoardTemperature", "52"},
+                                  {"VLNSerialNumber", "VR10420117"}});
+    expect_first("VLNMPCA_FRUVitalProductData",
+                 {{"InstanceID", "VR10420117"},
+                  {"ElementName", "VLN MPCA FRU:VR10420117"},
+                  {"ProductName", "Vorlan VMC-2210 Converged Network Adapter"},
+                  {"SerialNumber", "VR10420117"},
+                  {"PartNumber", "VMC-2210"},
+                  {"Manufacturer", "Vorlan"},
+                  {"Date", "1214"},
+                  {"UUID", "0f4a2c117d3e4b529a0102564c000001"},
+                  {"FRUNumber", "00VM221"},
+                  {"FRUFirmwareDetail", "{V:10.2.261.13,D:03152014}"},
+                  {"CardFunction", "64"},
+                  {"RevisionID", "3"}});
+    expect_first("VLNMPCA_Product", {{"Description", MODEL},
+                                     {"Name", "VMC-2210"},
+                                     {"IdentifyingNumber", "VR10420117"},
+                                     {"Vendor", "Vorlan Corporation"},
+                                     {"Version", "7"}});
+    expect_first("VLNMPCA_PhysicalConnector",
+                 {{"InstanceID", "VR10420117:0"},
+                  {"ElementName", "VLN MPCA Port:VR10420117:Network Connector:0"},
+                  {"Name", "100002564C000000"},
+                  {"Tag", "100002564C000000"},
+                  {"Model", "VMC-2210"},
+                  {"SerialNumber", "VR10420117"},
+                  {"OtherIdentifyingInfo", "LocalPhysicalPort:0,Transceiver:SFP"},
+                  {"ConnectorLayout", "12"}});
+    expect_first("VLNMPCA_LANEndpoint", {{"ElementName", "100002564C000000"},
+                                         {"Name", "100002564C000000"},
+                                         {"EnabledState", "2"},
+                                         {"RequestedState", "12"},
+                                         {"CreationClassName", "VLNMPCA_LANEndpoint"},
+                                         {"NameFormat", "Ethernet"},
+                                         {"ProtocolIFType", "6"},
+                                         {"MACAddress", "02:56:4c:00:00:00"}});
+    expect_first("VLNMPCA_EnabledLogicalElementCapabilities",
+                 {{"InstanceID", "Capabilities:100002564C000000"},
+                  {"ElementNameEditSupported", "FALSE"},
+                  {"RequestedStatesSupported", "{2}"}});
+    expect_first("VLNMPCA_PortController",
+                 {{"ElementName", "VMC-2210:VR10420117:0"},
+                  {"Name", "VMC-2210:VR10420117:0"},
+                  {"DeviceID", "VR10420117:0"},
+                  {"OperationalStatus", "{2}"},
+                  {"StatusDescriptions", "{OK}"},
+                  {"EnabledState", "5"},
+                  {"RequestedState", "5"},
+                  {"EnabledDefault", "2"},
+                  {"Availability", "3"},
+                  {"ProtocolSupported", "1"},
+                  {"MaxNumberControlled", "1"},
+                  {"ProtocolDescription", "Multiple Protocols FCoE+NIC,iSCSI+NIC,NIC"},
+                  {"ControllerType", "2"},
+                  {"SubAdapterId", "03"},
+                  {"InterfaceType", "2"},
+                  {"AutoNegSupportedSpeeds", ""},
+                  {"ForceSupportedSpeeds", "1Gb,10Gb"},
+                  {"PortSpeedMode", "2"},
+                  {"ConfiguredPortSpeed", "10Gb"},
+                  {"DACCableLength", "3"},
+                  {"PhyLinkDownReason", "0"}});
+}
+
+TEST(Hardware, StatesFollowTheLibrary) {
+    const struct {
+        const char* state;
+        const char* port_status;
+        const char* port_enabled;
+        const char* controller_status;
+        const char* access;
+    } rows[] = {
+        {"0", "{0}", "1", "{0}", "2"},      {"1", "{0}", "0", "{0}", "1"},
+        {"2", "{2}", "2", "{2}", "1"},      {"3", "{10}", "3", "{10}", "2"},
+        {"4", "{1}", "1", "{1}", "2"},      {"5", "{11}", "7", "{11}", "2"},
+        {"6", "{3}", "3", "{1}", "2"},      {"7", "{6}", "1", "{6}", "2"},
+        {"8", "{32776}", "1", "{11}", "2"}, {"20", "{32788}", "1", "{0}", "2"},
+        {"21", "{32789}", "3", "{0}", "2"}, {"22", "{32790}", "3", "{0}", "2"},
+    };
+    for (const auto& row : rows) {
+        SCOPED_TRACE(row.state);
+        Road road({.scenario = card(R"({"use": "nic"})")});
+        road::set_value("100002564C000000", "portAttributes", "FunctionalPortState", row.state);
+        const auto first = [&road](const char* name, const char* property) {
+            return text_of(road.enumerate(name).at(0), property);
+        };
+        EXPECT_EQ(first("VLNMPCA_EthernetPort", "OperationalStatus"), row.port_status);
+        EXPECT_EQ(first("VLNMPCA_EthernetPort", "EnabledState"), row.port_enabled);
+        EXPECT_EQ(first("VLNMPCA_LANEndpoint", "EnabledState"), row.port_enabled);
+        EXPECT_EQ(first("VLNMPCA_PortController", "OperationalStatus"), row.controller_status);
+        EXPECT_EQ(first("VLNMPCA_ControlledBy", "AccessState"), row.access);
+    }
+}
+
+TEST(Hardware, NamesOfACardFollowWhatItsDataHold) {
+    const struct {
+        const char* vpd;
+        const char* name;
+    } rows[] = {
+        {R"("MN": "Maker", "SN": "S1", "CF": 80)", "Maker Fibre Channel Adapter S1"},
+        {R"("MN": "Maker", "SN": null, "CF": 96)", "Maker iSCSI Onboard Adapter 0"},
+        {R"("MN": "Maker", "SN": "S1", "CF": 7)", "VMC-2210"},
+        {R"("SN": "S1", "MN": null, "CF": 80)", "VMC-2210"},
+    };
+    for (const auto& row : rows) {
+        Road road({.scenario = card(R"({"use": "nic", "vpd": {"UU": null, "FN": null, )" +
+                                    std::string(row.vpd) + "}}")});
+        expect_properties(road.enumerate("VLNMPCA_Card").at(0),
+                          {{"Name", row.name}, {"Tag", "VR10420117"}, {"SKU", "-"}});
+    }
+}
+
+// One UUID burnt into two cards must not cost the second card its place.
+TEST(Hardware, CardsOfOneUuidStayApart) {
+    Road road(
+        {.scenario =
+             card(R"({"use": "nic", "vpd": {"UU": {"bytes": "00000000000000000000000000000000"}}})",
+                  R"("count": 2, )")});
+    const auto cards = road.enumerate("VLNMPCA_Card");
+    ASSERT_EQ(cards.size(), 2u);
+    EXPECT_EQ(text_of(cards[0], "Tag"), "00000000000000000000000000000000");
+    expect_properties(cards[1], {{"Tag", "VR10420118"}, {"SKU", "00VM222"}});
+    EXPECT_EQ(road.enumerate("VLNMPCA_FRUElementVPD").size(), 2u);
+}
+
 TEST(Hardware, TheChipOfACard) {
     Road road({.scenario = card(R"({"use": "nic"})", R"("subAdapter": 3, )")});
     const auto chips = road.enumerate("VLNMPCA_Chip");
@@ -165,6 +316,8 @@ TEST(Hardware, UnreadableHardwareCostsItsOwnInstances) {
     ASSERT_EQ(vlnsim_fault("AX_DiagReadPCIRegistersV2", 1, VLNSIM_STATUS, 1), 0);
     ASSERT_EQ(vlnsim_fault("AX_GetVPD", 1, VLNSIM_STATUS, 190), 0);
     ASSERT_EQ(vlnsim_fault("AX_GetSffData", 2, VLNSIM_STATUS, 251), 0);
+    ASSERT_EQ(vlnsim_fault("AX_DiagBeaconState", 1, VLNSIM_STATUS, 63), 0); // not supported
+    ASSERT_EQ(vlnsim_fault("AX_DiagBeaconState", 2, VLNSIM_STATUS, 1), 0);
     const auto census = road.census();
     const auto count = [&](const char* name) {
         const auto it = census.find(name);
@@ -179,6 +332,9 @@ TEST(Hardware, UnreadableHardwareCostsItsOwnInstances) {
     EXPECT_EQ(count("VLNMPCA_ElementVPD"), 0u);
     EXPECT_EQ(count("VLNMPCA_Transceiver"), 1u);
     EXPECT_EQ(count("VLNMPCA_TransceiverComponent"), 1u);
+    const auto ports = road.enumerate("VLNMPCA_EthernetPort");
+    EXPECT_EQ(text_of(ports.at(0), "LocationIndicator"), "4");
+    EXPECT_EQ(text_of(ports.at(1), "LocationIndicator"), "-");
     road.close();
     EXPECT_EQ(road.count_in_log("AX_DiagReadPCIRegistersV2 call failed"), 1u);
     EXPECT_EQ(road.count_in_log("NIC port 100002564C000101 CreateVPD failed"), 1u);

@@ -18,9 +18,7 @@ std::string Data::string(const std::string& name) const {
 }
 
 Value text(const char* chars) {
-    auto data = std::make_shared<Data>();
-    data->text = chars;
-    return object(CMPI_string, data);
+    return object(CMPI_string, path_data("", chars));
 }
 
 Value number(CMPIType type, unsigned long long value) {

@@ -31,7 +31,12 @@ TEST(Profiles, AClientWalksFromTheProfileToTheCard) {
     host::set(profile.keys, "InstanceID", host::Value::text("VLN:Physical Asset"));
     const auto got = road.manager().get(profile);
     ASSERT_TRUE(got.ok());
-    EXPECT_EQ(text_of(got.value, "RegisteredVersion"), "1.0.2");
+    expect_properties(got.value, {{"Description", "Vorlan Physical Asset"},
+                                  {"ElementName", "Vorlan Registered Physical Asset"},
+                                  {"RegisteredOrganization", "2"},
+                                  {"RegisteredVersion", "1.0.2"},
+                                  {"AdvertiseTypes", "{3}"},
+                                  {"AdvertiseTypeDescriptions", "{SLP}"}});
     const auto cards =
         road.manager().associators(profile, {"VLNMPCA_CardConformsToProfile", "", "", ""});
     ASSERT_TRUE(cards.ok());

@@ -58,7 +58,7 @@ TEST(Software, IdentitiesOfProviderDriverAndFirmware) {
 // The firmware's card tells its release date, if it has one of this form.
 TEST(Software, AFirmwareOfAnotherForm) {
     Road road({.scenario = R"({"include": ")" VLN_SCENARIOS R"(/parts/cna.json", "cards": [
-        {"use": "cna", "vpd": {"FW": "D:0315201"},
+        {"use": "cna", "vpd": {"FW": "D:031520145"},
          "adapterAttributes": {"OperationalFirmwareVersion": "4.01A5"},
          "functions": [{"use": "nic"}]}]})"});
     expect_properties(road.enumerate("VLNMPCA_SoftwareIdentity").at(2), {{"ReleaseDate", "-"},

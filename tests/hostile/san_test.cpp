@@ -47,9 +47,11 @@ TEST(Bad_San, TextsOfUnitsBecomeTextsWhateverTheirBytesAre) {
 TEST(Bad_San, UnitsThatDoNotAnswerAreShownAsTheyAre) {
     Road road({.scenario = san(target(R"({"silent": true}, {"checkConditions": 4000000000},
         {"checkConditions": 2}, {"responses": {"serialPage": false}},
-        {"responses": {"capacity": "", "identityPage": "", "inquiry": "", "serialPage": ""}})"))});
+        {"responses": {"capacity": "", "identityPage": "", "inquiry": "", "serialPage": ""}},
+        {"responses": {"inquiry": "60", "identityPage": false}})")),
+               .log = true});
     const auto units = road.enumerate("VLNMPCA_StorageVolume");
-    ASSERT_EQ(units.size(), 5u);
+    ASSERT_EQ(units.size(), 6u); // the bits above the type of the last one count nothing
     for (std::size_t silent : {0u, 1u}) {
         SCOPED_TRACE(silent);
         expect_properties(units[silent],
@@ -64,6 +66,10 @@ TEST(Bad_San, UnitsThatDoNotAnswerAreShownAsTheyAre) {
     EXPECT_EQ(text_of(units[2], "Capacity"), "1073741824");
     EXPECT_EQ(text_of(units[4], "Description"), "  Revision ");
     EXPECT_EQ(road.enumerate("VLNMPCA_SCSIInitiatorTargetStorageVolumePath").size(), units.size());
+    road.close();
+    EXPECT_EQ(road.count_in_log("Sense Data: 70 00 05 00 00 00 00 0a 00 00 00 00 24 00 00 00 00 00 "
+                                "00 00 00 00 00 00 \n"),
+              1u);
 }
 
 // Only three lengths have a text; the key is unique by the number of the unit in any case.

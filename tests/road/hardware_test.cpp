@@ -287,6 +287,35 @@ TEST(Hardware, ThePCIFunctionOfAPort) {
     EXPECT_EQ(end_of(conforming[0], "ConformantStandard", "InstanceID"), "VLN:PCI Device");
 }
 
+TEST(Hardware, VitalProductDataOfACard) {
+    Road road({.scenario = card(R"({"use": "nic", "vpd": {"ZZ": "nobody's", "PA": "Adapter",
+        "FN": "0123456789ABCDEF more", "CF": 80, "RI": 254,
+        "FW": "V:10.2.261.13-very-long,x,D:03152014"}})")});
+    const auto data = road.enumerate("VLNMPCA_FRUVitalProductData");
+    ASSERT_EQ(data.size(), 1u);
+    expect_properties(data[0], {{"InstanceID", "VR10420117"},
+                                {"ProductName", "Adapter"},
+                                {"SerialNumber", "VR10420117"},
+                                {"PartNumber", "VMC-2210"},
+                                {"Manufacturer", "Vorlan"},
+                                {"Date", "1214"},
+                                {"UUID", "0f4a2c117d3e4b529a0102564c000001"},
+                                {"FRUNumber", "0123456789ABCDEF"},
+                                {"FRUFirmwareDetail", "{V:10.2.261.13-very-long,x,D:03152014}"},
+                                {"CardFunction", "80"},
+                                {"RevisionID", "254"}});
+    EXPECT_EQ(text_of(road.enumerate("VLNMPCA_Card").at(0), "Name"),
+              "Vorlan Fibre Channel Adapter VR10420117");
+    std::size_t firmware = 0;
+    for (const auto& software : road.enumerate("VLNMPCA_SoftwareIdentity"))
+        if (text_of(software, "VersionString") == "10.2.261.13-very") {
+            ++firmware;
+            EXPECT_EQ(text_of(software, "ReleaseDate").substr(1, 8), "20140315");
+            EXPECT_TRUE(text_of(software, "Name").ends_with(" Firmware"));
+        }
+    EXPECT_EQ(firmware, 1u);
+}
+
 TEST(Hardware, VitalProductDataOfAPort) {
     Road road({.scenario = card(R"({"use": "nic", "pciVpd": {"PA": "Adapter", "PN": "VMC-2210",
         "CP": {"bytes": "1001"}, "ZZ": "own", "V5": "five", "V0": "", "YA": "Slot 9"}})")});

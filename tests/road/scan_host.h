@@ -33,6 +33,8 @@ public:
     // A line for each target of each port, with all that the scan has found out about it.
     std::vector<std::string> targets() const;
 
+    cimple::VLN_Data& data() { return *_data; }
+
 private:
     std::unique_ptr<cimple::VLN_MethodWrapper> _wrapper;
     std::unique_ptr<cimple::VLN_Data> _data;

@@ -118,6 +118,37 @@ TEST(SuddenEnds, ABusyConsoleSettlesAfterOnePass) {
     EXPECT_EQ(road->count_in_log("PERF: Building SAN Data..."), 1u);
 }
 
+// What joins the adapters' picture with the SAN's is shown whole, whenever a refresh is looked at:
+// by clients that come before its SAN pass and by those that come in it.
+TEST(SuddenEnds, JoinedClassesAreWholeAcrossARefresh) {
+    constexpr const char* JOINED[] = {"VLNMPCA_SAPAvailableForEthernetPort",
+                                      "VLNMPCA_iSCSIProtocolEndpointSAPImplementation",
+                                      "VLNMPCA_iSCSIBindsToTCP"};
+    road::Road road({.scenario = R"({"include": ")" VLN_SCENARIOS R"(/parts/cna.json", "cards": [
+        {"use": "cna", "functions": [{"use": "nic"},
+         {"use": "iscsi", "iscsiTargets": {"sessions": {}}}]}]})",
+                     .log = true});
+    for (const char* name : JOINED)
+        EXPECT_EQ(road.enumerate(name).size(), 1u) << name;
+    std::size_t refreshes = 0;
+    for (const char* held : {"AX_GetHBAAttributes", "AX_iSCSI_GetTargets"}) {
+        SCOPED_TRACE(held);
+        road.wait_for_refreshes(++refreshes);
+        vlnsim_advance(STALE);
+        hold(held);
+        std::thread first([&] { EXPECT_EQ(road.enumerate("VLNMPCA_iSCSISession").size(), 1u); });
+        wait_until_held();
+        std::vector<std::thread> clients;
+        for (const char* name : JOINED)
+            clients.emplace_back([&, name] { EXPECT_EQ(road.enumerate(name).size(), 1u) << name; });
+        rest();
+        vlnsim_clear_faults();
+        for (std::thread& client : clients)
+            client.join();
+        first.join();
+    }
+}
+
 // ---- Up-calls ----
 
 constexpr const char* PLATFORM = R"([

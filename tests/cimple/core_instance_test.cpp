@@ -28,6 +28,28 @@ Test_Holder* make_holder() {
     return holder;
 }
 
+TEST(Instance, TakesDefaultsAndIsNullWithoutOne) {
+    Ref<Test_Types> types(create<Test_Types>(true));
+    EXPECT_TRUE(types->Numbers.value == (Array<uint32>{1, 2}));
+    EXPECT_TRUE(types->Names.value == (Array<String>{"a", "b"}));
+    EXPECT_TRUE(types->Installed.value == Datetime(93784000005, 0, false));
+    EXPECT_FALSE(types->Numbers.is_null() || types->Names.is_null() || types->Installed.is_null());
+    EXPECT_TRUE(types->B.is_null() && types->Dates.is_null() && types->Str.is_null());
+    Ref<Test_Sub> sub(create<Test_Sub>(true));
+    EXPECT_EQ(sub->State.value, 5);
+}
+
+TEST(Instance, MethodInstancesAreBuiltLikeOthers) {
+    Ref<Instance> method(create(as_class(&Test_Service_Run_method::static_meta_class), true));
+    auto* run = static_cast<Test_Service_Run_method*>(method.get());
+    run->Answer.set("done");
+    run->Target = make_base("t", 1);
+    Ref<Instance> copied(clone(run));
+    EXPECT_TRUE(identical(run, copied.get()));
+    EXPECT_EQ(cast<Test_Base>(copied.get()), nullptr);
+    EXPECT_TRUE(key_eq(run, copied.get()));
+}
+
 TEST(Instance, ClonesShareNothingThatChanges) {
     Ref<Test_Types> types(make_types());
     types->__name_space = "root/vorlan";
@@ -93,6 +115,19 @@ TEST(Instance, CopyReplacesReferencesAndNeedsOneClass) {
     EXPECT_TRUE(base->Caption.is_null());
 }
 
+TEST(Instance, ClearEmptiesEverything) {
+    Ref<Test_Types> types(make_types());
+    types->__name_space = "root/vorlan";
+    clear(types.get());
+    EXPECT_TRUE(identical(types.get(), Ref<Test_Types>(create_null<Test_Types>()).get()));
+    EXPECT_EQ(types->U64.value, 0u);
+    EXPECT_TRUE(types->Str.value.empty() && types->Names.value.empty());
+    Ref<Test_Holder> holder(make_holder());
+    clear(holder.get());
+    EXPECT_EQ(holder->Object, nullptr);
+    EXPECT_TRUE(holder->Objects.is_null());
+}
+
 TEST(Instance, FilterKeepsWhatIsNamed) {
     Ref<Test_Holder> holder(make_holder());
     holder->Count.set(3);
@@ -110,6 +145,10 @@ TEST(Instance, FilterKeepsWhatIsNamed) {
     ASSERT_NE(model->Object, nullptr);
     EXPECT_EQ(model->Object->__meta_class, &Test_Base::static_meta_class);
 
+    const char* const none[] = {nullptr};
+    holder->Id.null = 0;
+    EXPECT_EQ(filter_properties(holder.get(), none, true), 0);
+    EXPECT_FALSE(holder->Id.is_null());
     EXPECT_EQ(filter_properties(holder.get(), nullptr, true), 0);
     EXPECT_FALSE(holder->Count.is_null() || holder->Objects.is_null());
 
@@ -150,6 +189,17 @@ TEST(Instance, Prints) {
                                          "        uint32 Slot = 2;\n"
                                          "    };\n"
                                          "}\n");
+    Ref<Test_Types> types(create<Test_Types>(true));
+    types->B.set(true);
+    types->C16.set(u'\u20AC');
+    types->R32.set(1.5f);
+    types->S64.set(INT64_MIN);
+    const std::string text = printed(types.get(), false);
+    for (const char* line :
+         {"    boolean B = true;\n", "    char16 C16 = 0x20AC;\n", "    real32 R32 = 1.500000;\n",
+          "    sint64 S64 = -9223372036854775808;\n", "    string Names = { \"a\", \"b\" };\n",
+          "    datetime Installed = \"00000001020304.000005:000\";\n", "    uint8 U8 = NULL;\n"})
+        EXPECT_NE(text.find(line), std::string::npos) << line << text;
 }
 
 } // namespace

@@ -13,6 +13,8 @@ TEST(Meta, NamesAreFoundInAnyCase) {
     EXPECT_EQ(find_meta_class(&test_repository, "Test_Su"), nullptr);
     EXPECT_EQ(find_meta_class(&test_repository, "Test_Subs"), nullptr);
     EXPECT_EQ(find_meta_class(nullptr, "Test_Sub"), nullptr);
+    const Meta_Repository none{nullptr, 0};
+    EXPECT_EQ(find_meta_class(&none, "Test_Sub"), nullptr);
     EXPECT_TRUE(name_equal(nullptr, nullptr));
     EXPECT_FALSE(name_equal("", nullptr));
 
@@ -21,6 +23,8 @@ TEST(Meta, NamesAreFoundInAnyCase) {
     EXPECT_EQ(find_feature(service, "Run", FLAG_PROPERTY | FLAG_REFERENCE), nullptr);
     EXPECT_EQ(find_property(&Test_Sub::static_meta_class, "slot")->type, TYPE_UINT32);
     EXPECT_EQ(find_reference(&Test_Link::static_meta_class, "Weight"), nullptr);
+    EXPECT_TRUE(has_feature_flag(service, FLAG_METHOD));
+    EXPECT_FALSE(has_feature_flag(&Test_Base::static_meta_class, FLAG_REFERENCE));
     EXPECT_EQ(find_class_in_tree(&Test_Sub::static_meta_class, "TEST_BASE"),
               &Test_Base::static_meta_class);
     EXPECT_EQ(find_class_in_tree(&Test_Sub::static_meta_class, "Test_Link"),
@@ -31,6 +35,9 @@ TEST(Meta, SubclassesAreRelatedByPointerOrName) {
     const Meta_Class* base = &Test_Base::static_meta_class;
     const Meta_Class* sub = &Test_Sub::static_meta_class;
     const Meta_Class* any = &Instance::static_meta_class;
+    EXPECT_TRUE(is_subclass(base, base));
+    EXPECT_TRUE(is_subclass(base, sub));
+    EXPECT_FALSE(is_subclass(sub, base));
     EXPECT_TRUE(is_subclass(any, sub));
     EXPECT_TRUE(is_subclass(any, nullptr));
     EXPECT_FALSE(is_subclass(base, nullptr));
@@ -55,14 +62,28 @@ TEST(Meta, ClassWithBaseIsADeepCopy) {
         EXPECT_TRUE(identical(made, again));
         EXPECT_FALSE(identical(made, again, true));
         EXPECT_FALSE(identical(made, base));
-        for (uint32 i = 0; i < made->num_meta_features; ++i)
+        for (uint32 i = 0; i < made->num_meta_features; ++i) {
+            EXPECT_NE(made->meta_features[i], base->meta_features[i]);
             EXPECT_NE(made->meta_features[i]->name, base->meta_features[i]->name);
-        const Ref<Instance> instance(create(made, true)); // keeps its class
+            EXPECT_EQ(made->locals[i], 0);
+        }
         unref(made);
         EXPECT_TRUE(name_equal(again->super_meta_class->name, "Made")); // kept by again
         unref(again);
         EXPECT_EQ(base->refs, 0u);
     }
+}
+
+TEST(Meta, InstancesOfMadeClassesTakeTheirDefaults) {
+    Meta_Class* made = create_meta_class("Made", &Test_Types::static_meta_class, 0);
+    auto* instance = static_cast<Test_Types*>(create(made, true));
+    EXPECT_TRUE(instance->Names.value == (Array<String>{"a", "b"}));
+    EXPECT_NE(cast<Test_Types>(instance), nullptr);
+    Instance* copied = clone(instance);
+    unref(made);
+    unref(instance);
+    EXPECT_EQ(made->refs, 1u) << "the clone's";
+    unref(copied);
 }
 
 TEST(Meta, QualifiersAreRemovedByNameOrAll) {
@@ -98,6 +119,8 @@ TEST(Meta, Prints) {
               "{\n"
               "    uint16 State = 5;\n"
               "};\n");
+    const std::string types = printed(Test_Types::static_meta_class);
+    EXPECT_NE(types.find("    string Names[2] = {\"a\", \"b\"};\n"), std::string::npos) << types;
     EXPECT_EQ(printed(Test_Service::static_meta_class, {.qualifiers = true}),
               "class Test_Service\n"
               "{\n"

@@ -43,17 +43,20 @@ TEST(Path, WritesAndReadsAllTypes) {
     EXPECT_TRUE(key_eq(types.get(), wide.get()));
 }
 
-TEST(Path, QuotesPathsAsKeys) {
-    Ref<Test_Link> link(create_null<Test_Link>());
+TEST(Path, NestsQuotedPaths) {
+    Ref<Test_Chain> chain(create_null<Test_Chain>());
+    chain->Link = create_null<Test_Link>();
     auto* leaf = create_null<Test_Leaf>();
     leaf->Name.set("say \"hi\" \\ bye\\");
-    link->Left = leaf;
-    link->Right = make_base("r", 31);
-    EXPECT_EQ(path_of(link->Right), "Test_Base.Id=\"r\",Slot=31");
-    const std::string path = path_of(link.get());
-    const Ref<Instance> read_back = read(Test_Link::static_meta_class, path);
+    chain->Link->Left = leaf;
+    chain->Link->Right = make_base("r", 31);
+    EXPECT_EQ(path_of(chain->Link->Right), "Test_Base.Id=\"r\",Slot=31");
+    const std::string path = path_of(chain.get());
+    const Ref<Test_Chain> read_back(
+        model_path_to_instance(&Test_Chain::static_meta_class, path.c_str()));
     ASSERT_TRUE(read_back) << path;
-    EXPECT_TRUE(key_eq(link.get(), read_back.get())) << path;
+    EXPECT_TRUE(key_eq(chain.get(), read_back.get())) << path;
+    EXPECT_TRUE(read_back->Link->Weight.is_null());
 }
 
 TEST(Path, AcceptsWhatItSays) {

@@ -104,14 +104,32 @@ TEST(Array, ElementsOfItselfMayBeInserted) {
 
 // ---- Datetime ----
 
-// The host's zone, for the rest of the process.
-void set_zone(const char* zone) {
-    setenv("TZ", zone, 1);
-    tzset();
-}
+// The host's zone for a test, put back afterwards.
+class Zone {
+public:
+    explicit Zone(const char* zone) {
+        const char* old = std::getenv("TZ");
+        _had = old != nullptr;
+        if (old)
+            _old = old;
+        set(zone);
+    }
+    ~Zone() { set(_had ? _old.c_str() : nullptr); }
+
+private:
+    static void set(const char* zone) {
+        if (zone)
+            setenv("TZ", zone, 1);
+        else
+            unsetenv("TZ");
+        tzset();
+    }
+    std::string _old;
+    bool _had;
+};
 
 TEST(Datetime, ReadsAndWritesBothForms) {
-    set_zone("UTC0");
+    Zone zone("UTC0");
     const struct {
         const char* text;
         uint64 usec;
@@ -174,11 +192,21 @@ TEST(Datetime, RefusesEverythingElseAndKeepsItsValue) {
     EXPECT_FALSE(value.set(nullptr));
 }
 
+TEST(Datetime, PrintsAnyValueWithoutHarm) {
+    const uint64 values[] = {0, 1, UINT64_MAX, uint64{1} << 63, 253402300800000000u};
+    for (const uint64 usec : values) {
+        for (const sint32 utc : {INT32_MIN, -1, 0, INT32_MAX}) {
+            EXPECT_GE(Datetime(usec, utc, true).ascii().size(), 24u);
+            EXPECT_GE(Datetime(usec, utc, false).readable().size(), 24u);
+        }
+    }
+}
+
 TEST(Datetime, NowTellsTheClockAndTheOffsetOfTheHost) {
     static uint64 present;
     present = 1709210096000007;
     const Time::Clock clock{[] { return present; }, [](uint64) {}};
-    set_zone("XYZ-02:30"); // POSIX signs zones west: this one is 150 minutes east
+    Zone zone("XYZ-02:30"); // POSIX signs zones west: this one is 150 minutes east
     Time::replace_clock(&clock);
     EXPECT_STREQ(Datetime::now().ascii().c_str(), "20240229150456.000007+150");
     present = 0;

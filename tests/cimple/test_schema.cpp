@@ -128,6 +128,13 @@ const Meta_Feature* const features[] = {&left, &right, &weight};
 constexpr uint8 locals[] = {1, 1, 1};
 } // namespace link
 
+namespace chain {
+using T = Test_Chain;
+const Meta_Reference link_ref REFERENCE(Link, 0, Test_Link, KEY);
+const Meta_Feature* const features[] = {&link_ref};
+constexpr uint8 locals[] = {1};
+} // namespace chain
+
 namespace holder {
 using T = Test_Holder;
 const Meta_Property id PROPERTY(Id, TYPE_STRING, KEY);
@@ -137,6 +144,15 @@ const Meta_Property count PROPERTY(Count, TYPE_UINT32, 0);
 const Meta_Feature* const features[] = {&id, &object, &objects, &count};
 constexpr uint8 locals[] = {1, 1, 1, 1};
 } // namespace holder
+
+namespace crowd {
+using T = Test_Crowd;
+const Meta_Reference head REFERENCE(Head, 0, Test_Base, KEY);
+const Meta_Reference tail REFERENCE(Tail, 0, Test_Base, KEY);
+const Meta_Reference others REFERENCE(Others, -1, Test_Base, 0);
+const Meta_Feature* const features[] = {&head, &tail, &others};
+constexpr uint8 locals[] = {1, 1, 1};
+} // namespace crowd
 
 namespace run_method {
 using T = Test_Service_Run_method;
@@ -170,8 +186,9 @@ const Meta_Class* const classes[] = {
     &Test_Base::static_meta_class,     &Test_Sub::static_meta_class,
     &Test_Stranger::static_meta_class, &Test_Root::static_meta_class,
     &Test_Leaf::static_meta_class,     &Test_Types::static_meta_class,
-    &Test_Link::static_meta_class,     &Test_Holder::static_meta_class,
-    &Test_Service::static_meta_class,
+    &Test_Link::static_meta_class,     &Test_Chain::static_meta_class,
+    &Test_Holder::static_meta_class,   &Test_Service::static_meta_class,
+    &Test_Crowd::static_meta_class,
 };
 
 } // namespace
@@ -188,7 +205,9 @@ CLASS(Test_Leaf, FLAG_CLASS, nullptr, 0, leaf::features, leaf::locals,
       &Test_Root::static_meta_class, 1)
 CLASS(Test_Types, FLAG_CLASS, nullptr, 0, types::features, types::locals, nullptr, 14)
 CLASS(Test_Link, FLAG_ASSOCIATION, nullptr, 0, link::features, link::locals, nullptr, 2)
+CLASS(Test_Chain, FLAG_ASSOCIATION, nullptr, 0, chain::features, chain::locals, nullptr, 1)
 CLASS(Test_Holder, FLAG_CLASS, nullptr, 0, holder::features, holder::locals, nullptr, 1)
+CLASS(Test_Crowd, FLAG_ASSOCIATION, nullptr, 0, crowd::features, crowd::locals, nullptr, 2)
 CLASS(Test_Service, FLAG_CLASS, nullptr, 0, service::features, service::locals, nullptr, 1)
 
 constinit const Meta_Method Test_Service_Run_method::static_meta_class{

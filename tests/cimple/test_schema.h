@@ -69,11 +69,25 @@ struct Test_Link : Instance {
     static const Meta_Class static_meta_class;
 };
 
+// A link to links: its path quotes paths within paths.
+struct Test_Chain : Instance {
+    Test_Link* Link; // key
+    static const Meta_Class static_meta_class;
+};
+
 struct Test_Holder : Instance {
     Property<String> Id; // key
     Test_Base* Object;   // embedded
     Property<Array<Test_Base*>> Objects;
     Property<uint32> Count;
+    static const Meta_Class static_meta_class;
+};
+
+// A link with references besides its ends: many in an array.
+struct Test_Crowd : Instance {
+    Test_Base* Head; // key
+    Test_Base* Tail; // key
+    Property<Array<Test_Base*>> Others;
     static const Meta_Class static_meta_class;
 };
 

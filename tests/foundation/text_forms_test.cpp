@@ -3,6 +3,7 @@
 #include "foundation/common.h"
 
 #include <cstring>
+#include <hbaapi.h>
 
 namespace cimple {
 
@@ -35,6 +36,44 @@ TEST_F(Text_Forms_Test, BytesToText) {
     EXPECT_EQ(std::memcmp(swapped, "\xCD\xAB\x00\x10", 4), 0);
 }
 
+TEST_F(Text_Forms_Test, NullDestinationsAreNoOps) {
+    EXPECT_EQ(VLN_Common::wwnToString(nullptr, BYTES), 0);
+    EXPECT_EQ(VLN_Common::wwn16ToString(nullptr, BYTES), 0);
+    EXPECT_EQ(VLN_Common::macToText(BYTES, nullptr), 0);
+    EXPECT_EQ(VLN_Common::descriptorToString(nullptr, BYTES, 8), 0);
+    EXPECT_EQ(VLN_Common::bytesToSeparatedText(nullptr, nullptr, ",", 0, 0), 0);
+    EXPECT_EQ(VLN_Common::formatMacWithDashes(nullptr, BYTES), 32769);
+}
+
+TEST_F(Text_Forms_Test, Descriptors) {
+    const std::pair<uint32, const char*> cases[] = {{16, "1000ABCDEF0102FF0011223344556677"},
+                                                    {12, "1000ABCDEF0102FF00112233"},
+                                                    {8, "1000ABCDEF0102FF"},
+                                                    {20, ""},
+                                                    {0, ""}};
+    Log_Capture capture;
+    for (const auto& [length, expected] : cases) {
+        text = "before";
+        EXPECT_EQ(VLN_Common::descriptorToString(&text, BYTES, length), 0);
+        EXPECT_EQ(text, expected) << length;
+    }
+    EXPECT_EQ(capture.lines.size(), 2U);
+    EXPECT_TRUE(capture.has(VLN_ERR, "INVALID Descriptor"));
+}
+
+TEST_F(Text_Forms_Test, SeparatedBytesStopBeforeTheEnd) {
+    const sint8 bytes[] = {1, -128, 0, 127};
+    char room[16];
+    std::memset(room, '#', sizeof room);
+    EXPECT_EQ(VLN_Common::bytesToSeparatedText(bytes, room, ".", 4, 15), 0);
+    EXPECT_STREQ(room, "1.-128.0.127");
+    std::memset(room, '#', sizeof room);
+    EXPECT_EQ(VLN_Common::bytesToSeparatedText(bytes, room, ".", 4, 12), 1);
+    EXPECT_STREQ(room, "1.-128.0");
+    EXPECT_EQ(room[12], '\0');
+    EXPECT_EQ(room[13], '#') << "nothing behind dst[max]";
+}
+
 TEST_F(Text_Forms_Test, TextToWwn) {
     uint8 bytes[8] = {};
     EXPECT_EQ(VLN_Common::stringToWwn(bytes, "1000abcdEF0102ff"), 0);
@@ -53,6 +92,15 @@ TEST_F(Text_Forms_Test, TextToWwn) {
     }
     EXPECT_EQ(std::memcmp(word, BYTES, 8), 0) << "a failure leaves the word alone";
     EXPECT_EQ(capture.lines.size(), 16U);
+}
+
+TEST_F(Text_Forms_Test, MacToNaa) {
+    EXPECT_EQ(VLN_Common::macToNaa(&text, "00-11-22-aa-bb-cc"), 0);
+    EXPECT_EQ(text, "00:11:22:aa:bb:cc:00:00");
+    for (const char* bad : {static_cast<const char*>(nullptr), "", "00-11-22-aa-bb-c",
+                            "00-11-22-aa-bb-ccc", "00:11-22-aa-bb-cc", "00-11-22-aa-bb.cc"})
+        EXPECT_EQ(VLN_Common::macToNaa(&text, bad), 32769) << (bad ? bad : "null");
+    EXPECT_EQ(text, "00:11:22:aa:bb:cc:00:00");
 }
 
 TEST_F(Text_Forms_Test, FirmwareVersions) {
@@ -93,6 +141,53 @@ TEST_F(Text_Forms_Test, FirmwareVersions) {
         EXPECT_EQ(version.releaseType, c.release);
         EXPECT_EQ(version.testRevision, "");
     }
+}
+
+TEST_F(Text_Forms_Test, VersionOfFourNumbers) {
+    uint16 numbers[4] = {9, 9, 9, 9};
+    Log_Capture capture;
+    EXPECT_EQ(VLN_Common::versionFourNumbers("10.2.261.13.99", numbers), 0);
+    EXPECT_TRUE(capture.has(VLN_DBG, "10, 2, 261, 13"));
+    EXPECT_EQ(VLN_Common::versionFourNumbers("4..x", numbers), 0);
+    EXPECT_TRUE(capture.has(VLN_DBG, "4, 0, 0, 0"));
+    const std::string endless(500, '1');
+    EXPECT_EQ(VLN_Common::versionFourNumbers(endless.c_str(), numbers), 0);
+    EXPECT_EQ(VLN_Common::versionFourNumbers(nullptr, numbers), 32769);
+}
+
+TEST_F(Text_Forms_Test, Tokens) {
+    char line[] = ",,one,;two;";
+    char* place = nullptr;
+    EXPECT_STREQ(VLN_Common::nextToken(line, ",;", &place), "one");
+    EXPECT_STREQ(VLN_Common::nextToken(nullptr, ",;", &place), "two");
+    EXPECT_EQ(VLN_Common::nextToken(nullptr, ",;", &place), nullptr);
+    EXPECT_EQ(VLN_Common::nextToken(nullptr, ",;", &place), nullptr);
+}
+
+// The fields of a record need not be terminated.
+TEST_F(Text_Forms_Test, AdapterAttributes) {
+    HBA_ADAPTERATTRIBUTES record{};
+    std::memset(record.Manufacturer, 'm', sizeof record.Manufacturer);
+    std::memcpy(record.NodeWWN.wwn, BYTES, 8);
+    std::strcpy(record.DriverName, "vfcd");
+    EXPECT_EQ(VLN_Common::adapterAttributesText(&record, &text), 0);
+    EXPECT_EQ(text, "Manufacturer: " + std::string(64, 'm') +
+                        "NodeWWN: 1000ABCDEF0102FFModelDescription: NodeSymbolicName: "
+                        "HardwareVersion: DriverVersion: FirmwareVersion: DriverName: vfcd");
+}
+
+TEST_F(Text_Forms_Test, DebugLines) {
+    Log_Capture capture;
+    VLN_Common::traceInt("count", -3);
+    VLN_Common::traceString("name", "");
+    VLN_Common::traceString("name", nullptr);
+    Array<uint16> array;
+    array.append(1);
+    array.append(65535);
+    VLN_Common::traceUint16Array("states", array);
+    EXPECT_TRUE(capture.has(VLN_DBG, "count: -3"));
+    EXPECT_TRUE(capture.has(VLN_DBG, "name: "));
+    EXPECT_TRUE(capture.has(VLN_DBG, "states: 1,65535"));
 }
 
 } // namespace cimple

@@ -69,7 +69,7 @@ ProviderAgent* ProviderAgent::instance() {
     return instanceLocked();
 }
 
-bool ProviderAgent::acquire(Class_Loads& loads) {
+bool ProviderAgent::addRef(Class_Loads& loads) {
     const No_Cancellation whole_agent;
     Auto_Mutex lock(*s_AgentMutex);
     ProviderAgent* agent = instanceLocked();
@@ -90,7 +90,7 @@ ProviderAgent* ProviderAgent::holder(const Class_Loads& loads) {
     return loads.references || loads.failures ? current() : nullptr;
 }
 
-void ProviderAgent::release(Class_Loads& loads) {
+void ProviderAgent::releaseRef(Class_Loads& loads) {
     const No_Cancellation whole_agent;
     ProviderAgent* agent = holder(loads);
     if (!agent)

@@ -46,12 +46,12 @@ public:
     static ProviderAgent* current() noexcept;
     // Loads a class provider: builds the agent if there is none, and counts a reference. False, and
     // no reference, when the libraries are not usable. What was taken is noted in the record.
-    static bool acquire(Class_Loads& loads);
-    // Undoes one acquire of the record: ends the threads that the calls of this provider started,
+    static bool addRef(Class_Loads& loads);
+    // Undoes one addRef of the record: ends the threads that the calls of this provider started,
     // then gives back what was taken, if anything. With the last of all the agent goes, also one
     // whose libraries are not usable, so that a later load tries again. Holds no lock while it
     // waits for a thread, which may be in an up-call that leads to a load.
-    static void release(Class_Loads& loads);
+    static void releaseRef(Class_Loads& loads);
     // At the end of the process: ends the threads without destroying anything.
     static void endThreadsAtExit() noexcept;
 

@@ -127,13 +127,13 @@ void enumerate(ProviderAgent& agent, const Pattern_Row& row,
 
 sint32 pattern_load(const Pattern_Row& row) {
     bool loaded = false;
-    run_guarded([&] { loaded = ProviderAgent::acquire(loads_of(row)); });
+    run_guarded([&] { loaded = ProviderAgent::addRef(loads_of(row)); });
     return loaded ? PROVIDER_OK : LOAD_FAILED;
 }
 
 sint32 pattern_unload(const Pattern_Row& row) {
     VLN_LOG(VLN_DBG, "%s_Provider::unload()", row.meta_class->name);
-    if (!run_guarded([&] { ProviderAgent::release(loads_of(row)); }))
+    if (!run_guarded([&] { ProviderAgent::releaseRef(loads_of(row)); }))
         VLN_LOG(VLN_ERR, "Error in ProviderAgent unload. Just continue");
     return PROVIDER_OK;
 }

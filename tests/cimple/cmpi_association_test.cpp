@@ -76,6 +76,22 @@ TEST_F(Association_Test, ReferencesToTheSource) {
     ASSERT_EQ(broker.returned_instances.size(), 2u);
     EXPECT_EQ(broker.returned_instances[0]->find("Weight")->scalar.uint32, 5u);
 
+    broker.clear_results();
+    const char* properties[] = {"Left", nullptr};
+    mi->ft->references(mi, context, result, leaf_path("a"), 0, "LEFT", properties);
+    ASSERT_EQ(broker.returned_instances.size(), 2u);
+    EXPECT_FALSE(broker.returned_instances[0]->find("Weight"));
+    EXPECT_TRUE(broker.returned_instances[0]->find("Right")) << "a key comes with any list";
+
+    // What is listed keeps its null; what is not listed is null.
+    static_cast<Test_Link*>(script.instances[0].get())->Weight.null = 1;
+    broker.clear_results();
+    const char* weight[] = {"Weight", nullptr};
+    mi->ft->references(mi, context, result, leaf_path("a"), 0, 0, weight);
+    ASSERT_EQ(broker.returned_instances.size(), 2u);
+    EXPECT_FALSE(broker.returned_instances[0]->find("Weight"));
+    EXPECT_TRUE(broker.returned_instances[1]->find("Weight"));
+
     mi->ft->referenceNames(mi, context, result, leaf_path("a"), 0, 0);
     ASSERT_EQ(broker.returned_paths.size(), 2u);
     EXPECT_EQ(broker.returned_paths[0]->find("Left")->object->string("Name"), "a");
@@ -133,6 +149,51 @@ TEST_F(Association_Test, AClassThatIsNoAssociationFails) {
     EXPECT_EQ(other->ft->associators(other, context, result, path, 0, 0, 0, 0, nullptr).rc, 1);
     EXPECT_EQ(other->ft->associatorNames(other, context, result, path, 0, 0, 0, 0).rc, 1);
     EXPECT_EQ(other->ft->references(other, context, result, path, 0, 0, nullptr).rc, 1);
+}
+
+// The closing call: once after a real answer, none after an unsupported one.
+TEST_F(Association_Test, TheProcedureClosesTheStreamOfRealAnswers) {
+    static int closings;
+    static sint32 closing_status;
+    const Instance_Proc handler = [](Instance* instance, sint32 status, void*) {
+        closings += !instance;
+        closing_status = status;
+        unref(instance);
+        return true;
+    };
+    const auto proc = [&](int operation, std::size_t at) {
+        void* provider = nullptr;
+        link_registration.proc(nullptr, OP_CREATE_PROVIDER,
+                               reinterpret_cast<Provider_Word>(&provider), 0, 0, 0, 0, 0, 0, 0);
+        const Ref<Instance> source(make_base("s", 1));
+        Provider_Word args[8] = {};
+        args[0] = reinterpret_cast<Provider_Word>(provider);
+        args[1] = reinterpret_cast<Provider_Word>(source.get());
+        args[at] = reinterpret_cast<Provider_Word>(handler);
+        closings = 0;
+        const sint32 status = link_registration.proc(nullptr, operation, args[0], args[1], args[2],
+                                                     args[3], args[4], args[5], args[6], args[7]);
+        link_registration.proc(nullptr, OP_DESTROY_PROVIDER, args[0], 0, 0, 0, 0, 0, 0, 0);
+        return status;
+    };
+    const struct {
+        int operation;
+        std::size_t handler_at;
+        sint32 status;
+        int closings;
+    } cases[] = {
+        {OP_ENUM_ASSOCIATOR_NAMES, 5, 111, 0}, {OP_ENUM_ASSOCIATOR_NAMES, 5, 112, 1},
+        {OP_ENUM_REFERENCES, 4, 121, 0},       {OP_ENUM_REFERENCES, 4, 0, 1},
+        {OP_ENUM_ASSOCIATORS, 5, 171, 0},      {OP_ENUM_ASSOCIATORS, 5, 170, 1},
+    };
+    for (const auto& row : cases) {
+        script.status = {{row.operation, row.status}};
+        EXPECT_EQ(proc(row.operation, row.handler_at), row.status);
+        EXPECT_EQ(closings, row.closings) << row.operation << " " << row.status;
+        if (closings) {
+            EXPECT_EQ(closing_status, row.status);
+        }
+    }
 }
 
 // ---- Methods ----

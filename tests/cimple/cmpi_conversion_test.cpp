@@ -14,6 +14,8 @@ namespace {
 
 class Conversion_Test : public testing::Test {
 protected:
+    ~Conversion_Test() override { EXPECT_EQ(broker.released_parameters, 0); }
+
     template <class C>
     Ref<C> from_path(fake::Members keys, const char* name_space = "root/test") {
         return make_cimple_reference({&broker.broker, &test_repository, name_space},
@@ -123,6 +125,28 @@ TYPED_TEST(Every_Type, GoesThereAndBack) {
 
 // ---- References and embedded objects ----
 
+TEST_F(Conversion_Test, ReferencesGoAsPathsInTheirOwnNamespace) {
+    const Ref<Test_Link> link(create_null<Test_Link>());
+    auto* leaf = create_null<Test_Leaf>();
+    leaf->Name.set("l");
+    leaf->__name_space = "root/other";
+    link->Left = leaf;
+    link->Right = make_base("r", 7);
+
+    const fake::Data_Ref sent = to_instance(link.get());
+    ASSERT_EQ(sent->find("Left")->type, CMPI_ref);
+    EXPECT_EQ(sent->find("Left")->object->name_space, "root/other");
+    EXPECT_EQ(sent->find("Left")->object->text, "Test_Leaf");
+    EXPECT_EQ(sent->find("Right")->object->name_space, "root/test");
+    EXPECT_EQ(sent->find("Right")->object->find("Slot")->scalar.uint32, 7u);
+    EXPECT_EQ(sent->path->find("Left")->type, CMPI_ref) << "key references are keys of the path";
+
+    const auto back = from_instance<Test_Link>(sent->members);
+    EXPECT_TRUE(key_eq(back.get(), link.get()));
+    EXPECT_EQ(back->Left->__name_space, "root/other");
+    EXPECT_EQ(back->Right->__name_space, "root/test");
+}
+
 TEST_F(Conversion_Test, EmbeddedObjectsGoWhole) {
     const Ref<Test_Holder> holder(create_null<Test_Holder>());
     holder->Object = make_base("o", 1);
@@ -154,6 +178,25 @@ TEST_F(Conversion_Test, ReferenceToAnotherClassIsRefused) {
     EXPECT_EQ(link->Left, nullptr);
     EXPECT_EQ(link->Right, nullptr);
     EXPECT_EQ(link->Weight.value, 3u);
+}
+
+// A platform's subclass of the class that is expected, by its keys; with fewer it is nothing.
+TEST_F(Conversion_Test, ReferenceToAnUnknownClassIsKnownByItsKeys) {
+    fake::Data_Ref foreign = fake::path_data(
+        "root/far", "Foreign", {{"Slot", fake::number(CMPI_uint64, 7)}, {"Id", fake::text("f")}});
+    const auto read = [&] {
+        return from_instance<Test_Link>({{"Right", fake::object(CMPI_ref, foreign)}});
+    };
+    const auto link = read();
+    ASSERT_NE(link->Right, nullptr);
+    EXPECT_STREQ(link->Right->__meta_class->name, "Foreign");
+    EXPECT_STREQ(link->Right->__name_space.c_str(), "root/far");
+    const Ref<Instance> same(make_base("f", 7));
+    EXPECT_TRUE(key_eq(link->Right, same.get()));
+    foreign->members.pop_back();
+    EXPECT_EQ(read()->Right, nullptr);
+    foreign->members.emplace_back("Other", fake::text("f"));
+    EXPECT_EQ(read()->Right, nullptr);
 }
 
 // ---- From CMPI ----

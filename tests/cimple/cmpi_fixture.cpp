@@ -15,9 +15,6 @@ sint32 Script::run(int operation) {
 
 sint32 Script::deliver(int operation, const Instance_Handler& handler) {
     const sint32 answer = run(operation);
-    if (answer == ENUM_ASSOCIATOR_NAMES_UNSUPPORTED || answer == ENUM_REFERENCES_UNSUPPORTED ||
-        answer == ENUM_ASSOCIATORS_UNSUPPORTED)
-        return answer;
     for (const Ref<Instance>& instance : instances)
         if (!handler.handle(clone(instance.get())))
             break;
@@ -58,19 +55,29 @@ struct Scripted_Provider {
         script.instance.reset(clone(instance));
         return script.run(OP_MODIFY_INSTANCE);
     }
-    sint32 enum_associator_names(const Instance*, const char* result_class, const char* role,
+    sint32 enum_associator_names(const Instance* source, const char* result_class, const char* role,
                                  const char* result_role,
                                  const Enum_Associator_Names_Handler& handler) {
+        script.instance.reset(clone(source));
         script.role = std::string(result_class) + "/" + role + "/" + result_role;
-        return script.deliver(OP_ENUM_ASSOCIATOR_NAMES, handler);
+        const sint32 status = script.status[OP_ENUM_ASSOCIATOR_NAMES];
+        return status == ENUM_ASSOCIATOR_NAMES_UNSUPPORTED
+                   ? script.run(OP_ENUM_ASSOCIATOR_NAMES)
+                   : script.deliver(OP_ENUM_ASSOCIATOR_NAMES, handler);
     }
-    sint32 enum_references(const Instance*, const C*, const char*,
+    sint32 enum_references(const Instance* source, const C*, const char* role,
                            const Enum_References_Handler& handler) {
-        return script.deliver(OP_ENUM_REFERENCES, handler);
+        script.instance.reset(clone(source));
+        script.role = role;
+        return script.status[OP_ENUM_REFERENCES] == ENUM_REFERENCES_UNSUPPORTED
+                   ? script.run(OP_ENUM_REFERENCES)
+                   : script.deliver(OP_ENUM_REFERENCES, handler);
     }
     sint32 enum_associators(const Instance*, const char*, const char*, const char*,
                             const Enum_Associators_Handler& handler) {
-        return script.deliver(OP_ENUM_ASSOCIATORS, handler);
+        return script.status[OP_ENUM_ASSOCIATORS] == 0
+                   ? script.deliver(OP_ENUM_ASSOCIATORS, handler)
+                   : script.run(OP_ENUM_ASSOCIATORS);
     }
 };
 
@@ -130,6 +137,7 @@ Cmpi_Test::~Cmpi_Test() {
             mi.ft->cleanup(&mi, context, true);
     }
     broker.end_call();
+    EXPECT_EQ(broker.released_parameters, 0);
 }
 
 void* Cmpi_Test::interface_any(const Registration& registration, char letter, const char* name) {

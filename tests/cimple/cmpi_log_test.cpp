@@ -96,12 +96,18 @@ TEST_F(Log_Death_Test, CallsAreTraced) {
                          {OP_ENUM_ASSOCIATORS, ENUM_ASSOCIATORS_UNSUPPORTED}};
         broker.upcall_status = CMPI_RC_ERR_NOT_FOUND;
         mi->ft->associators(mi, context, result, broker.path("", "Test_Root"), 0, 0, 0, 0, nullptr);
+        auto* methods = method_mi();
+        methods->ft->invokeMethod(methods, context, result, path, "Run", nullptr, nullptr);
+        methods->ft->cleanup(methods, context, true);
     });
     for (const char* line : {
              "enter: cimple_cmpi_adapter()\n",
              "return: associatorNames(): CMPI_RC_ERR_INVALID_CLASS\n",
              "return: associators(): CMPI_RC_OK\n",
              "an associator of class Test_Base was not found: 6\n",
+             "return: invokeMethod(): CMPI_RC_ERR_FAILED MetaClass not found\n",
+             "return: cleanup(): CMPI_RC_OK cleanup unload\n",
+             "enter: ~CMPI_Adapter()\n",
          })
         EXPECT_NE(log.find(line), std::string::npos) << line << "in\n" << log;
 }

@@ -103,6 +103,19 @@ TEST(Keys, AllTypesTellInstancesApart) {
     }
 }
 
+TEST(Keys, AssociationPointsToInstance) {
+    const auto link = own(make_link(make_leaf("l"), make_base("r", 1)));
+    const auto leaf = own(make_leaf("l"));
+    const auto base = own(make_base("r", 1));
+    const auto other = own(make_base("r", 2));
+    EXPECT_TRUE(is_reference_to(link.get(), leaf.get(), ""));
+    EXPECT_TRUE(is_reference_to(link.get(), leaf.get(), nullptr));
+    EXPECT_TRUE(is_reference_to(link.get(), base.get(), "RIGHT"));
+    EXPECT_FALSE(is_reference_to(link.get(), base.get(), "Left"));
+    EXPECT_FALSE(is_reference_to(link.get(), base.get(), "Nobody"));
+    EXPECT_FALSE(is_reference_to(link.get(), other.get(), ""));
+}
+
 // ---- The store ----
 
 TEST(InstanceMap, AnswersProviderStatus) {
@@ -141,6 +154,28 @@ TEST(InstanceMap, AnswersProviderStatus) {
     EXPECT_EQ(map[0], nullptr);
 }
 
+TEST(InstanceMap, EnumeratesClonesInOrderUntilToldToStop) {
+    Instance_Map<Test_Base> map;
+    for (const char* id : {"c", "a", "b"})
+        EXPECT_GE(map.insert(make_base(id, 0)), 0);
+    struct Seen {
+        std::string ids;
+        std::size_t limit;
+    };
+    const auto collect = [](Instance* instance, sint32, void* data) {
+        auto* seen = static_cast<Seen*>(data);
+        Ref<Test_Base> base(instance);
+        seen->ids += base->Id.value.c_str();
+        return seen->ids.size() < seen->limit;
+    };
+    Seen all{"", 100};
+    EXPECT_EQ(map.enum_instances(Enum_Instances_Handler(collect, &all)), 0);
+    EXPECT_EQ(all.ids, "cab");
+    Seen some{"", 2};
+    EXPECT_EQ(map.enum_instances(Enum_Instances_Handler(collect, &some)), 0);
+    EXPECT_EQ(some.ids, "ca");
+}
+
 // Against a plain list, through inserts and removals: phases in which it grows, and shrinks.
 TEST(InstanceMap, IndexFollowsEveryChange) {
     Instance_Map<Test_Base> map;
@@ -176,6 +211,55 @@ TEST(InstanceMap, IndexFollowsEveryChange) {
     map.clear();
     EXPECT_EQ(map.find(own(make_base("id1", 7)).get()), -1);
     EXPECT_EQ(map.insert(make_base("id1", 7)), 0);
+}
+
+TEST(InstanceMap, SubclassMatchesBaseKey) {
+    Instance_Map<Test_Base> map;
+    auto* sub = create_null<Test_Sub>();
+    sub->Id.set("a");
+    sub->Slot.set(1);
+    EXPECT_EQ(map.insert(sub), 0);
+    const auto base = own(make_base("a", 1));
+    EXPECT_EQ(map.find(base.get()), 0);
+    EXPECT_EQ(map.create_instance(base.get()), CREATE_INSTANCE_DUPLICATE);
+    const auto stranger = own(create_null<Test_Stranger>());
+    stranger->ID.set("a");
+    stranger->SLOT.set(1);
+    EXPECT_EQ(map.find(stranger.get()), 0);
+}
+
+// Members whose keys are of several shapes: an index by hash alone would miss the one-way matches.
+TEST(InstanceMap, KeylessReferenceMatchesFirstMember) {
+    Instance_Map<Test_Link> map;
+    EXPECT_EQ(map.insert(make_link(make_leaf("x"), make_base("r", 1))), 0);
+    EXPECT_EQ(map.insert(make_link(make_leaf("y"), make_base("r", 1))), 1);
+    EXPECT_EQ(map.insert(make_link(nullptr, make_base("r", 1))), 2);
+    const auto any = own(make_link(create<Test_Root>(), make_base("r", 1)));
+    EXPECT_EQ(map.find(any.get()), 0);
+    const auto none = own(make_link(create<Test_Root>(), make_base("r", 2)));
+    EXPECT_EQ(map.find(none.get()), -1);
+    Ref<Instance> first(map[0]);
+    map.remove(0);
+    EXPECT_EQ(map.find(any.get()), 0);
+    EXPECT_EQ(map.find(own(make_link(make_leaf("y"), make_base("r", 1))).get()), 0);
+    EXPECT_EQ(map.find(own(make_link(nullptr, make_base("r", 1))).get()), 1);
+}
+
+TEST(InstanceMap, StaysRightWhenAModificationWidensAKeyReference) {
+    Instance_Map<Test_Link> map;
+    EXPECT_EQ(map.insert(make_link(make_leaf("x"), make_base("r", 1))), 0);
+    const auto any = own(make_link(create<Test_Root>(), make_base("r", 1)));
+    EXPECT_EQ(map.modify_instance(nullptr, any.get()), 0);
+    EXPECT_EQ(map[0]->Left->__meta_class, &Test_Root::static_meta_class);
+    EXPECT_EQ(map.find(any.get()), 0);
+    EXPECT_EQ(map.find(own(make_link(make_leaf("x"), make_base("r", 1))).get()), -1);
+}
+
+TEST(InstanceMap, WithoutKeysHoldsOneMember) {
+    Instance_Map<Test_Root> map;
+    EXPECT_EQ(map.insert(create<Test_Root>()), 0);
+    const auto second = own(create<Test_Root>());
+    EXPECT_EQ(map.create_instance(second.get()), CREATE_INSTANCE_DUPLICATE);
 }
 
 } // namespace

@@ -7,6 +7,7 @@
 
 #include <map>
 #include <memory>
+#include <optional>
 #include <string>
 #include <utility>
 #include <vector>
@@ -31,6 +32,7 @@ struct Data {
     std::vector<std::pair<std::string, Value>> members; // properties, keys or arguments
     std::vector<Value> elements;                        // of an array or enumeration
     Data_Ref path;                                      // of an instance
+    std::optional<std::vector<std::string>> filter;     // of an instance: property list and keys
 
     const Value* find(const std::string& name) const;
     std::string string(const std::string& name) const; // text of a string member
@@ -68,15 +70,18 @@ public:
 
     // Objects that the engine caused and has not released, and the end of a call, which frees them.
     int live() const { return _live; }
+    int released_parameters = 0; // faults of the engine
     void end_call();
 
     // Script: the named table functions fail; all calls, or the n-th from now.
     std::map<std::string, int> failures; // name to countdown, 0: every call
+    std::map<std::string, int> calls;    // name to number of calls
     std::vector<Data_Ref> upcall_instances;
     std::vector<std::string> upcalls; // "getInstance ns:Class"
     CMPIrc upcall_status = CMPI_RC_OK;
     Members method_outputs;
     Value method_result;
+    std::string principal;
 
     // What came back.
     std::vector<Data_Ref> returned_paths;
@@ -94,9 +99,6 @@ public:
     void keep(Handle* handle); // an array takes its element over
 
 private:
-    template <class Object>
-    Object* parameter(const void* table, Data_Ref data);
-
     int _live = 0;
     std::vector<std::unique_ptr<Handle>> _handles;
 };

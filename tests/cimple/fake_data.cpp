@@ -18,7 +18,9 @@ std::string Data::string(const std::string& name) const {
 }
 
 Value text(const char* chars) {
-    return object(CMPI_string, path_data("", chars));
+    auto data = std::make_shared<Data>();
+    data->text = chars;
+    return object(CMPI_string, data);
 }
 
 Value number(CMPIType type, unsigned long long value) {

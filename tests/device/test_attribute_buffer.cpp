@@ -54,6 +54,10 @@ TEST(Attribute_Buffer, ValuesBesideItAreRefusedAndThoseAtItsEndAreCut) {
         EXPECT_EQ(getAttributeNumber(ADAPTER_FAMILY, buffer, 1, "", &number) == AX_STATUS_OK,
                   row.number);
         EXPECT_EQ(number, row.number ? 0x76767676U : 7U) << row.offset;
+        std::string bytes(SIZE + 16, '.');
+        AX_STATUS status = AX_STATUS_OK;
+        buffer.readUpTo(1, bytes.data(), bytes.size(), status);
+        EXPECT_EQ(bytes, std::string(row.length, 'v') + std::string(SIZE + 16 - row.length, '.'));
     }
     unloadRuntimeLibraries();
     VLN_Runtime_Loader::setCalls(nullptr);

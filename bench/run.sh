@@ -59,15 +59,16 @@ done
 # for it differs between machines (its string functions, the state of the heap). How often a pass ran
 # is read from the same file.
 count "--toggle-collect=cimple::ProviderAgent::rebuildAdapterData()
-       --toggle-collect=cimple::ProviderAgent::rebuildAdapterMaps() --compress-strings=no" \
+       --toggle-collect=cimple::ProviderAgent::rebuildAdapterMaps(*) --compress-strings=no" \
     "$host" refresh 1 >"$work/all"
 read -r made _ <"$work/result"
 read -r own passes <<<"$(awk '
     /^ob=/ { ours = /vln_bench_module/ }
-    /^cfn=/ { of_a_pass = /rebuildAdapterMaps\(\)$/ }
+    /^cfn=/ { of_a_pass = /rebuildAdapterMaps\([^()]*\)$/ }
     /^calls=/ { if (of_a_pass) { sub("calls=", ""); passes += $1 } getline; next }
     ours && /^[-+*0-9]/ { own += $2 }
     END { printf "%.0f %d", own, passes }' "$work/out")"
+[ "$passes" -gt 0 ] || { echo "bench: no adapter pass was seen; have its functions other names?" >&2; exit 1; }
 read -r _ time <<<"$("$host" refresh 1)"
 echo
 awk -v own="$own" -v all="$(cat "$work/all")" -v time="$time" -v made="$made" -v passes="$passes" 'BEGIN {

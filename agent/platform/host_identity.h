@@ -1,5 +1,5 @@
-// What the provider asks the host's resolver about itself. Tests replace it; the product never
-// does.
+// What the provider asks the host's resolver about itself. The module for simulation is linked with
+// another source of it.
 #ifndef VLN_AGENT_PLATFORM_HOST_IDENTITY_H
 #define VLN_AGENT_PLATFORM_HOST_IDENTITY_H
 
@@ -17,7 +17,6 @@ struct Host_Queries {
 };
 
 const Host_Queries& host_queries();
-void replace_host_queries(const Host_Queries* queries); // null: the system's own
 
 } // namespace cimple
 

@@ -50,10 +50,10 @@ private:
     struct NIC_Function {
         NICAdapter* adapter;
         const NICAdapterAttributes* attributes;
-        VLNMPCA_Product* product;
-        VLNMPCA_Card* card;
+        const VLNMPCA_Product* product;
+        const VLNMPCA_Card* card;
         bool new_card; // made for this function, and not yet tied to its surroundings
-        VLNMPCA_Chip* chip = nullptr;
+        const VLNMPCA_Chip* chip = nullptr;
     };
     // One port of it.
     struct NIC_Port {
@@ -62,12 +62,12 @@ private:
         uint32 index;             // among the ports of its adapter
         String name;              // of the device model: 16 digits
         String serial_and_number; // "serial:port number", which functions of one connector share
-        VLNMPCA_PhysicalConnector* connector = nullptr;
-        VLNMPCA_EthernetPort* ethernet_port = nullptr;
-        VLNMPCA_LANEndpoint* lan_endpoint = nullptr;
-        VLNMPCA_PortController* port_controller = nullptr;
+        const VLNMPCA_PhysicalConnector* connector = nullptr;
+        const VLNMPCA_EthernetPort* ethernet_port = nullptr;
+        const VLNMPCA_LANEndpoint* lan_endpoint = nullptr;
+        const VLNMPCA_PortController* port_controller = nullptr;
         bool new_port_controller = false; // made for this port
-        VLNMPCA_SoftwareIdentity* firmware = nullptr;
+        const VLNMPCA_SoftwareIdentity* firmware = nullptr;
     };
 
     // platform/platform_maps.cpp
@@ -83,7 +83,8 @@ private:
 
     // software/firmware_maps.cpp
     void findOrMakeFirmware(NIC_Port& port);
-    VLNMPCA_SoftwareIdentity* CreateFirmwareIdentityInstance(const NICAdapterAttributes& adapter);
+    const VLNMPCA_SoftwareIdentity*
+    CreateFirmwareIdentityInstance(const NICAdapterAttributes& adapter);
     void joinFirmwareToPort(const NIC_Port& port);
     void joinFirmwareToController(const NIC_Port& port);
     void joinFlashImage(const NIC_Port& port);
@@ -91,9 +92,9 @@ private:
     // hardware/card_maps.cpp
     uint32 createNICCards();
     uint32 createNICCard(NICAdapter& adapter);
-    VLNMPCA_Product* findOrMakeProduct(const NICAdapterAttributes& attributes);
-    VLNMPCA_Card* CreateMPCACardInstance(const NICAdapterAttributes& attributes);
-    void readCard(VLNMPCA_Card& card);
+    const VLNMPCA_Product* findOrMakeProduct(const NICAdapterAttributes& attributes);
+    const VLNMPCA_Card* CreateMPCACardInstance(const NICAdapterAttributes& attributes);
+    const VLNMPCA_Card* readCard(const VLNMPCA_Card& new_card);
     void tieNewCard(NIC_Function& function);
     void conformCard(const VLNMPCA_Card& card);
     void findOrMakeConnector(NIC_Port& port);
@@ -128,10 +129,10 @@ private:
     void joinIPEndpoint(const IP_Interface& interface);
 
     ProviderAgent& _agent;
-    const Platform_Objects& _platform;        // found by the up-calls
-    CIM_ComputerSystem* _system = nullptr;    // in its store
-    CIM_Chassis* _chassis = nullptr;          // in its store
-    std::vector<VLNMPCA_Card*> _untied_cards; // in their store; see createNICCard
+    const Platform_Objects& _platform;           // found by the up-calls
+    const CIM_ComputerSystem* _system = nullptr; // in its store
+    const CIM_Chassis* _chassis = nullptr;       // in its store
+    std::vector<const VLNMPCA_Card*> _untied_cards;    // in their store; see createNICCard
 };
 
 } // namespace cimple

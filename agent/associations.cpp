@@ -4,9 +4,9 @@ namespace cimple {
 
 namespace {
 
-// Sets the next reference of the association, from the given feature on, to the end. Answers the
-// feature after it, or -1 if there is none left or the end does not fit.
-sint32 set_reference(Instance* association, uint32 feature, Ref<Instance> end) {
+// Sets the next reference of the association, from the given feature on, to a share of the end.
+// Answers the feature after it, or -1 if there is none left or the end does not fit.
+sint32 set_reference(Instance* association, uint32 feature, const Instance* end) {
     const Meta_Class* meta_class = association->__meta_class;
     for (; feature < meta_class->num_meta_features; ++feature) {
         const Meta_Feature* candidate = meta_class->meta_features[feature];
@@ -15,33 +15,23 @@ sint32 set_reference(Instance* association, uint32 feature, Ref<Instance> end) {
         const auto* description = static_cast<const Meta_Reference*>(candidate);
         if (!is_subclass(description->meta_class, end->__meta_class))
             return -1;
-        reference(association, description) = end.release();
+        // An instance's references are not const, but what they share is as good as that.
+        ref(end);
+        reference(association, description) = const_cast<Instance*>(end);
         return static_cast<sint32>(feature + 1);
     }
     return -1;
 }
 
-bool set_ends(Instance* association, std::span<const Ref<Instance>> ends) {
+bool set_ends(Instance* association, Association_Ends ends) {
     sint32 feature = 0;
-    for (const Ref<Instance>& end : ends) {
+    for (const Instance* end : ends) {
         if (end)
             feature = set_reference(association, static_cast<uint32>(feature), end);
         if (!end || feature < 0)
             return false;
     }
     return true;
-}
-
-// Null, with a line in the log, if an end is null or not of the class that the reference wants.
-Ref<Instance> association_of(const Meta_Class* meta_class, std::span<const Ref<Instance>> ends) {
-    Ref<Instance> association(make_instance(meta_class));
-    if (!association) {
-        VLN_LOG(VLN_CRIT, "Could not create the instance of the Association class");
-    } else if (!set_ends(association.get(), ends)) {
-        VLN_LOG(VLN_CRIT, "Wrong input for %s", meta_class->name);
-        return {};
-    }
-    return association;
 }
 
 } // namespace
@@ -54,8 +44,8 @@ Instance* make_instance(const Meta_Class* meta_class) {
     return instance;
 }
 
-Instance* insert_instance(Instance_Map_Base& store, Ref<Instance> instance,
-                          const Insert_Failure& failure) {
+const Instance* insert_instance(Instance_Map_Base& store, Ref<Instance> instance,
+                                const Insert_Failure& failure) {
     if (!instance)
         return nullptr;
     if (store.insert(instance.get()) >= 0)
@@ -67,34 +57,46 @@ Instance* insert_instance(Instance_Map_Base& store, Ref<Instance> instance,
     return nullptr;
 }
 
-Instance* associate(Instance_Map_Base& store, const Instance* first, const Instance* second,
-                    const Insert_Failure& failure) {
-    const Ref<Instance> ends[] = {association_end(first), association_end(second)};
-    return associate(store, ends, failure);
+Ref<Instance> association_of(const Meta_Class* meta_class, Association_Ends ends) {
+    Ref<Instance> association(make_instance(meta_class));
+    if (!association) {
+        VLN_LOG(VLN_CRIT, "Could not create the instance of the Association class");
+    } else if (!set_ends(association.get(), ends)) {
+        VLN_LOG(VLN_CRIT, "Wrong input for %s", meta_class->name);
+        return {};
+    }
+    return association;
 }
 
-Ref<Instance> association_end(const Instance* instance) {
-    return Ref<Instance>(instance ? clone(instance) : nullptr);
+const Instance* associate(Instance_Map_Base& store, Association_Ends ends,
+                          const Insert_Failure& failure, const Association_Details& details) {
+    auto association = association_of(store.meta_class(), ends);
+    if (association && details)
+        details(*association);
+    return insert_instance(store, std::move(association), failure);
 }
 
-Instance* associate(Instance_Map_Base& store, std::span<const Ref<Instance>> ends,
-                    const Insert_Failure& failure) {
-    return insert_instance(store, association_of(store.meta_class(), ends), failure);
+const Instance* associate(Instance_Map_Base& store, const Instance* first, const Instance* second,
+                          const Insert_Failure& failure, const Association_Details& details) {
+    return associate(store, {first, second}, failure, details);
 }
 
-Instance* associate_once(Instance_Map_Base& store, const Instance* first, const Instance* second,
-                         const Insert_Failure& failure) {
-    const Ref<Instance> ends[] = {association_end(first), association_end(second)};
-    const auto association = association_of(store.meta_class(), ends);
+const Instance* associate_once(Instance_Map_Base& store, const Instance* first,
+                               const Instance* second, const Insert_Failure& failure,
+                               const Association_Details& details) {
+    auto association = association_of(store.meta_class(), {first, second});
     if (association && store.lookup(association.get()))
         return nullptr;
-    return insert_instance(store, association, failure);
+    if (association && details)
+        details(*association);
+    return insert_instance(store, std::move(association), failure);
 }
 
-Instance* associate_as(Instance_Map_Base& store, const String& text, const Instance* first,
-                       const Instance* second, const Insert_Failure& failure) {
+const Instance* associate_as(Instance_Map_Base& store, const String& text, const Instance* first,
+                             const Instance* second, const Insert_Failure& failure,
+                             const Association_Details& details) {
     VLN_LOG(VLN_DBG, "Generating %s (%s)", store.meta_class()->name, text.c_str());
-    return associate(store, first, second, failure);
+    return associate(store, first, second, failure, details);
 }
 
 } // namespace cimple

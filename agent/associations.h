@@ -9,7 +9,8 @@
 #include "classes/CIM_ComputerSystem.h"
 #include "foundation/logger.h"
 
-#include <span>
+#include <functional>
+#include <initializer_list>
 
 namespace cimple {
 
@@ -42,38 +43,45 @@ struct Insert_Failure {
 
 // Hands the instance to the store. On a duplicate key it logs the failure, destroys the instance
 // and answers null; otherwise the store owns what is answered.
-Instance* insert_instance(Instance_Map_Base& store, Ref<Instance> instance,
-                          const Insert_Failure& failure = {});
+const Instance* insert_instance(Instance_Map_Base& store, Ref<Instance> instance,
+                                const Insert_Failure& failure = {});
 
 template <class T>
-T* insert_instance(Instance_Map<T>& store, Ref<T> instance, const Insert_Failure& failure = {}) {
-    return static_cast<T*>(insert_instance(static_cast<Instance_Map_Base&>(store),
-                                           Ref<Instance>(instance.release()), failure));
+const T* insert_instance(Instance_Map<T>& store, Ref<T> instance,
+                         const Insert_Failure& failure = {}) {
+    return static_cast<const T*>(insert_instance(static_cast<Instance_Map_Base&>(store),
+                                                 Ref<Instance>(instance.release()), failure));
 }
 
-// Joins two instances: makes an instance of the store's class whose references, in the order in
-// which the class declares them, are clones of the ends. Answers the instance, owned by the store,
-// or null with a line in the log: an end is null or not of the class that the reference wants, or
-// the store holds the association already.
-Instance* associate(Instance_Map_Base& store, const Instance* first, const Instance* second,
-                    const Insert_Failure& failure = {});
+// An association whose references, in the order in which the class declares them, share the ends.
+// Null, with a line in the log, if an end is null or not of the class that the reference wants.
+using Association_Ends = std::initializer_list<const Instance*>;
+Ref<Instance> association_of(const Meta_Class* meta_class, Association_Ends ends);
+
+// Joins two instances: makes an instance of the store's class as association_of does. Answers
+// the instance, owned by the store, or null with a line in the log: it could not be made, or the
+// store holds the association already.
+// What it tells beside its ends is set by details, before the store has it.
+using Association_Details = std::function<void(Instance& association)>;
+const Instance* associate(Instance_Map_Base& store, const Instance* first, const Instance* second,
+                          const Insert_Failure& failure = {},
+                          const Association_Details& details = {});
 
 // The same for two that may be joined already, by another function of the same hardware: then
 // nothing is done, and null answered without a line.
-Instance* associate_once(Instance_Map_Base& store, const Instance* first, const Instance* second,
-                         const Insert_Failure& failure = {});
+const Instance* associate_once(Instance_Map_Base& store, const Instance* first,
+                               const Instance* second, const Insert_Failure& failure = {},
+                               const Association_Details& details = {});
 
-// What an association holds of an end: a clone, taken now. Null for no instance.
-Ref<Instance> association_end(const Instance* instance);
-
-// The same for any number of ends that are clones already. Associations may share them: an end is
-// never changed, so that thousands of paths to one target need no more than one.
-Instance* associate(Instance_Map_Base& store, std::span<const Ref<Instance>> ends,
-                    const Insert_Failure& failure = {});
+// The same for any number of ends.
+const Instance* associate(Instance_Map_Base& store, Association_Ends ends,
+                          const Insert_Failure& failure = {},
+                          const Association_Details& details = {});
 
 // The same for two ends after a line that tells the class and, in the text, who is joined.
-Instance* associate_as(Instance_Map_Base& store, const String& text, const Instance* first,
-                       const Instance* second, const Insert_Failure& failure = {});
+const Instance* associate_as(Instance_Map_Base& store, const String& text, const Instance* first,
+                             const Instance* second, const Insert_Failure& failure = {},
+                             const Association_Details& details = {});
 
 } // namespace cimple
 

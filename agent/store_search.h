@@ -11,7 +11,8 @@ namespace cimple {
 // The instance with that key, which is the only one of its class, or the only one beside the name
 // of the class itself; null for none.
 template <class T, class Owner>
-T* find_by_key(const Instance_Map<T>& store, Property<String> Owner::*key, const String& value) {
+const T* find_by_key(const Instance_Map<T>& store, Property<String> Owner::*key,
+                     const String& value) {
     auto model = make_instance<T>();
     if constexpr (requires { model->CreationClassName; })
         model->CreationClassName.set(T::static_meta_class.name);
@@ -21,8 +22,8 @@ T* find_by_key(const Instance_Map<T>& store, Property<String> Owner::*key, const
 
 // The same for an instance that is weak to the host's computer system.
 template <class T, class Owner>
-T* find_in_system(const Instance_Stores& stores, const Instance_Map<T>& store,
-                  Property<String> Owner::*key, const String& value) {
+const T* find_in_system(const Instance_Stores& stores, const Instance_Map<T>& store,
+                        Property<String> Owner::*key, const String& value) {
     const CIM_ComputerSystem* system = stores.m_CIM_ComputerSystem_map[0];
     if (!system)
         return nullptr;
@@ -34,7 +35,7 @@ T* find_in_system(const Instance_Stores& stores, const Instance_Map<T>& store,
 
 // The first instance for which wanted(const T&) holds, in insertion order, or null.
 template <class T, class Predicate>
-T* find_first(const Instance_Map<T>& store, Predicate wanted) {
+const T* find_first(const Instance_Map<T>& store, Predicate wanted) {
     for (uint32 i = 0; i < store.size(); ++i)
         if (wanted(*store[i]))
             return store[i];
@@ -43,7 +44,7 @@ T* find_first(const Instance_Map<T>& store, Predicate wanted) {
 
 // The same from the newest to the oldest.
 template <class T, class Predicate>
-T* find_last(const Instance_Map<T>& store, Predicate wanted) {
+const T* find_last(const Instance_Map<T>& store, Predicate wanted) {
     for (uint32 i = store.size(); i-- > 0;)
         if (wanted(*store[i]))
             return store[i];

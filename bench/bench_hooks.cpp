@@ -20,7 +20,7 @@ unsigned vln_bench_fill(unsigned count) {
     Auto_Mutex lock(agent->m_DataMutex);
     auto& store = agent->m_VLNMPCA_EthernetPort_map;
     for (unsigned number = 0; store.size() != 0 && store.size() < count; ++number) {
-        auto* port = static_cast<VLNMPCA_EthernetPort*>(clone(store[0]));
+        auto* port = static_cast<VLNMPCA_EthernetPort*>(clone(store.at(0)));
         char name[32];
         std::snprintf(name, sizeof name, "10000090FA%06X", number);
         port->DeviceID.set(name);

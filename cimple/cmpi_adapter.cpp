@@ -320,7 +320,8 @@ CMPIStatus run_call(void* handle, const CMPIContext* context, const char* functi
 
 bool deliver_path(Delivery& delivery, const Instance* instance, const char* name_space) {
     cmpi::Scoped<CMPIObjectPath> path;
-    delivery.error = make_cmpi_object_path(delivery.call.broker, instance, name_space, path.out());
+    delivery.error = make_cmpi_object_path(delivery.call.broker, instance, name_space, path.out(),
+                                           &delivery.ends);
     if (delivery.error != CMPI_RC_OK)
         return false;
     cmpi::return_path(delivery.result, path.get());
@@ -330,12 +331,13 @@ bool deliver_path(Delivery& delivery, const Instance* instance, const char* name
 bool deliver_instance(Delivery& delivery, const Instance* instance, const char* name_space) {
     const CMPIBroker* broker = delivery.call.broker;
     cmpi::Scoped<CMPIObjectPath> path;
-    delivery.error = make_cmpi_object_path(broker, instance, name_space, path.out());
+    delivery.error =
+        make_cmpi_object_path(broker, instance, name_space, path.out(), &delivery.ends);
     if (delivery.error != CMPI_RC_OK)
         return false;
     cmpi::Scoped<CMPIInstance> object;
     delivery.error = make_CMPI_instance(broker, instance, name_space, path.get(),
-                                        delivery.properties, object.out());
+                                        delivery.properties, object.out(), &delivery.ends);
     if (delivery.error != CMPI_RC_OK)
         return false;
     cmpi::return_instance(delivery.result, object.get());

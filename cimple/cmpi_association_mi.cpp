@@ -26,10 +26,6 @@ constexpr Status_Row REFERENCES_STATUS[] = {
     {ENUM_REFERENCES_ACCESS_DENIED, CMPI_RC_ERR_ACCESS_DENIED},
 };
 
-// A source that cannot stand at any end has no associations: the answer is OK. The trace of three
-// of the functions shows 5 for it all the same, which is meant.
-constexpr Answer UNKNOWN_SOURCE(CMPI_RC_OK, CMPI_RC_ERR_INVALID_CLASS);
-
 // What an association operation is asked for; absent texts are "".
 struct Request {
     const Instance* source;
@@ -112,8 +108,8 @@ struct Associator_Match {
     void* client_data;
 };
 
-bool pass_associators(Instance* instance, sint32, void* client_data) {
-    const Ref<Instance> association(instance);
+bool pass_associators(const Instance* instance, sint32, void* client_data) {
+    const Ref<const Instance> association(instance);
     if (!instance)
         return false;
     const auto* match = static_cast<Associator_Match*>(client_data);
@@ -121,7 +117,7 @@ bool pass_associators(Instance* instance, sint32, void* client_data) {
     const int count = collect_associators(match->request, instance, targets);
     for (int i = 0; i < count; i++) {
         ref(targets[i]);
-        match->handler(const_cast<Instance*>(targets[i]), 0, match->client_data);
+        match->handler(targets[i], 0, match->client_data);
     }
     return true; // whatever the handler says: it forwards nothing after an error
 }
@@ -160,8 +156,8 @@ struct Reference_Match {
     void* client_data;
 };
 
-bool pass_reference(Instance* instance, sint32, void* client_data) {
-    Ref<Instance> association(instance);
+bool pass_reference(const Instance* instance, sint32, void* client_data) {
+    Ref<const Instance> association(instance);
     if (!instance)
         return false;
     const auto* match = static_cast<Reference_Match*>(client_data);
@@ -195,17 +191,17 @@ sint32 enum_references_with_fallback(const Call& call, const Instance* source,
 
 // ---- Delivery ----
 
-bool deliver_associator_name(Delivery& delivery, Instance* instance) {
+bool deliver_associator_name(Delivery& delivery, const Instance* instance) {
     return deliver_path(delivery, instance, own_name_space(instance, delivery.name_space.c_str()));
 }
 
-bool deliver_associator(Delivery& delivery, Instance* instance) {
+bool deliver_associator(Delivery& delivery, const Instance* instance) {
     return deliver_instance(delivery, instance, delivery.name_space.c_str());
 }
 
 // An association holds no more of its ends than their keys are sure to be: the object manager is
 // asked for the rest. One that is gone meanwhile is left out.
-bool deliver_fetched_associator(Delivery& delivery, Instance* instance) {
+bool deliver_fetched_associator(Delivery& delivery, const Instance* instance) {
     const CMPIBroker* broker = delivery.call.broker;
     cmpi::Scoped<CMPIObjectPath> path;
     delivery.error = make_cmpi_object_path(
@@ -223,46 +219,72 @@ bool deliver_fetched_associator(Delivery& delivery, Instance* instance) {
     return true;
 }
 
-bool deliver_reference(Delivery& delivery, Instance* instance) {
+bool deliver_reference(Delivery& delivery, const Instance* instance) {
     return deliver_instance(delivery, instance, delivery.name_space.c_str());
 }
 
-bool deliver_reference_name(Delivery& delivery, Instance* instance) {
-    nullify_non_keys(instance);
+bool deliver_reference_name(Delivery& delivery, const Instance* instance) {
     return deliver_path(delivery, instance, delivery.name_space.c_str());
 }
 
 // ---- The functions ----
 
-// The source of a request by its path; keys that the path lacks are null. A class that the library
-// does not know is some platform's: it is taken as derived from the first end that it could stand
-// at, and null if there is none.
-Ref<Instance> make_source(const Call& call, const CMPIObjectPath* path, const char* role) {
-    const Converter converter = call.converter(path);
-    if (const Meta_Class* meta_class = call.find_class(path))
-        return make_cimple_reference(converter, meta_class, path);
-    const Meta_Class* association = call.adapter.meta_class;
-    for (uint32 i = 0; path && association && i < association->num_meta_features; i++) {
+// Calls visit(reference) for each end of the association at which the source may stand, until one
+// answers true: then true.
+template <class Visit>
+bool any_end(const Meta_Class* association, const char* role, Visit visit) {
+    for (uint32 i = 0; association && i < association->num_meta_features; i++) {
         if (!(association->meta_features[i]->flags & FLAG_REFERENCE))
             continue;
         const auto* end = static_cast<const Meta_Reference*>(association->meta_features[i]);
-        if (end->subscript != 0 || !name_accepted(role, end->name))
-            continue;
-        if (Ref<Instance> source = make_foreign_reference(converter, end->meta_class, path))
-            return source;
+        if (end->subscript == 0 && name_accepted(role, end->name) && visit(end))
+            return true;
     }
-    return {};
+    return false;
+}
+
+// The source of a request; null for one that stands at no end of the association, which has
+// nothing to say about it: the answer is OK. For a class that nobody knows the trace of three of
+// the functions shows 5 all the same, which is meant.
+struct Request_Source {
+    Ref<Instance> instance;
+    Answer nothing = CMPI_RC_OK;
+};
+
+// The source by its path; keys that the path lacks are null. Most providers that an unfiltered
+// query reaches have no end for it: they are done here, before anything is made of the path. A
+// class that the library does not know is some platform's: it is taken as derived from the first
+// end that it could stand at.
+Request_Source make_source(const Call& call, const CMPIObjectPath* path, const char* role) {
+    const Meta_Class* association = call.adapter.meta_class;
+    Request_Source source;
+    if (const Meta_Class* meta_class = call.find_class(path)) {
+        const auto accepts = [meta_class](const Meta_Reference* end) {
+            return is_subclass(end->meta_class, meta_class);
+        };
+        // A class that is no association is left to the operation, which fails for it.
+        if (!is_association(call) || any_end(association, "", accepts))
+            source.instance = make_cimple_reference(call.converter(path), meta_class, path);
+        return source;
+    }
+    source.nothing = Answer(CMPI_RC_OK, CMPI_RC_ERR_INVALID_CLASS);
+    any_end(path ? association : nullptr, role, [&](const Meta_Reference* end) {
+        source.instance = make_foreign_reference(call.converter(path), end->meta_class, path);
+        return static_cast<bool>(source.instance);
+    });
+    return source;
 }
 
 CMPIStatus associator_names(CMPIAssociationMI* mi, const CMPIContext* context,
                             const CMPIResult* result, const CMPIObjectPath* path, const char*,
                             const char* result_class, const char* role, const char* result_role) {
     return run_call(mi, context, "associatorNames", [&](const Call& call) -> Answer {
-        const Ref<Instance> source = make_source(call, path, text(role));
-        if (!source)
-            return UNKNOWN_SOURCE;
+        const Request_Source source = make_source(call, path, text(role));
+        if (!source.instance)
+            return source.nothing;
         Delivery delivery = {call, result, path, nullptr, cmpi::name_space(path)};
-        const Request request = {source.get(), text(result_class), text(role), text(result_role)};
+        const Request request = {source.instance.get(), text(result_class), text(role),
+                                 text(result_role)};
         return map_status(ASSOCIATOR_NAMES_STATUS,
                           enum_associator_names_with_fallback(
                               call, request, delivery_handler<deliver_associator_name>, &delivery));
@@ -273,11 +295,12 @@ CMPIStatus associators(CMPIAssociationMI* mi, const CMPIContext* context, const 
                        const CMPIObjectPath* path, const char*, const char* result_class,
                        const char* role, const char* result_role, const char** properties) {
     return run_call(mi, context, "associators", [&](const Call& call) -> Answer {
-        const Ref<Instance> source = make_source(call, path, text(role));
-        if (!source)
+        const Request_Source source = make_source(call, path, text(role));
+        if (!source.instance)
             return CMPI_RC_OK; // here the trace shows the answer, unlike in the other functions
         Delivery delivery = {call, result, path, properties, cmpi::name_space(path)};
-        const Request request = {source.get(), text(result_class), text(role), text(result_role)};
+        const Request request = {source.instance.get(), text(result_class), text(role),
+                                 text(result_role)};
         const sint32 status =
             call.provider(OP_ENUM_ASSOCIATORS, request.source, request.result_class, request.role,
                           request.result_role, &delivery_handler<deliver_associator>, &delivery);
@@ -302,16 +325,16 @@ CMPIStatus run_references(CMPIAssociationMI* mi, const CMPIContext* context, con
                           const CMPIResult* result, const CMPIObjectPath* path, const char* role,
                           const char** properties, Instance_Proc handler) {
     return run_call(mi, context, function, [&](const Call& call) -> Answer {
-        const Ref<Instance> source = make_source(call, path, text(role));
-        if (!source)
-            return UNKNOWN_SOURCE;
+        const Request_Source source = make_source(call, path, text(role));
+        if (!source.instance)
+            return source.nothing;
         const Ref<Instance> model = make_association_model(call);
         if (properties)
             filter_properties(model.get(), properties, true);
         Delivery delivery = {call, result, path, properties, cmpi::name_space(path)};
         return map_status(REFERENCES_STATUS,
-                          enum_references_with_fallback(call, source.get(), model.get(), text(role),
-                                                        handler, &delivery));
+                          enum_references_with_fallback(call, source.instance.get(), model.get(),
+                                                        text(role), handler, &delivery));
     });
 }
 

@@ -111,6 +111,7 @@ struct Delivery {
     const char** properties;    // null: all
     String name_space;          // of the path
     int error = CMPI_RC_OK;     // the first; nothing is forwarded after it
+    End_Paths ends = {};        // what the delivered associations refer to
 };
 
 // Returns the path of the instance, or the instance, in this namespace. An error is kept; false
@@ -120,18 +121,13 @@ bool deliver_instance(Delivery& delivery, const Instance* instance, const char* 
 
 // An instance handler for a delivery: takes over the instance and gives it to the function unless
 // the stream has ended or an error is kept.
-template <bool (*Deliver)(Delivery& delivery, Instance* instance)>
-bool delivery_handler(Instance* instance, sint32, void* client_data) {
-    const Ref<Instance> owner(instance);
+template <bool (*Deliver)(Delivery& delivery, const Instance* instance)>
+bool delivery_handler(const Instance* instance, sint32, void* client_data) {
+    const Ref<const Instance> owner(instance);
     Delivery& delivery = *static_cast<Delivery*>(client_data);
     if (!instance || delivery.error != CMPI_RC_OK)
         return false;
     return Deliver(delivery, instance);
-}
-
-// Instances that were passed on keep their own namespace.
-inline const char* own_name_space(const Instance* instance, const char* otherwise) {
-    return instance->__name_space.empty() ? otherwise : instance->__name_space.c_str();
 }
 
 } // namespace cimple

@@ -65,11 +65,11 @@ int make_instance(const Call& call, const CMPIObjectPath* path, const CMPIInstan
 
 // ---- enumInstanceNames, enumInstances ----
 
-bool deliver_enumerated_path(Delivery& delivery, Instance* instance) {
+bool deliver_enumerated_path(Delivery& delivery, const Instance* instance) {
     return deliver_path(delivery, instance, delivery.name_space.c_str());
 }
 
-bool deliver_enumerated_instance(Delivery& delivery, Instance* instance) {
+bool deliver_enumerated_instance(Delivery& delivery, const Instance* instance) {
     return deliver_instance(delivery, instance, delivery.name_space.c_str());
 }
 
@@ -116,11 +116,11 @@ CMPIStatus enum_instances(CMPIInstanceMI* mi, const CMPIContext* context, const 
 
 struct Key_Search {
     const Instance* model;
-    Ref<Instance> found;
+    Ref<const Instance> found;
 };
 
-bool keep_match(Instance* instance, sint32, void* client_data) {
-    Ref<Instance> owner(instance);
+bool keep_match(const Instance* instance, sint32, void* client_data) {
+    const Ref<const Instance> owner(instance);
     auto* search = static_cast<Key_Search*>(client_data);
     if (!instance || search->found)
         return false;
@@ -132,7 +132,8 @@ bool keep_match(Instance* instance, sint32, void* client_data) {
 
 // A provider that cannot look up a single instance is enumerated instead: most providers write no
 // more than their enumeration.
-sint32 get_instance_with_fallback(const Call& call, const Instance* model, Ref<Instance>& found) {
+sint32 get_instance_with_fallback(const Call& call, const Instance* model,
+                                  Ref<const Instance>& found) {
     Instance* instance = nullptr;
     const sint32 status = call.provider(OP_GET_INSTANCE, model, &instance);
     found.reset(instance);
@@ -155,7 +156,7 @@ CMPIStatus get_instance(CMPIInstanceMI* mi, const CMPIContext* context, const CM
         if (properties)
             filter_properties(model.get(), properties, true);
 
-        Ref<Instance> found;
+        Ref<const Instance> found;
         const sint32 status = get_instance_with_fallback(call, model.get(), found);
         if (status != GET_INSTANCE_OK)
             return map_status(GET_INSTANCE_STATUS, status);

@@ -47,13 +47,43 @@ Ref<Instance> make_method_instance(const Converter& converter, const Meta_Method
 int read_method_out(const Converter& converter, const CMPIArgs* args, const CMPIData& return_value,
                     Instance* method);
 
+// Instances that were passed on keep their own namespace.
+inline const char* own_name_space(const Instance* instance, const char* otherwise) {
+    return instance->__name_space.empty() ? otherwise : instance->__name_space.c_str();
+}
+
 // ---- To CMPI; the objects are the broker's, out is null on failure ----
 
+// The object paths of what a call's associations refer to, each made once for all that share the
+// end: the last few are kept, and given back at the end of the scope. Of one call and one
+// namespace.
+class End_Paths {
+public:
+    End_Paths() = default;
+    ~End_Paths();
+    End_Paths(const End_Paths&) = delete;
+    End_Paths& operator=(const End_Paths&) = delete;
+
+    CMPIObjectPath* find(const Instance* end) const noexcept;      // null: to be made
+    void keep(const Instance* end, CMPIObjectPath* path) noexcept; // takes over the path
+
+private:
+    // A result has two or three ends; one of them is often that of the results before.
+    static constexpr std::size_t KEPT = 4;
+    struct Entry {
+        Ref<const Instance> end; // held, so that no other instance gets its address
+        CMPIObjectPath* path = nullptr;
+    };
+    Entry _entries[KEPT];
+    std::size_t _oldest = 0;
+};
+
 int make_cmpi_object_path(const CMPIBroker* broker, const Instance* instance,
-                          const char* name_space, CMPIObjectPath*& out);
+                          const char* name_space, CMPIObjectPath*& out, End_Paths* ends = nullptr);
 // With a list only the properties it names, and the keys, are converted.
 int make_CMPI_instance(const CMPIBroker* broker, const Instance* instance, const char* name_space,
-                       CMPIObjectPath* path, const char** properties, CMPIInstance*& out);
+                       CMPIObjectPath* path, const char** properties, CMPIInstance*& out,
+                       End_Paths* ends = nullptr);
 // Fills args with the parameters of a method instance that have the flag (In or Out).
 int make_method_args(const CMPIBroker* broker, const char* name_space, const Instance* method,
                      uint32 flag, CMPIArgs* args);

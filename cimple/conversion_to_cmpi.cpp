@@ -63,15 +63,17 @@ const char* type_word(sint32 type) {
     return type & TYPE_ARRAY ? TYPES[element].array_word : TYPES[element].word;
 }
 
-// ---- Carriers: where a converted member goes. set copies the value, or takes it over and leaves a
-// null one. ----
+// ---- Carriers: where a converted member goes. set copies what the value points to, or takes it
+// over and leaves a null one. To those that say so a text goes as it is: CMPI_chars, for which the
+// pointer is the text itself, spares the broker an object. ----
 
 namespace {
 
 struct To_Instance {
+    static constexpr bool TAKES_CHARS = true;
     CMPIInstance* target;
-    bool set(const char* name, CMPIValue& value, CMPIType type) {
-        if (cmpi::good(target->ft->setProperty(target, name, &value, type)))
+    bool set(const char* name, const CMPIValue* value, CMPIType type) {
+        if (cmpi::good(target->ft->setProperty(target, name, value, type)))
             return true;
         CIMPLE_WARN("CMSetProperty() failed: %s", name);
         return false;
@@ -79,9 +81,10 @@ struct To_Instance {
 };
 
 struct To_Path {
+    static constexpr bool TAKES_CHARS = true;
     CMPIObjectPath* target;
-    bool set(const char* name, CMPIValue& value, CMPIType type) {
-        if (cmpi::good(target->ft->addKey(target, name, &value, type)))
+    bool set(const char* name, const CMPIValue* value, CMPIType type) {
+        if (cmpi::good(target->ft->addKey(target, name, value, type)))
             return true;
         CIMPLE_WARN("CMAddKey() failed");
         return false;
@@ -89,17 +92,18 @@ struct To_Path {
 };
 
 struct To_Args {
+    static constexpr bool TAKES_CHARS = false;
     CMPIArgs* target;
     CMPIValue* return_value; // the slot for the method's result
     CMPIType* return_type;
-    bool set(const char* name, CMPIValue& value, CMPIType type) {
+    bool set(const char* name, CMPIValue* value, CMPIType type) {
         if (return_value && name_equal(name, "return_value")) {
-            *return_value = value;
+            *return_value = *value;
             *return_type = type;
-            value.string = nullptr;
+            value->string = nullptr;
             return true;
         }
-        if (target && cmpi::good(target->ft->addArg(target, name, &value, type)))
+        if (target && cmpi::good(target->ft->addArg(target, name, value, type)))
             return true;
         CIMPLE_WARN("CMAddArg() failed");
         return false;
@@ -112,6 +116,7 @@ struct To_Args {
 struct Source {
     const CMPIBroker* broker;
     const char* name_space;
+    End_Paths* ends = nullptr; // of the call's associations, if they are kept
 };
 
 bool all_members(const Meta_Feature*) {
@@ -191,9 +196,7 @@ bool instance_value(const Source& source, const Instance* instance, bool embedde
         CIMPLE_WARN("null instance argument");
         return false;
     }
-    const Source own = {source.broker, instance->__name_space.empty()
-                                           ? source.name_space
-                                           : instance->__name_space.c_str()};
+    const Source own = {source.broker, own_name_space(instance, source.name_space)};
     if (!own.name_space || !instance->__meta_class->name) {
         CIMPLE_WARN(own.name_space ? "null classname" : "null namespace");
         return false;
@@ -251,33 +254,81 @@ bool reference_value(const Source& source, const Instance* instance, const Meta_
     return instance_array_value(source, *items, embedded, element_type, value);
 }
 
+// Passes a made value on and gives it back.
+template <class Carrier>
+bool hand_over(Carrier& carrier, const Meta_Feature* feature, bool converted, CMPIValue& value,
+               CMPIType type) {
+    if (!converted) {
+        CIMPLE_WARN("_to_cmpi_data() failed: feature=%s", feature->name);
+        return false;
+    }
+    const bool taken = carrier.set(feature->name, &value, type);
+    cmpi::release(value, type);
+    return taken;
+}
+
+template <class Carrier>
+inline bool pass_property(const Source& source, const void* from, const Meta_Property* property,
+                          Carrier& carrier) {
+    if constexpr (Carrier::TAKES_CHARS) {
+        if (property->type == TYPE_STRING && property->subscript == 0) {
+            const char* text = static_cast<const String*>(from)->c_str();
+            return carrier.set(property->name, reinterpret_cast<const CMPIValue*>(text),
+                               CMPI_chars);
+        }
+    }
+    CMPIValue value;
+    CMPIType type;
+    const bool converted = property_value(source, from, property, value, type);
+    return hand_over(carrier, property, converted, value, type);
+}
+
+// The path of an end that is kept for the results to come.
+template <class Carrier>
+bool pass_end(const Source& source, const Instance* end, const Meta_Reference* feature,
+              Carrier& carrier) {
+    CMPIValue value;
+    value.ref = source.ends->find(end);
+    if (!value.ref) {
+        if (!instance_value(source, end, false, value)) {
+            CIMPLE_WARN("_to_cmpi_data() failed: feature=%s", feature->name);
+            return false;
+        }
+        source.ends->keep(end, value.ref);
+    }
+    return carrier.set(feature->name, &value, CMPI_ref);
+}
+
+template <class Carrier>
+bool pass_reference(const Source& source, const Instance* instance, const Meta_Reference* feature,
+                    Carrier& carrier) {
+    if (source.ends && feature->subscript == 0 && !(feature->flags & FLAG_EMBEDDED))
+        return pass_end(source, reference(instance, feature), feature, carrier);
+    CMPIValue value;
+    CMPIType type;
+    const bool converted = reference_value(source, instance, feature, value, type);
+    return hand_over(carrier, feature, converted, value, type);
+}
+
 // Hands one member to the carrier unless it is null.
 template <class Carrier>
 inline void pass_member(const Source& source, const Instance* instance, const Meta_Feature* feature,
                         Carrier& carrier) {
-    CMPIValue value;
-    CMPIType type;
-    bool converted;
+    bool passed;
     if (feature->flags & FLAG_PROPERTY) {
         const auto* property = static_cast<const Meta_Property*>(feature);
         const auto* from = static_cast<const uint8*>(member(instance, property->offset));
         // Most members of most instances are null: their flags are read here, without a call.
         if (from[property->subscript ? sizeof(Array_Base) : TYPES[property->type].size])
             return;
-        converted = property_value(source, from, property, value, type);
+        passed = pass_property(source, from, property, carrier);
     } else if ((feature->flags & FLAG_REFERENCE) && !is_null(instance, feature)) {
-        converted = reference_value(source, instance, static_cast<const Meta_Reference*>(feature),
-                                    value, type);
+        passed =
+            pass_reference(source, instance, static_cast<const Meta_Reference*>(feature), carrier);
     } else {
         return;
     }
-    if (!converted) {
-        CIMPLE_WARN("_to_cmpi_data() failed: feature=%s", feature->name);
-    } else {
-        converted = carrier.set(feature->name, value, type);
-        cmpi::release(value, type);
-    }
-    if (!converted)
+    if (!passed)
         CIMPLE_WARN("conversion error: %s.%s", instance->__meta_class->name, feature->name);
 }
 
@@ -336,10 +387,32 @@ bool is_listed(const char* const* names, const char* name) {
 
 } // namespace
 
+// ---- Paths of ends ----
+
+End_Paths::~End_Paths() {
+    for (Entry& entry : _entries)
+        cmpi::release(entry.path);
+}
+
+CMPIObjectPath* End_Paths::find(const Instance* end) const noexcept {
+    for (const Entry& entry : _entries)
+        if (entry.end.get() == end)
+            return entry.path;
+    return nullptr;
+}
+
+void End_Paths::keep(const Instance* end, CMPIObjectPath* path) noexcept {
+    Entry& entry = _entries[_oldest];
+    _oldest = (_oldest + 1) % KEPT;
+    cmpi::release(entry.path);
+    entry.end = Ref<const Instance>::share(end);
+    entry.path = path;
+}
+
 // ---- Entry points ----
 
 int make_cmpi_object_path(const CMPIBroker* broker, const Instance* instance,
-                          const char* name_space, CMPIObjectPath*& out) {
+                          const char* name_space, CMPIObjectPath*& out, End_Paths* ends) {
     out = nullptr;
     if (!instance) {
         CIMPLE_WARN("ignored null instance arg");
@@ -350,13 +423,14 @@ int make_cmpi_object_path(const CMPIBroker* broker, const Instance* instance,
         CIMPLE_WARN("CMNewObjectPath() failed");
         return CMPI_RC_ERR_FAILED;
     }
-    fill_keys({broker, name_space}, instance, path);
+    fill_keys({broker, name_space, ends}, instance, path);
     out = path;
     return CMPI_RC_OK;
 }
 
 int make_CMPI_instance(const CMPIBroker* broker, const Instance* instance, const char* name_space,
-                       CMPIObjectPath* path, const char** properties, CMPIInstance*& out) {
+                       CMPIObjectPath* path, const char** properties, CMPIInstance*& out,
+                       End_Paths* ends) {
     out = nullptr;
     if (!instance) {
         CIMPLE_WARN("ignored null instance arg");
@@ -375,7 +449,7 @@ int make_CMPI_instance(const CMPIBroker* broker, const Instance* instance, const
         return CMPI_RC_ERR_FAILED;
     }
     out = target;
-    const Source source = {broker, name_space};
+    const Source source = {broker, name_space, ends};
     if (!properties) {
         fill(source, instance, To_Instance{target}, all_members);
         return CMPI_RC_OK;

@@ -1,5 +1,5 @@
-// Lower case for names, independent of the locale: CIM identifiers compare as ASCII (DSP0004), and
-// the object manager may have set any locale for its own purposes.
+// Lower case and hashes for names, independent of the locale: CIM identifiers compare as ASCII
+// (DSP0004), and the object manager may have set any locale for its own purposes.
 #ifndef CIMPLE_FOLD_H
 #define CIMPLE_FOLD_H
 
@@ -18,6 +18,20 @@ inline constexpr std::array<uint8, 256> LOWER_CASE = [] {
 
 constexpr uint8 fold(char c) noexcept {
     return LOWER_CASE[static_cast<uint8>(c)];
+}
+
+// The same for names that differ in case only.
+constexpr uint64 name_hash(const char* name) noexcept {
+    uint64 hash = 0xCBF29CE484222325u; // FNV-1a
+    for (; *name; ++name)
+        hash = (hash ^ fold(*name)) * 0x100000001B3u;
+    return hash;
+}
+
+// Where in a table of so many slots, a power of two, the search for a name begins.
+constexpr uint32 name_slot(const char* name, uint32 slots) noexcept {
+    const uint64 hash = name_hash(name);
+    return static_cast<uint32>(hash ^ hash >> 32) & (slots - 1);
 }
 
 } // namespace cimple

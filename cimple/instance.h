@@ -3,7 +3,9 @@
 // A generated structure derives from its base class's structure and adds the members the class
 // declares, so a VLNMPCA_Card* is a CIM_Card* is an Instance*. Instances live on the heap, are made
 // by create or clone, and are counted: whoever gets one from an operation here owns one count. None
-// of these operations locks; an instance that two threads share must not be written.
+// of these operations locks. An instance with more than one count is shared, and must not be
+// written: Ref<const C> is a share, whoever wants to write makes a copy (a store: `change`,
+// instance_map.h). What an association refers to is shared as well.
 #ifndef CIMPLE_INSTANCE_H
 #define CIMPLE_INSTANCE_H
 
@@ -14,6 +16,7 @@
 #include "cimple/string.h"
 
 #include <cstdio>
+#include <type_traits>
 
 namespace cimple {
 
@@ -68,6 +71,10 @@ Instance* create(const Meta_Class* meta_class, bool defaults = false);
 // Throws std::bad_alloc.
 Instance* clone(const Instance* instance);
 void ref(const Instance* instance) noexcept;
+// Whether somebody else has a count too.
+inline bool is_shared(const Instance* instance) noexcept {
+    return instance->__refs.load(std::memory_order_acquire) > 1;
+}
 // Drops one count and destroys at zero. A null pointer is allowed here and in destroy.
 void unref(const Instance* instance) noexcept;
 // Tears down and frees whatever the count.
@@ -172,16 +179,22 @@ T* create_null() {
     return instance;
 }
 
-// A counted pointer. Made from a raw pointer it takes over the caller's count, and holds null if
-// the instance is not of T's class.
+// A counted pointer, to a const class where the instance is not to be written. Made from a raw
+// pointer it takes over the caller's count, and holds null if the instance is not of T's class.
 template <class T>
 class Ref {
+    using Any = std::conditional_t<std::is_const_v<T>, const Instance, Instance>;
+
 public:
     Ref() noexcept = default;
-    Ref(Instance* instance) noexcept : _ptr(cast<T>(instance)) {
+    Ref(Any* instance) noexcept : _ptr(cast<std::remove_const_t<T>>(instance)) {
         if (instance && !_ptr)
             unref(instance);
     }
+    // Of a subclass, or of the same class to be read only.
+    template <class U>
+    requires(!std::is_same_v<T, U> && std::is_convertible_v<U*, T*>) Ref(Ref<U> other)
+    noexcept : _ptr(other.release()) {}
     Ref(const Ref& other) noexcept : _ptr(other._ptr) {
         if (_ptr)
             cimple::ref(_ptr);
@@ -206,6 +219,11 @@ public:
         return mine;
     }
     void reset(T* instance = nullptr) noexcept { *this = Ref(instance); }
+    // A share of what somebody else counts; null for null.
+    static Ref share(T* instance) noexcept {
+        ref(instance);
+        return Ref(instance);
+    }
 
 private:
     T* _ptr = nullptr;

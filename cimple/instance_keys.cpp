@@ -81,13 +81,6 @@ constexpr uint64 mix(uint64 x) {
     return x ^ (x >> 31);
 }
 
-uint64 hash_name(const char* name) {
-    uint64 hash = 0xCBF29CE484222325u;
-    for (; *name; ++name)
-        hash = (hash ^ fold(*name)) * 0x100000001B3u;
-    return hash;
-}
-
 uint64 hash_bytes(const void* bytes, std::size_t size) {
     return std::hash<std::string_view>{}({static_cast<const char*>(bytes), size});
 }
@@ -154,7 +147,7 @@ bool equal_values(const Instance* a, const Meta_Property* in_a, const Instance* 
 Key_Signature key_signature(const Instance* instance) {
     Key_Signature sum{};
     all_keys(instance, [&](const Meta_Feature* key, std::size_t) {
-        const uint64 name = hash_name(key->name);
+        const uint64 name = name_hash(key->name);
         uint64 kind;
         uint64 value = 0;
         if (key->flags & FLAG_PROPERTY) {

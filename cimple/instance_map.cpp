@@ -65,6 +65,11 @@ struct Instance_Map_Base::Key_Index {
         });
     }
 
+    // The same member, in another instance.
+    void replace(const Instance* former, const Instance* present) noexcept {
+        shapes.replace(former, present);
+    }
+
     void clear() noexcept {
         entries.clear();
         table.clear();
@@ -145,7 +150,7 @@ uint32 Instance_Map_Base::size() const noexcept {
     return _members.size();
 }
 
-Instance* Instance_Map_Base::at(uint32 index) const noexcept {
+const Instance* Instance_Map_Base::at(uint32 index) const noexcept {
     return index < _members.size() ? _members[index] : nullptr;
 }
 
@@ -167,7 +172,7 @@ sint32 Instance_Map_Base::find(const Instance* keys) const {
     return find_match(*_index, keys, detail::key_signature(keys));
 }
 
-Instance* Instance_Map_Base::lookup(const Instance* keys) const {
+const Instance* Instance_Map_Base::lookup(const Instance* keys) const {
     const sint32 index = find(keys);
     return index < 0 ? nullptr : _members[static_cast<uint32>(index)];
 }
@@ -181,8 +186,8 @@ sint32 Instance_Map_Base::get_instance(const Instance* keys, Instance*& out) con
 }
 
 sint32 Instance_Map_Base::enum_instances(const Enum_Instances_Handler& handler) const {
-    for (const Instance* member : _members) {
-        if (!handler.handle(clone(member)))
+    for (Instance* member : _members) {
+        if (!handler.handle(Ref<Instance>::share(member).release()))
             break;
     }
     return ENUM_INSTANCES_OK;
@@ -200,9 +205,7 @@ sint32 Instance_Map_Base::delete_instance(const Instance* keys) {
     const sint32 index = find(keys);
     if (index < 0)
         return DELETE_INSTANCE_NOT_FOUND;
-    Instance* member = _members[static_cast<uint32>(index)];
     remove(static_cast<uint32>(index));
-    unref(member);
     return DELETE_INSTANCE_OK;
 }
 
@@ -210,14 +213,31 @@ sint32 Instance_Map_Base::modify_instance(const Instance* model, const Instance*
     const sint32 index = find(instance);
     if (index < 0)
         return MODIFY_INSTANCE_NOT_FOUND;
-    Instance* member = _members[static_cast<uint32>(index)];
-    copy(member, instance, model);
-    // A key reference may now lead to an instance with more keys than the one that it matched.
-    if (!(detail::key_signature(member) ==
-          _index->entries[static_cast<std::size_t>(index)].signature))
-        reindex();
-    changed();
+    cimple::change(*this, static_cast<uint32>(index),
+                   [&](Instance& member) { copy(&member, instance, model); });
     return MODIFY_INSTANCE_OK;
+}
+
+const Instance* Instance_Map_Base::change(uint32 index,
+                                          void (*apply)(Instance& member, void* closure),
+                                          void* closure) {
+    if (index >= _members.size())
+        return nullptr;
+    Instance*& member = _members[index];
+    if (!is_shared(member)) {
+        apply(*member, closure);
+    } else {
+        Ref<Instance> copy(clone(member));
+        apply(*copy, closure);
+        _index->replace(member, copy.get());
+        const Ref<Instance> former(std::exchange(member, copy.release()));
+    }
+    // A key reference may now lead to an instance with more keys than the one that it matched.
+    if (!(detail::key_signature(member) == _index->entries[index].signature)) {
+        reindex();
+        _ends.reset();
+    }
+    return member;
 }
 
 sint32 Instance_Map_Base::insert(Instance* instance) {
@@ -229,45 +249,38 @@ sint32 Instance_Map_Base::insert(Instance* instance) {
     _index->reserve_one();
     _members.append(instance);
     _index->add(instance, signature);
-    changed();
+    _ends.reset();
     return static_cast<sint32>(_members.size()) - 1;
 }
 
-void Instance_Map_Base::remove(uint32 index) {
+Ref<const Instance> Instance_Map_Base::remove(uint32 index) {
     if (index >= _members.size())
-        return;
+        return {};
+    Ref<const Instance> member(_members[index]);
     _members.remove(index);
     _index->remove(index, _members);
-    const bool distinct = _keys == Keys::DISTINCT;
-    changed();
-    if (distinct)
-        _keys = Keys::DISTINCT;
+    _ends.reset();
+    if (_first_equal >= 0)
+        reindex();
+    return member;
 }
 
-// Does to the members' keys what a copy of the store does: whether each of them would go in.
-bool Instance_Map_Base::reindex() {
+// After a change of keys: the index anew, and whether each member would still go in.
+void Instance_Map_Base::reindex() {
     auto fresh = std::make_unique<Key_Index>();
-    bool distinct = true;
-    for (const Instance* member : _members) {
-        const Key_Signature signature = detail::key_signature(member);
-        distinct = distinct && find_match(*fresh, member, signature) < 0;
+    sint32 first_equal = -1;
+    for (uint32 i = 0; i < _members.size(); ++i) {
+        const Key_Signature signature = detail::key_signature(_members[i]);
+        if (first_equal < 0 && find_match(*fresh, _members[i], signature) >= 0)
+            first_equal = static_cast<sint32>(i);
         fresh->reserve_one();
-        fresh->add(member, signature);
+        fresh->add(_members[i], signature);
     }
     _index = std::move(fresh);
-    return distinct;
-}
-
-void Instance_Map_Base::changed() noexcept {
-    _keys = Keys::UNCHECKED;
-    _ends.reset();
+    _first_equal = first_equal;
 }
 
 std::optional<std::vector<uint32>> Instance_Map_Base::narrow(const Enumeration_Focus& focus) {
-    if (_keys == Keys::UNCHECKED)
-        _keys = reindex() ? Keys::DISTINCT : Keys::EQUAL;
-    if (_keys == Keys::EQUAL)
-        return std::nullopt;
     std::vector<uint32> positions;
     if (focus.kind == Enumeration_Focus::KEYS) {
         if (const sint32 match = find(focus.instance); match >= 0)
@@ -288,7 +301,8 @@ void Instance_Map_Base::clear() noexcept {
     Array<Instance*> members;
     members.swap(_members);
     _index->clear();
-    changed();
+    _first_equal = -1;
+    _ends.reset();
     for (Instance* member : members)
         unref(member);
 }

@@ -37,6 +37,12 @@ public:
             known->sample = heir();
     }
 
+    void replace(const Sample& former, const Sample& present) noexcept {
+        for (Row& row : _rows)
+            if (row.sample == former)
+                row.sample = present;
+    }
+
     void clear() noexcept { _rows.clear(); }
 
     // Whether an instance of another shape than the keys' might still match them. at(sample)

@@ -141,6 +141,14 @@ bool name_equal(const char* a, const char* b) {
 const Meta_Class* find_meta_class(const Meta_Repository* repository, const char* name) {
     if (!repository || !name)
         return nullptr;
+    const uint32 count = repository->num_name_slots;
+    for (uint32 i = name_slot(name, count); count > 0; i = (i + 1) & (count - 1)) {
+        if (repository->name_slots[i] == 0)
+            return nullptr;
+        const Meta_Class* meta_class = repository->meta_classes[repository->name_slots[i] - 1];
+        if (name_equal(meta_class->name, name))
+            return meta_class;
+    }
     for (uint32 i = 0; i < repository->num_meta_classes; ++i) {
         if (name_equal(repository->meta_classes[i]->name, name))
             return repository->meta_classes[i];

@@ -130,9 +130,13 @@ struct Meta_Class : Meta_Features {
     const Meta_Repository* meta_repository;
 };
 
+// The classes, with a table that finds them by name: name_slot tells where a name stands, unless
+// other names do there; then it stands in the next slot that is not theirs.
 struct Meta_Repository {
     const Meta_Class* const* meta_classes;
     uint32 num_meta_classes;
+    const uint16* name_slots = nullptr; // position of a class plus 1, or 0
+    uint32 num_name_slots = 0;          // a power of two, more than there are classes; 0: no table
 };
 
 // ---- Counting. A static record (refs 0) stays at 0; dropping the last count frees a heap copy.

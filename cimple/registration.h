@@ -50,9 +50,9 @@ enum Provider_Operation : int {
     OP_ENUM_ASSOCIATORS = 16, // as 14
 };
 
-// Receives one instance and owns it, or null with the provider's status at the end of the stream.
-// Answers whether more is wanted.
-using Instance_Proc = bool (*)(Instance* instance, sint32 status, void* client_data);
+// Receives one instance and owns a count of it, or null with the provider's status at the end of
+// the stream. Others may share the instance. Answers whether more is wanted.
+using Instance_Proc = bool (*)(const Instance* instance, sint32 status, void* client_data);
 using Indication_Proc = bool (*)(Instance* indication, void* client_data);
 
 // What the receiver of an enumeration is after: it ignores every other instance. A provider that
@@ -75,8 +75,8 @@ public:
         : _proc(proc), _client_data(client_data), _focus(focus) {}
     // Null: everything is wanted.
     const Enumeration_Focus* focus() const noexcept { return _focus; }
-    // Takes over the instance; false asks the provider to stop.
-    bool handle(Instance* instance) const { return _proc(instance, 0, _client_data); }
+    // Takes over a count of the instance; false asks the provider to stop.
+    bool handle(const Instance* instance) const { return _proc(instance, 0, _client_data); }
 
 private:
     Instance_Proc _proc;

@@ -3,6 +3,7 @@
 #include "agent/gates.h"
 #include "agent/provider_agent.h"
 #include "cimple/guard.h"
+#include "cimple/shared_instances.h"
 
 #include <optional>
 #include <vector>
@@ -11,62 +12,69 @@ namespace cimple {
 
 namespace {
 
-// What an enumeration makes under the locks, to be delivered without them.
-struct Copying {
+// What an enumeration takes under the locks, to be delivered without them.
+struct Taking {
     const Pattern_Row& row;
     const Enumeration_Focus* focus; // null: everything is wanted
-    Instance_Map_Base copies;
+    Shared_Instances instances;
 };
 
-// False, with a line in the log, when a copy has an equal key.
-bool copy_member(const Instance_Map_Base& store, uint32 index, Instance_Map_Base& copies) {
-    Ref<Instance> copy(clone(store.at(index)));
-    if (copies.insert(copy.get()) < 0) {
-        VLN_LOG(VLN_CRIT, "Insert failed for %zu", static_cast<std::size_t>(index));
-        return false;
-    }
-    copy.release();
-    return true;
+// The first of the row's n-th store with keys that another of the row's instances before it has, or
+// -1.
+sint32 first_equal(ProviderAgent& agent, const Pattern_Row& row, std::size_t n) {
+    const Instance_Map_Base& store = agent.store(row.stores[n]);
+    if (n == 0)
+        return store.first_equal();
+    for (uint32 i = 0; i < store.size(); ++i)
+        for (std::size_t before = 0; before < n; ++before)
+            if (agent.store(row.stores[before]).find(store.at(i)) >= 0)
+                return static_cast<sint32>(i);
+    return store.first_equal();
 }
 
-// The members that the receiver will look at, if the store can tell them. Only a store by itself
-// knows its members' keys to be distinct: several stores of one class are copied whole.
-std::optional<std::vector<uint32>> wanted_members(Instance_Map_Base& store,
-                                                  const Copying& copying) {
-    if (!copying.focus || copying.row.stores[1] != NO_STORE)
+// The members that the receiver will look at, if the store can tell them. Several stores of one
+// class are taken whole.
+std::optional<std::vector<uint32>> wanted_members(Instance_Map_Base& store, const Taking& taking) {
+    if (!taking.focus || taking.row.stores[1] != NO_STORE)
         return std::nullopt;
-    return store.narrow(*copying.focus);
+    return store.narrow(*taking.focus);
 }
 
-// Clones the row's stores. False when two of their instances have equal keys.
-bool copy_stores(ProviderAgent& agent, Copying& copying) {
-    for (Store_Id id : copying.row.stores) {
-        if (id == NO_STORE)
-            return true;
-        Instance_Map_Base& store = agent.store(id);
-        if (const auto wanted = wanted_members(store, copying)) {
-            for (uint32 index : *wanted)
-                if (!copy_member(store, index, copying.copies))
-                    return false;
-            continue;
+void take_members(Instance_Map_Base& store, Taking& taking) {
+    if (const auto wanted = wanted_members(store, taking)) {
+        for (uint32 index : *wanted)
+            taking.instances.add(store.at(index));
+        return;
+    }
+    taking.instances.reserve(taking.instances.size() + store.size());
+    for (uint32 i = 0; i < store.size(); ++i)
+        taking.instances.add(store.at(i));
+}
+
+// Takes a count of what the row's stores hold. False, with a line in the log, when two of their
+// instances have equal keys.
+bool take_stores(ProviderAgent& agent, Taking& taking) {
+    const auto& stores = taking.row.stores;
+    for (std::size_t n = 0; n < stores.size() && stores[n] != NO_STORE; ++n) {
+        if (const sint32 equal = first_equal(agent, taking.row, n); equal >= 0) {
+            VLN_LOG(VLN_CRIT, "Insert failed for %zu", static_cast<std::size_t>(equal));
+            return false;
         }
-        for (uint32 i = 0; i < store.size(); ++i)
-            if (!copy_member(store, i, copying.copies))
-                return false;
+        take_members(agent.store(stores[n]), taking);
     }
     return true;
 }
 
-bool copy_adapter_group(ProviderAgent& agent, Copying& copying) {
-    return behind(agent, adapter_maps_gate, [&] { return copy_stores(agent, copying); });
+bool take_adapter_group(ProviderAgent& agent, Taking& taking) {
+    return behind(agent, adapter_maps_gate, [&] { return take_stores(agent, taking); });
 }
 
-bool copy_san_group(ProviderAgent& agent, Copying& copying) {
+bool take_san_group(ProviderAgent& agent, Taking& taking) {
     request_stale_san_maps(agent);
-    return behind(agent, san_maps_gate, [&] { return copy_stores(agent, copying); });
+    return behind(agent, san_maps_gate, [&] { return take_stores(agent, taking); });
 }
 
-bool copy_active(ProviderAgent& agent, Copying& copying) {
+bool take_active(ProviderAgent& agent, Taking& taking) {
     for (;;) {
         const Visit visit(agent);
         const Gate adapters = adapter_data_gate(visit);
@@ -76,16 +84,16 @@ bool copy_active(ProviderAgent& agent, Copying& copying) {
         Auto_Mutex data(agent.m_DataMutex);
         const No_Cancellation in_the_library;
         {
-            Auto_Mutex update(copying.row.update_mutex());
-            if (copying.row.update)
-                copying.row.update(agent);
+            Auto_Mutex update(taking.row.update_mutex());
+            if (taking.row.update)
+                taking.row.update(agent);
         }
-        return copy_stores(agent, copying);
+        return take_stores(agent, taking);
     }
 }
 
 struct Shape_Steps {
-    bool (*copy)(ProviderAgent& agent, Copying& copying);
+    bool (*take)(ProviderAgent& agent, Taking& taking);
     const char* exception; // the line of the guard
 };
 
@@ -98,16 +106,14 @@ Class_Loads& loads_of(const Pattern_Row& row) {
 
 // By Pattern_Shape.
 constexpr Shape_Steps SHAPES[] = {
-    {copy_adapter_group, "Exception in CIM Provider Enumeration - do nothing"},
-    {copy_san_group, "Exception in SAN CIM Provider Enumeration - do nothing"},
-    {copy_active, "Exception in Active CIM Provider Enumeration - do nothing"},
+    {take_adapter_group, "Exception in CIM Provider Enumeration - do nothing"},
+    {take_san_group, "Exception in SAN CIM Provider Enumeration - do nothing"},
+    {take_active, "Exception in Active CIM Provider Enumeration - do nothing"},
 };
 
-// The local map keeps its clones and the handler gets clones of those, so that no lock is held
-// while a slow client takes them.
-void deliver(const Instance_Map_Base& copies, const Enum_Instances_Handler& handler) {
-    for (uint32 i = 0; i < copies.size(); ++i)
-        if (!handler.handle(clone(copies.at(i))))
+void deliver(Shared_Instances& instances, const Enum_Instances_Handler& handler) {
+    for (std::size_t i = 0; i < instances.size(); ++i)
+        if (!handler.handle(instances.take(i)))
             return;
 }
 
@@ -115,9 +121,9 @@ void enumerate(ProviderAgent& agent, const Pattern_Row& row,
                const Enum_Instances_Handler& handler) {
     const Shape_Steps& shape = SHAPES[static_cast<std::size_t>(row.shape)];
     const bool complete = run_guarded([&] {
-        Copying copying = {row, handler.focus(), Instance_Map_Base(row.meta_class)};
-        if (shape.copy(agent, copying))
-            deliver(copying.copies, handler);
+        Taking taking = {row, handler.focus(), {}};
+        if (shape.take(agent, taking))
+            deliver(taking.instances, handler);
     });
     if (!complete)
         VLN_LOG(VLN_CRIT, "%s", shape.exception);

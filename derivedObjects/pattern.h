@@ -20,7 +20,7 @@ enum class Pattern_Shape : uint8 {
     ACTIVE,        // behind both adapter gates, and refreshes some properties at each call
 };
 
-// Changes the instances of an active class in place. Runs with both adapter gates, m_DataMutex and
+// Changes the instances of an active class. Runs with both adapter gates, m_DataMutex and
 // the class's own recursive mutex held, and may call the management library.
 using Update_Routine = void (*)(ProviderAgent& agent);
 
@@ -64,8 +64,8 @@ sint32 pattern_load(const Pattern_Row& row);
 // the table.
 sint32 pattern_unload(const Pattern_Row& row);
 
-// Hands a clone of each stored instance to the handler, on the caller's thread with no lock held;
-// of those only that the handler looks at, if it tells and the store can find them.
+// Hands each stored instance to the handler, shared with the store, on the caller's thread with no
+// lock held; of those only that the handler looks at, if it tells and the store can find them.
 // Answers 0 always: an exception makes the enumeration short, and two stored instances with equal
 // keys make it empty.
 sint32 pattern_enum_instances(const Pattern_Row& row, const Enum_Instances_Handler& handler);

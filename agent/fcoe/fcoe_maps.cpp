@@ -117,25 +117,24 @@ bool FCoE_Map_Builder::createPFCThrottle(const FC_Function& function) {
         VLN_LOG(VLN_DBG, "Failed to create VLNMPCA_PFCThrottle");
         return false;
     }
-    auto* setting = cast<VLNMPCA_ElementPFCThrottle>(
-        associate(_agent.m_VLNMPCA_ElementPFCThrottle_map, function.fc_port, throttle));
-    if (!setting) {
+    const auto* setting =
+        associate(_agent.m_VLNMPCA_ElementPFCThrottle_map, function.fc_port, throttle, {},
+                  [](Instance& setting) {
+                      cast<VLNMPCA_ElementPFCThrottle>(&setting)->IsCurrent.set(SETTING_IS);
+                  });
+    if (!setting)
         VLN_LOG(VLN_DBG, "Failed to create VLNMPCA_ElementPFCThrottle");
-        return false;
-    }
-    setting->IsCurrent.set(SETTING_IS);
-    return true;
+    return setting != nullptr;
 }
 
 // The counters are read at once: a client that gets the instance by its name, or that comes just
 // after a refresh, sees them too.
 bool FCoE_Map_Builder::createStatistics(const FC_Function& function) {
-    auto* statistics =
-        insert_instance(_agent.m_VLNMPCA_FCPortStatistics_map, port_statistics_instance(function));
-    if (!statistics)
-        return false;
-    readFCoEPortStatistics(function.port, *statistics);
-    return associate(_agent.m_VLNMPCA_ElementStatisticalData_map, function.fc_port, statistics);
+    auto read = port_statistics_instance(function);
+    readFCoEPortStatistics(function.port, *read);
+    const auto* statistics = insert_instance(_agent.m_VLNMPCA_FCPortStatistics_map, read);
+    return statistics &&
+           associate(_agent.m_VLNMPCA_ElementStatisticalData_map, function.fc_port, statistics);
 }
 
 // A port whose registers can't be read lacks that instance alone.

@@ -19,7 +19,7 @@ struct FC_Function {
     String name;              // of the port: 16 digits
     String serial_and_name;   // for the texts of the log
     String serial_and_number; // "serial:port number", which functions of one connector share
-    VLNMPCA_FCPort* fc_port = nullptr;
+    const VLNMPCA_FCPort* fc_port = nullptr;
 };
 
 class FCoE_Map_Builder {

@@ -69,12 +69,12 @@ bool FCoE_Map_Builder::joinPortController(const FC_Function& function) {
     if (!controller)
         return true;
     VLN_LOG(VLN_DBG, "MAC address matched matched");
-    auto* controlled_by = cast<VLNMPCA_FCControlledBy>(
-        associate(_agent.m_VLNMPCA_FCControlledBy_map, controller, function.fc_port));
-    if (!controlled_by)
-        return false;
-    controlled_by->AccessState.set(access_state(function.attributes.FunctionalPortState));
-    return true;
+    return associate(_agent.m_VLNMPCA_FCControlledBy_map, controller, function.fc_port, {},
+                     [&](Instance& controlled_by) {
+                         cast<VLNMPCA_FCControlledBy>(&controlled_by)
+                             ->AccessState.set(
+                                 access_state(function.attributes.FunctionalPortState));
+                     });
 }
 
 bool FCoE_Map_Builder::joinWWNService(const FC_Function& function) {
@@ -102,13 +102,12 @@ bool FCoE_Map_Builder::joinFirmware(const FC_Function& function) {
     const auto* firmware = find_firmware(_agent.m_VLNMPCA_SoftwareIdentity_map, function.adapter);
     if (!firmware)
         return true;
-    auto* identity = associate_as(_agent.m_VLNMPCA_FCPortSoftwareIdentity_map,
-                                  format_text("Software Identity (Firmware) %s:%s",
-                                              function.adapter.SerialNumber.c_str(),
-                                              firmware->VersionString.value.c_str()),
-                                  firmware, function.fc_port);
-    set_software_status(identity, {STATUS_CURRENT, STATUS_NEXT, STATUS_ON_PORT});
-    return identity;
+    return associate_as(_agent.m_VLNMPCA_FCPortSoftwareIdentity_map,
+                        format_text("Software Identity (Firmware) %s:%s",
+                                    function.adapter.SerialNumber.c_str(),
+                                    firmware->VersionString.value.c_str()),
+                        firmware, function.fc_port, {},
+                        software_status({STATUS_CURRENT, STATUS_NEXT, STATUS_ON_PORT}));
 }
 
 // The FC port depends on its ASIC's Ethernet side as a whole: port numbers play no part.

@@ -121,7 +121,7 @@ uint32 Adapter_Map_Builder::createNICCard(NICAdapter& adapter) {
         function.card = CreateMPCACardInstance(attributes);
         function.new_card = function.card != nullptr;
         if (function.card)
-            readCard(*function.card);
+            function.card = readCard(*function.card);
         else
             VLN_LOG(VLN_CRIT, "CreateMPCACardInstance failed");
         associate(_agent.m_VLNMPCA_ProductPhysicalComponent_map, function.product, function.card,
@@ -138,7 +138,8 @@ uint32 Adapter_Map_Builder::createNICCard(NICAdapter& adapter) {
     return MAP_OK;
 }
 
-VLNMPCA_Product* Adapter_Map_Builder::findOrMakeProduct(const NICAdapterAttributes& attributes) {
+const VLNMPCA_Product*
+Adapter_Map_Builder::findOrMakeProduct(const NICAdapterAttributes& attributes) {
     auto& products = _agent.m_VLNMPCA_Product_map;
     const String serial = text(attributes.SerialNumber);
     auto* product = find_first(products, [&](const VLNMPCA_Product& candidate) {
@@ -147,26 +148,33 @@ VLNMPCA_Product* Adapter_Map_Builder::findOrMakeProduct(const NICAdapterAttribut
     return product ? product : insert_instance(products, product_instance(attributes));
 }
 
-VLNMPCA_Card* Adapter_Map_Builder::CreateMPCACardInstance(const NICAdapterAttributes& attributes) {
+const VLNMPCA_Card*
+Adapter_Map_Builder::CreateMPCACardInstance(const NICAdapterAttributes& attributes) {
     return insert_instance(_agent.m_VLNMPCA_Card_map, card_instance(attributes));
 }
 
 // Comes before anything refers to the card, since it may give the card another key: so all of the
 // card's functions are asked here.
-void Adapter_Map_Builder::readCard(VLNMPCA_Card& card) {
+const VLNMPCA_Card* Adapter_Map_Builder::readCard(const VLNMPCA_Card& new_card) {
     std::vector<FRU_Source> functions;
     for (const auto& adapter : _agent.m_pData->adapters) {
         if (adapter->getAdapterType() != ADAPTER_NIC || adapter->getPorts().empty())
             continue;
         const AdapterAttributes& attributes = *adapter->getAdapterAttributes();
-        if (text(attributes.SerialNumber) == card.VLNSerialNumber.value)
+        if (text(attributes.SerialNumber) == new_card.VLNSerialNumber.value)
             functions.push_back(
                 {asic_name(attributes), text(adapter->getPorts().front()->getPortName())});
     }
-    VPD_Maps(_agent).UpdateFRUToCard(card, functions, _agent.m_VLNMPCA_Card_map.size() - 1);
-    // A client that gets the card by its name, or that comes just after a refresh, sees it too.
-    if (!functions.empty())
-        readBoardTemperature(functions.front().deviceId.c_str(), card);
+    VPD_Maps vpd(_agent);
+    const uint32 index = _agent.m_VLNMPCA_Card_map.size() - 1;
+    const auto* read = change(_agent.m_VLNMPCA_Card_map, index, [&](VLNMPCA_Card& card) {
+        vpd.UpdateFRUToCard(card, functions, index);
+        // A client that gets the card by its name, or that comes just after a refresh, sees it too.
+        if (!functions.empty())
+            readBoardTemperature(functions.front().deviceId.c_str(), card);
+    });
+    vpd.joinFRUData(*read);
+    return read;
 }
 
 // What hangs on the card itself is made once, with the card's first port.
@@ -175,10 +183,9 @@ void Adapter_Map_Builder::tieNewCard(NIC_Function& function) {
         return;
     function.new_card = false;
     conformCard(*function.card);
-    set_software_status(associate(_agent.m_VLNMPCA_ProviderElementSoftwareIdentity_map,
-                                  find_provider_identity(_agent.m_VLNMPCA_SoftwareIdentity_map),
-                                  function.card),
-                        {STATUS_CURRENT, STATUS_NEXT});
+    associate(_agent.m_VLNMPCA_ProviderElementSoftwareIdentity_map,
+              find_provider_identity(_agent.m_VLNMPCA_SoftwareIdentity_map), function.card, {},
+              software_status({STATUS_CURRENT, STATUS_NEXT}));
     if (_chassis)
         associate(_agent.m_VLNMPCA_ChassisContainsCard_map, _chassis, function.card,
                   "Insert Failed:VLNMPCA_ChassisContainsCard");

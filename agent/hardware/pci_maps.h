@@ -29,7 +29,8 @@ public:
 
 private:
     uint32 join(const PCI_Function& function, const VLNMPCA_PCIDevice& device);
-    VLNMPCA_VitalProductData* CreateVPD(const PCI_Function& function); // vital_product_maps.cpp
+    const VLNMPCA_VitalProductData*
+    CreateVPD(const PCI_Function& function); // vital_product_maps.cpp
 
     ProviderAgent& _agent;
     const CIM_ComputerSystem* _system;

@@ -12,15 +12,16 @@
 namespace cimple {
 
 // `name` as physical_port_name() makes it.
-inline VLNMPCA_PhysicalConnector* find_connector(const ProviderAgent& agent, const String& name) {
+inline const VLNMPCA_PhysicalConnector* find_connector(const ProviderAgent& agent,
+                                                       const String& name) {
     return find_last(agent.m_VLNMPCA_PhysicalConnector_map,
                      [&](const VLNMPCA_PhysicalConnector& candidate) {
                          return candidate.InstanceID.value == name;
                      });
 }
 
-inline VLNMPCA_PortController* find_port_controller(const ProviderAgent& agent,
-                                                    const String& name) {
+inline const VLNMPCA_PortController* find_port_controller(const ProviderAgent& agent,
+                                                          const String& name) {
     return find_in_system(agent, agent.m_VLNMPCA_PortController_map,
                           &VLNMPCA_PortController::DeviceID, name);
 }

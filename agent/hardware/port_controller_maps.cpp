@@ -97,10 +97,11 @@ void Adapter_Map_Builder::joinPortController(const NIC_Port& port) {
 }
 
 void Adapter_Map_Builder::joinControlledBy(const NIC_Port& port) {
-    auto* controlled_by = cast<VLNMPCA_ControlledBy>(
-        associate(_agent.m_VLNMPCA_ControlledBy_map, port.port_controller, port.ethernet_port));
-    if (controlled_by)
-        controlled_by->AccessState.set(access_state(port.attributes->FunctionalPortState));
+    associate(_agent.m_VLNMPCA_ControlledBy_map, port.port_controller, port.ethernet_port, {},
+              [&](Instance& controlled_by) {
+                  cast<VLNMPCA_ControlledBy>(&controlled_by)
+                      ->AccessState.set(access_state(port.attributes->FunctionalPortState));
+              });
 }
 
 } // namespace cimple

@@ -53,7 +53,7 @@ Ref<V> vital_product_data_instance(const String& port_name,
 } // namespace
 
 // Null for a port without such data.
-VLNMPCA_VitalProductData* PCI_Maps::CreateVPD(const PCI_Function& function) {
+const VLNMPCA_VitalProductData* PCI_Maps::CreateVPD(const PCI_Function& function) {
     std::vector<PCI_VPD_Entry> entries;
     if (VLN_Vpd().GetPCIVPD(function.port_name.c_str(), &entries) != AX_STATUS_OK)
         return nullptr;

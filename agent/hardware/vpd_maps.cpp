@@ -94,7 +94,6 @@ void copy_identities(VLNMPCA_SoftwareIdentity& firmware, const VLNMPCA_SoftwareI
 
 uint32 VPD_Maps::UpdateFRUToCard(VLNMPCA_Card& card, std::span<const FRU_Source> functions,
                                  uint32 index) {
-    const auto* known = findFRUData(card);
     uint32 result = 0;
     for (const FRU_Source& function : functions) {
         // The number under which the unit is ordered comes from its FRU data alone.
@@ -103,16 +102,16 @@ uint32 VPD_Maps::UpdateFRUToCard(VLNMPCA_Card& card, std::span<const FRU_Source>
         if (status != 0)
             result = status;
     }
-    // Only now is the card's key the one that stays.
-    const auto* fru = findFRUData(card);
-    if (!known && fru &&
-        !associate(_agent.m_VLNMPCA_FRUElementVPD_map, &card, fru,
-                   "Insert Failed : VLNMPCA_FRUElementVPD"))
-        return INSERT_FAILED;
     return result;
 }
 
-VLNMPCA_FRUVitalProductData* VPD_Maps::findFRUData(const VLNMPCA_Card& card) const {
+void VPD_Maps::joinFRUData(const VLNMPCA_Card& card) {
+    if (const auto* fru = findFRUData(card))
+        associate_once(_agent.m_VLNMPCA_FRUElementVPD_map, &card, fru,
+                       "Insert Failed : VLNMPCA_FRUElementVPD");
+}
+
+const VLNMPCA_FRUVitalProductData* VPD_Maps::findFRUData(const VLNMPCA_Card& card) const {
     return find_by_key(_agent.m_VLNMPCA_FRUVitalProductData_map,
                        &VLNMPCA_FRUVitalProductData::InstanceID, card.VLNSerialNumber.value);
 }
@@ -131,8 +130,8 @@ uint32 VPD_Maps::takeFRUData(VLNMPCA_Card& card, const FRU_Source& function, uin
     set_card_name(card, record, index);
     setCardTag(card, field_text(record.uuid));
     // Data without an order number have been taken from another function before.
-    if (auto* fru = findFRUData(card)) {
-        add_asic(*fru, function.asicName);
+    if (const auto* fru = findFRUData(card)) {
+        addASICName(*fru, function.asicName);
         return 0;
     }
     return insert_instance(_agent.m_VLNMPCA_FRUVitalProductData_map,
@@ -141,28 +140,18 @@ uint32 VPD_Maps::takeFRUData(VLNMPCA_Card& card, const FRU_Source& function, uin
                : INSERT_FAILED;
 }
 
-// The store finds the card by the key that it came with: it is taken out and put back.
-void VPD_Maps::setCardTag(VLNMPCA_Card& card, const String& tag) {
-    auto& cards = _agent.m_VLNMPCA_Card_map;
-    const auto* taken = find_by_key(cards, &VLNMPCA_Card::Tag, tag);
-    if (tag.empty() || taken)
-        return;
-    uint32 place = 0;
-    while (place < cards.size() && cards[place] != &card)
-        ++place;
-    if (place == cards.size()) {
+void VPD_Maps::setCardTag(VLNMPCA_Card& card, const String& tag) const {
+    if (!tag.empty() && !find_by_key(_agent.m_VLNMPCA_Card_map, &VLNMPCA_Card::Tag, tag))
         card.Tag.set(tag);
-        return;
-    }
-    cards.remove(place);
-    Ref<VLNMPCA_Card> owner(&card); // until it is back
-    card.Tag.set(tag);
-    if (cards.insert(owner.get()) >= 0)
-        static_cast<void>(owner.release());
+}
+
+void VPD_Maps::addASICName(const VLNMPCA_FRUVitalProductData& fru, const String& name) {
+    change(_agent.m_VLNMPCA_FRUVitalProductData_map, &fru,
+           [&](VLNMPCA_FRUVitalProductData& data) { add_asic(data, name); });
 }
 
 uint32 VPD_Maps::addASIC(const VLNMPCA_Card& card, const FRU_Source& function) {
-    auto* fru = findFRUData(card);
+    const auto* fru = findFRUData(card);
     if (!fru)
         return VLN_NOT_FOUND;
     if (function.asicName.empty() || contains(fru->ASICId.value, function.asicName))
@@ -171,7 +160,7 @@ uint32 VPD_Maps::addASIC(const VLNMPCA_Card& card, const FRU_Source& function) {
     FRUVPD record{};
     if (const AX_STATUS status = GetFRUVPD(function.deviceId.c_str(), &record))
         return status;
-    add_asic(*fru, function.asicName);
+    addASICName(*fru, function.asicName);
     return 0;
 }
 
@@ -184,20 +173,33 @@ uint32 VPD_Maps::UpdateFRUToSoftwareInstance() {
     uint32 result = 0;
     for (uint32 i = 0; i < software.size(); ++i)
         if (is_firmware(*software[i]))
-            if (const uint32 status = updateFirmware(*software[i]))
+            if (const uint32 status = updateFirmware(i))
                 result = status;
     return result;
 }
 
-uint32 VPD_Maps::updateFirmware(VLNMPCA_SoftwareIdentity& firmware) {
+uint32 VPD_Maps::updateFirmware(uint32 index) {
+    auto& software = _agent.m_VLNMPCA_SoftwareIdentity_map;
     FRUVPD record{};
-    const String reference = firmware.SerialNumber.value;
+    const String reference = software[index]->SerialNumber.value;
     String address;
     if (const uint32 status = GetLogicalPortAddress(reference, PORT_ADDRESS, &address))
         return status;
     if (const AX_STATUS status = GetFRUVPD(address.c_str(), &record))
         return status;
 
+    change(software, index, [&](VLNMPCA_SoftwareIdentity& firmware) {
+        describeFirmware(firmware, reference, record);
+        for (uint32 i = 0; i < software.size(); ++i)
+            if (i != index && is_firmware(*software[i]) &&
+                software[i]->SerialNumber.value == reference)
+                copy_identities(firmware, *software[i]);
+    });
+    return 0;
+}
+
+void VPD_Maps::describeFirmware(VLNMPCA_SoftwareIdentity& firmware, const String& reference,
+                                const FRUVPD& record) const {
     Datetime date;
     if (release_date(field_text(record.firmwareDate), date))
         firmware.ReleaseDate.set(date);
@@ -213,13 +215,6 @@ uint32 VPD_Maps::updateFirmware(VLNMPCA_SoftwareIdentity& firmware) {
         firmware.Name.set(format_text("%s %s Adapter %s %s", card->Manufacturer.value.c_str(),
                                       function.c_str(), card->Model.value.c_str(),
                                       classification.c_str()));
-
-    const auto& software = _agent.m_VLNMPCA_SoftwareIdentity_map;
-    for (uint32 i = 0; i < software.size(); ++i)
-        if (software[i] != &firmware && is_firmware(*software[i]) &&
-            software[i]->SerialNumber.value == reference)
-            copy_identities(firmware, *software[i]);
-    return 0;
 }
 
 uint32 VPD_Maps::GetLogicalPortAddress(const String& reference, uint32 type,

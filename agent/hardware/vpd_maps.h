@@ -25,14 +25,17 @@ public:
 
     explicit VPD_Maps(ProviderAgent& agent) : _agent(agent) {}
 
-    // Fills a card of the store from the first of its functions that tells of it, creates its FRU
-    // instance with the ASICs of all that do, and then the association between the two. The UUID
-    // becomes the card's tag, which is its key, so clones taken before do not refer to it any more;
-    // not if another card has it already. For a card that has FRU data already, adds ASICs only.
+    // Fills a card that is being changed from the first of its functions that tells of it, and
+    // creates its FRU instance with the ASICs of all that do. The UUID becomes the card's tag,
+    // which is its key: nothing refers to the card yet. Not if another card has it already. For a
+    // card that has FRU data already, adds ASICs only.
     //   index   of the card among the cards, for a card without serial number
     // 0; the status of the last function that failed; 32768 for a card without its FRU instance;
     // 32769 when an insertion failed.
     uint32 UpdateFRUToCard(VLNMPCA_Card& card, std::span<const FRU_Source> functions, uint32 index);
+
+    // Ties the card to its FRU instance, if it has one.
+    void joinFRUData(const VLNMPCA_Card& card);
 
     // The same for the identities of the firmware on the cards. 0; the status of the last identity
     // that failed; or 32768 when there is no software identity.
@@ -46,11 +49,14 @@ public:
     uint32 GetSoftwareInstanceName(const char* portAddress, String& name) const;
 
 private:
-    VLNMPCA_FRUVitalProductData* findFRUData(const VLNMPCA_Card& card) const;
+    const VLNMPCA_FRUVitalProductData* findFRUData(const VLNMPCA_Card& card) const;
     uint32 takeFRUData(VLNMPCA_Card& card, const FRU_Source& function, uint32 index);
     uint32 addASIC(const VLNMPCA_Card& card, const FRU_Source& function);
-    void setCardTag(VLNMPCA_Card& card, const String& tag);
-    uint32 updateFirmware(VLNMPCA_SoftwareIdentity& firmware);
+    void addASICName(const VLNMPCA_FRUVitalProductData& fru, const String& name);
+    void setCardTag(VLNMPCA_Card& card, const String& tag) const;
+    uint32 updateFirmware(uint32 index);
+    void describeFirmware(VLNMPCA_SoftwareIdentity& firmware, const String& reference,
+                          const FRUVPD& record) const;
 
     ProviderAgent& _agent;
 };

@@ -74,14 +74,14 @@ void ISCSI_Map_Builder::joinPortController(const ISCSI_Port& port) {
     const auto* controller = find_port_controller(_agent, physical_port_name(port.adapter));
     if (!controller)
         return;
-    auto* controlled_by = cast<VLNMPCA_ControlledBy>(
-        associate(_agent.m_VLNMPCA_ControlledBy_map, controller, port.ethernet_port));
-    if (controlled_by)
-        controlled_by->AccessState.set(access_state(port.attributes.FunctionalPortState));
+    associate(_agent.m_VLNMPCA_ControlledBy_map, controller, port.ethernet_port, {},
+              [&](Instance& controlled_by) {
+                  cast<VLNMPCA_ControlledBy>(&controlled_by)
+                      ->AccessState.set(access_state(port.attributes.FunctionalPortState));
+              });
     if (_driver)
-        set_software_status(
-            associate_once(_agent.m_VLNMPCA_ElementSoftwareIdentity_map, _driver, controller),
-            {STATUS_CURRENT});
+        associate_once(_agent.m_VLNMPCA_ElementSoftwareIdentity_map, _driver, controller, {},
+                       software_status({STATUS_CURRENT}));
 }
 
 void ISCSI_Map_Builder::conformPort(const ISCSI_Port& port) {

@@ -88,7 +88,7 @@ constinit const Profile_Row profile_table[NUM_PROFILES] = {
     {"iSCSI Initiator Ports", SNIA, "1.5.0"},
 };
 
-VLNMPCA_RegisteredProfile*
+const VLNMPCA_RegisteredProfile*
 Profile_Maps::createRegisteredProfile(const char* name, uint16 organization, const char* version) {
     VLN_LOG(VLN_DBG, "Generating VLNMPCA_RegisteredProfile (%s)", name);
     if (auto* stored = find(name)) {
@@ -104,23 +104,23 @@ Profile_Maps::createRegisteredProfile(const char* name, uint16 organization, con
     return profile;
 }
 
-VLNMPCA_RegisteredProfile* Profile_Maps::createRegisteredProfile(Profile profile) {
+const VLNMPCA_RegisteredProfile* Profile_Maps::createRegisteredProfile(Profile profile) {
     const Profile_Row& row = profile_table[profile];
     return createRegisteredProfile(row.name, row.organization, row.version);
 }
 
-VLNMPCA_RegisteredProfile* Profile_Maps::registerForSystem(Profile profile) {
+const VLNMPCA_RegisteredProfile* Profile_Maps::registerForSystem(Profile profile) {
     auto* registered = createRegisteredProfile(profile);
     if (registered)
         createComputerSystemConforms(registered);
     return registered;
 }
 
-VLNMPCA_RegisteredProfile* Profile_Maps::find(Profile profile) const {
+const VLNMPCA_RegisteredProfile* Profile_Maps::find(Profile profile) const {
     return find(profile_table[profile].name);
 }
 
-VLNMPCA_RegisteredProfile* Profile_Maps::find(const char* name) const {
+const VLNMPCA_RegisteredProfile* Profile_Maps::find(const char* name) const {
     const String key = profile_key(name);
     return find_by_key(_agent.m_VLNMPCA_RegisteredProfile_map,
                        &VLNMPCA_RegisteredProfile::InstanceID, key);

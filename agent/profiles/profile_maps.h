@@ -47,13 +47,13 @@ public:
 
     // The stored profile of that name, whatever its version, else a new one, tied to the stored
     // profiles that its standard refers to and that refer to it.
-    VLNMPCA_RegisteredProfile* createRegisteredProfile(const char* name, uint16 organization,
-                                                       const char* version);
-    VLNMPCA_RegisteredProfile* createRegisteredProfile(Profile profile);
+    const VLNMPCA_RegisteredProfile* createRegisteredProfile(const char* name, uint16 organization,
+                                                             const char* version);
+    const VLNMPCA_RegisteredProfile* createRegisteredProfile(Profile profile);
     // The same for a profile to which the computer system conforms.
-    VLNMPCA_RegisteredProfile* registerForSystem(Profile profile);
+    const VLNMPCA_RegisteredProfile* registerForSystem(Profile profile);
     // The stored one, or null.
-    VLNMPCA_RegisteredProfile* find(Profile profile) const;
+    const VLNMPCA_RegisteredProfile* find(Profile profile) const;
 
     // Only the provider's own computer system conforms: what a platform's conforms to is left to
     // the platform's interop data.
@@ -67,7 +67,7 @@ public:
                                  const CIM_ComputerSystem* system);
 
 private:
-    VLNMPCA_RegisteredProfile* find(const char* name) const;
+    const VLNMPCA_RegisteredProfile* find(const char* name) const;
     void joinReferencedProfiles(const char* name);
 
     ProviderAgent& _agent;

@@ -91,8 +91,8 @@ Logical_Unit logical_unit(const Target& unit, const String& initiator_port) {
 } // namespace
 
 struct FC_SAN_Maps::FC_Initiator {
-    String port_name;  // 16 digits
-    Ref<Instance> end; // of the paths; null for a port that the adapter pass left out
+    String port_name;    // 16 digits
+    const Instance* end; // of the paths; null for a port that the adapter pass left out
 };
 
 std::vector<SCSI_Target> group_units(Port& port) {
@@ -113,8 +113,7 @@ FC_SAN_Maps::FC_SAN_Maps(ProviderAgent& agent)
 FC_SAN_Maps::FC_Initiator FC_SAN_Maps::findInitiator(Port& port) const {
     const String name = text(port.getPortName());
     const auto key = initiator_key(name, *_system);
-    return {name,
-            association_end(_agent.m_VLNMPCA_SCSIProtocolInitiatorEndpoint_map.lookup(key.get()))};
+    return {name, _agent.m_VLNMPCA_SCSIProtocolInitiatorEndpoint_map.lookup(key.get())};
 }
 
 void FC_SAN_Maps::createTargets(Port& port) {
@@ -133,7 +132,7 @@ void FC_SAN_Maps::createTargets(Port& port) {
                 static_cast<int>(targets.size()));
         const Target& first = *targets[i].front();
         const Unit_Path path = {
-            Unit_Transport::FC, initiator.end, association_end(createTarget(initiator, first)),
+            Unit_Transport::FC, initiator.end, createTarget(initiator, first),
             format_text("%s:%s", initiator.port_name.c_str(), first.portWWN.c_str())};
         for (const Target* unit : targets[i])
             createUnit(units, path, initiator, *unit);

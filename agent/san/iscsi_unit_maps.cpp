@@ -88,10 +88,9 @@ Logical_Unit logical_unit(const ISCSI_Target& target, const Told_Unit& unit) {
 std::vector<Unit_Path> paths_to(const ISCSI_Target& target,
                                 const VLNMPCA_iSCSITargetProtocolEndpoint* endpoint) {
     std::vector<Unit_Path> paths;
-    const auto end = association_end(endpoint);
     for (const auto* initiator : target.initiators)
         paths.push_back(
-            {Unit_Transport::ISCSI, association_end(initiator), end,
+            {Unit_Transport::ISCSI, initiator, endpoint,
              format_text("%s:%s", initiator->Name.value.c_str(), endpoint->Name.value.c_str())});
     return paths;
 }

@@ -231,26 +231,25 @@ String logical_unit_name(uint32 peripheral_type, uint64 number) {
 }
 
 Logical_Unit_Maps::Logical_Unit_Maps(ProviderAgent& agent, const CIM_ComputerSystem* system)
-    : _agent(agent), _system(system), _system_end(association_end(system)) {}
+    : _agent(agent), _system(system) {}
 
-Ref<Instance> Logical_Unit_Maps::findOrMake(const Logical_Unit& unit) {
+const Instance* Logical_Unit_Maps::findOrMake(const Logical_Unit& unit) {
     const Unit_Class& unit_class = find_peripheral_type(unit.peripheral_type).unit_class;
     Instance_Map_Base& store = _agent.store(unit_class.store);
     const Ref<Instance> device = unit_class.make(unit, *_system);
     if (const Instance* known = store.lookup(device.get()))
-        return association_end(known);
+        return known;
     if (!insert_instance(store, device))
-        return {};
+        return nullptr;
     Instance_Map_Base& system_devices = _agent.store(unit_class.system_device);
     VLN_LOG(VLN_DBG, "Generating %s (%s: %s)", system_devices.meta_class()->name, unit_class.text,
             unit.device_id.c_str());
-    const Ref<Instance> ends[] = {_system_end, association_end(device.get())};
-    associate(system_devices, ends);
-    return ends[1];
+    associate(system_devices, _system, device.get());
+    return device.get(); // which the store keeps alive
 }
 
 bool Logical_Unit_Maps::joinPath(const Unit_Path& path, const Logical_Unit& unit,
-                                 const Ref<Instance>& device) {
+                                 const Instance* device) {
     if (!path.initiator) {
         VLN_LOG(VLN_ERR, "Could not find VLNMPCA_SCSIProtocolEndpoint Initiator instance.");
         return false;
@@ -260,11 +259,9 @@ bool Logical_Unit_Maps::joinPath(const Unit_Path& path, const Logical_Unit& unit
         path.transport == Unit_Transport::FC ? unit_class.fc_path : unit_class.iscsi_path);
     VLN_LOG(VLN_DBG, "creating %s - %s:%d", store.meta_class()->name, path.ends.c_str(),
             static_cast<int>(unit.number));
-    const Ref<Instance> ends[] = {path.initiator, path.target, device};
-    auto* joined = cast<CIM_SCSIInitiatorTargetLogicalUnitPath>(associate(store, ends));
-    if (joined)
-        describe_path(*joined, unit);
-    return joined != nullptr;
+    return associate(store, {path.initiator, path.target, device}, {}, [&](Instance& joined) {
+        describe_path(*cast<CIM_SCSIInitiatorTargetLogicalUnitPath>(&joined), unit);
+    });
 }
 
 } // namespace cimple

@@ -36,8 +36,8 @@ enum class Unit_Transport : uint8 { FC, ISCSI };
 // The way from an initiator to a target, which the paths to all units of the target share.
 struct Unit_Path {
     Unit_Transport transport;
-    Ref<Instance> initiator; // as association_end() makes it; null for a missing one
-    Ref<Instance> target;
+    const Instance* initiator; // in its store; null for a missing one
+    const Instance* target;
     String ends; // "initiator:target", for the log
 };
 
@@ -47,18 +47,17 @@ public:
     // The system stands in its store: no unit can be named without it.
     Logical_Unit_Maps(ProviderAgent& agent, const CIM_ComputerSystem* system);
 
-    // Puts the unit into the store of its class and ties it to the computer system. Answers it as
-    // the end of an association; a unit that two ports see under one key stands once.
-    Ref<Instance> findOrMake(const Logical_Unit& unit);
+    // Puts the unit into the store of its class and ties it to the computer system. A unit that two
+    // ports see under one key stands once.
+    const Instance* findOrMake(const Logical_Unit& unit);
 
     // The path to a unit that findOrMake answered. False, with a line in the log, if an end is
     // missing or the path stands already.
-    bool joinPath(const Unit_Path& path, const Logical_Unit& unit, const Ref<Instance>& device);
+    bool joinPath(const Unit_Path& path, const Logical_Unit& unit, const Instance* device);
 
 private:
     ProviderAgent& _agent;
     const CIM_ComputerSystem* _system;
-    Ref<Instance> _system_end;
 };
 
 } // namespace cimple

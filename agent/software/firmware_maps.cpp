@@ -110,8 +110,8 @@ Ref<Flash> flash_instance(const NICAdapterAttributes& adapter, const String& key
 
 } // namespace
 
-VLNMPCA_SoftwareIdentity* find_firmware(const Instance_Map<VLNMPCA_SoftwareIdentity>& store,
-                                        const AdapterAttributes& adapter) {
+const VLNMPCA_SoftwareIdentity* find_firmware(const Instance_Map<VLNMPCA_SoftwareIdentity>& store,
+                                              const AdapterAttributes& adapter) {
     const String version = text(adapter.OpertionalFirmwareVersion);
     const String key = asic_name(adapter);
     return find_last(store, [&](const VLNMPCA_SoftwareIdentity& each) {
@@ -137,7 +137,7 @@ void Adapter_Map_Builder::findOrMakeFirmware(NIC_Port& port) {
                                     port.firmware);
 }
 
-VLNMPCA_SoftwareIdentity*
+const VLNMPCA_SoftwareIdentity*
 Adapter_Map_Builder::CreateFirmwareIdentityInstance(const NICAdapterAttributes& adapter) {
     auto* firmware =
         insert_instance(_agent.m_VLNMPCA_SoftwareIdentity_map, firmware_instance(adapter));
@@ -145,18 +145,17 @@ Adapter_Map_Builder::CreateFirmwareIdentityInstance(const NICAdapterAttributes& 
         return nullptr;
     const String key = asic_name(adapter);
     if (const auto* chip = find_by_key(_agent.m_VLNMPCA_Chip_map, &VLNMPCA_Chip::Tag, key))
-        set_software_status(
-            associate(_agent.m_VLNMPCA_FirmwareElementSoftwareIdentity_map, firmware, chip,
-                      "Insert Failed (CNA): m_VLNMPCA_FirmwareElementSoftwareIdentity_map"),
-            {STATUS_CURRENT, STATUS_NEXT});
+        associate(_agent.m_VLNMPCA_FirmwareElementSoftwareIdentity_map, firmware, chip,
+                  "Insert Failed (CNA): m_VLNMPCA_FirmwareElementSoftwareIdentity_map",
+                  software_status({STATUS_CURRENT, STATUS_NEXT}));
     return firmware;
 }
 
 void Adapter_Map_Builder::joinFirmwareToPort(const NIC_Port& port) {
     if (port.firmware)
-        set_software_status(associate(_agent.m_VLNMPCA_EthernetPortSoftwareIdentity_map,
-                                      port.firmware, port.ethernet_port),
-                            {STATUS_CURRENT, STATUS_NEXT, STATUS_ON_PORT});
+        associate(_agent.m_VLNMPCA_EthernetPortSoftwareIdentity_map, port.firmware,
+                  port.ethernet_port, {},
+                  software_status({STATUS_CURRENT, STATUS_NEXT, STATUS_ON_PORT}));
 }
 
 void Adapter_Map_Builder::joinFirmwareToController(const NIC_Port& port) {
@@ -165,9 +164,9 @@ void Adapter_Map_Builder::joinFirmwareToController(const NIC_Port& port) {
     const String text = format_text("Software Identity (Firmware) %s:%s",
                                     port.function.attributes->SerialNumber.c_str(),
                                     port.firmware->VersionString.value.c_str());
-    set_software_status(associate_as(_agent.m_VLNMPCA_ElementSoftwareIdentity_map, text,
-                                     port.firmware, port.port_controller),
-                        {STATUS_CURRENT, STATUS_NEXT, STATUS_ON_PORT});
+    associate_as(_agent.m_VLNMPCA_ElementSoftwareIdentity_map, text, port.firmware,
+                 port.port_controller, {},
+                 software_status({STATUS_CURRENT, STATUS_NEXT, STATUS_ON_PORT}));
 }
 
 // One image for each firmware version, whatever the number of cards that hold it.
@@ -179,9 +178,8 @@ void Adapter_Map_Builder::joinFlashImage(const NIC_Port& port) {
     if (!image)
         image = insert_instance(images, flash_instance(adapter, key));
     if (image && port.new_port_controller)
-        set_software_status(associate(_agent.m_VLNMPCA_MPCAPortFlashImageSoftwareIdentity_map,
-                                      image, port.port_controller),
-                            {STATUS_CURRENT, STATUS_NEXT});
+        associate(_agent.m_VLNMPCA_MPCAPortFlashImageSoftwareIdentity_map, image,
+                  port.port_controller, {}, software_status({STATUS_CURRENT, STATUS_NEXT}));
 }
 
 } // namespace cimple

@@ -16,9 +16,9 @@ void affect_by_install_service(ProviderAgent& agent, Instance_Map_Base& store,
     const auto& services = agent.m_VLNMPCA_SoftwareInstallationService_map;
     if (services.size() == 0)
         return;
-    if (auto* affects =
-            cast<CIM_ServiceAffectsElement>(associate(store, element, services[0], failure)))
-        affects->ElementEffects.append(EFFECT_MANAGES);
+    associate(store, element, services[0], failure, [](Instance& affects) {
+        cast<CIM_ServiceAffectsElement>(&affects)->ElementEffects.append(EFFECT_MANAGES);
+    });
 }
 
 } // namespace cimple

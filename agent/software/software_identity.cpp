@@ -101,10 +101,12 @@ Ref<VLNMPCA_SoftwareIdentity> driver_identity_instance(const Driver_Texts& texts
     return identity;
 }
 
-void set_software_status(Instance* association, std::initializer_list<uint16> statuses) {
-    if (auto* identity = cast<CIM_ElementSoftwareIdentity>(association))
-        for (uint16 status : statuses)
-            identity->ElementSoftwareStatus.append(status);
+Association_Details software_status(std::initializer_list<uint16> statuses) {
+    return [statuses](Instance& association) {
+        if (auto* identity = cast<CIM_ElementSoftwareIdentity>(&association))
+            for (uint16 status : statuses)
+                identity->ElementSoftwareStatus.append(status);
+    };
 }
 
 void setTargetOSTypes(CIM_SoftwareIdentity& software) {

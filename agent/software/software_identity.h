@@ -2,7 +2,7 @@
 #ifndef VLN_AGENT_SOFTWARE_SOFTWARE_IDENTITY_H
 #define VLN_AGENT_SOFTWARE_SOFTWARE_IDENTITY_H
 
-#include "cimple/instance_map.h"
+#include "agent/associations.h"
 #include "classes/VLNMPCA_SoftwareIdentity.h"
 #include "device/adapter_attributes.h"
 
@@ -39,15 +39,15 @@ Ref<VLNMPCA_SoftwareIdentity> driver_identity_instance(const Driver_Texts& texts
 
 // The firmware of the adapter's ASIC, or null: the functions of an ASIC share it
 // (firmware_maps.cpp).
-VLNMPCA_SoftwareIdentity* find_firmware(const Instance_Map<VLNMPCA_SoftwareIdentity>& store,
-                                        const AdapterAttributes& adapter);
+const VLNMPCA_SoftwareIdentity* find_firmware(const Instance_Map<VLNMPCA_SoftwareIdentity>& store,
+                                              const AdapterAttributes& adapter);
 
 // The identity of the provider itself, or null (software_maps.cpp).
-VLNMPCA_SoftwareIdentity*
+const VLNMPCA_SoftwareIdentity*
 find_provider_identity(const Instance_Map<VLNMPCA_SoftwareIdentity>& store);
 
-// Sets the statuses of the software on the element. The association may be null.
-void set_software_status(Instance* association, std::initializer_list<uint16> statuses);
+// The statuses of the software on the element, for the association of the two.
+Association_Details software_status(std::initializer_list<uint16> statuses);
 
 // The systems that the software is for, as the library names the host's.
 void setTargetOSTypes(CIM_SoftwareIdentity& software);

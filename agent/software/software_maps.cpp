@@ -92,7 +92,7 @@ void Adapter_Map_Builder::createProviderIdentity() {
     profiles.createSoftwareConforms("CMPI MPCA Provider, Software", PROFILE_SOFTWARE, identity);
 }
 
-VLNMPCA_SoftwareIdentity*
+const VLNMPCA_SoftwareIdentity*
 find_provider_identity(const Instance_Map<VLNMPCA_SoftwareIdentity>& store) {
     return find_by_key(store, &VLNMPCA_SoftwareIdentity::InstanceID, provider_element_name());
 }

@@ -76,14 +76,14 @@ void read_port(Attribute_Buffer& buffer, VLNMPCA_FCPort& port) {
         port.FunctionalPortSpeed.set(text(speed));
 }
 
-void update_port(const ProviderAgent& agent, const std::string& name) {
+void update_port(ProviderAgent& agent, const std::string& name) {
     VLN_LOG(VLN_DBG, "Fetching Port Speeds.");
-    auto* port =
-        find_in_system(agent, agent.m_VLNMPCA_FCPort_map, &VLNMPCA_FCPort::DeviceID, text(name));
+    auto& ports = agent.m_VLNMPCA_FCPort_map;
+    const auto* port = find_in_system(agent, ports, &VLNMPCA_FCPort::DeviceID, text(name));
     if (!port)
         return;
     if (auto buffer = fetch_attributes(name))
-        read_port(*buffer, *port);
+        change(ports, port, [&](VLNMPCA_FCPort& shown) { read_port(*buffer, shown); });
 }
 
 // ---- Statistics ----
@@ -139,13 +139,13 @@ void copy_counters(const PortStatistics& counters, VLNMPCA_FCPortStatistics& sta
     }
 }
 
-void update_statistics(const ProviderAgent& agent, Port& port) {
-    auto* statistics =
-        find_by_key(agent.m_VLNMPCA_FCPortStatistics_map, &VLNMPCA_FCPortStatistics::InstanceID,
-                    fc_statistics_name(text(port.getPortName())));
-    if (!statistics)
-        return;
-    readFCoEPortStatistics(port, *statistics);
+void update_statistics(ProviderAgent& agent, Port& port) {
+    auto& store = agent.m_VLNMPCA_FCPortStatistics_map;
+    const auto* statistics = find_by_key(store, &VLNMPCA_FCPortStatistics::InstanceID,
+                                         fc_statistics_name(text(port.getPortName())));
+    if (statistics)
+        change(store, statistics,
+               [&](VLNMPCA_FCPortStatistics& shown) { readFCoEPortStatistics(port, shown); });
 }
 
 } // namespace

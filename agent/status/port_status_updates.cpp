@@ -114,33 +114,39 @@ void show_status(VLN_Data& data, VLNMPCA_EthernetPort& port, const Dynamic_Port_
 // What a refresh has read since the last poll is newer.
 void show_port_status(ProviderAgent& agent) {
     VLN_Data& data = *agent.m_pData;
-    const auto& ports = agent.m_VLNMPCA_EthernetPort_map;
+    auto& ports = agent.m_VLNMPCA_EthernetPort_map;
     Auto_Mutex lock(agent.m_DynamicPortStatusMutex);
     if (!agent.m_pDynamicPortStatus)
         return; // the thread has ended meanwhile
     for (uint32 i = 0; i < ports.size(); ++i)
         for (const Dynamic_Port_Row& row : agent.m_pDynamicPortStatus->rows)
             if (row.scan_number == data.scanNumber && ports[i]->DeviceID.value == row.name)
-                show_status(data, *ports[i], row);
+                change(ports, i, [&](VLNMPCA_EthernetPort& port) { show_status(data, port, row); });
 }
 
 // ---- Port controllers and cards ----
 
-void update_phy_link_down_reason(const ProviderAgent& agent, VLNMPCA_PortController& controller,
+void update_phy_link_down_reason(ProviderAgent& agent, uint32 controller,
                                  Attribute_Buffer& buffer) {
-    const auto* port = find_port(agent, IDENTITY_PHYSICAL_PORT, controller.DeviceID.value);
+    auto& controllers = agent.m_VLNMPCA_PortController_map;
+    const auto* port =
+        find_port(agent, IDENTITY_PHYSICAL_PORT, controllers[controller]->DeviceID.value);
     uint32 reason = 0;
     if (port && fetchStatus(port->DeviceID.value.c_str(), buffer, "ERROR: AX_GetPortAttributes") &&
         getStatusNumber(buffer, AX_PA_PHY_LINK_DOWN_REASON,
                         "ERROR: AX_GetttributeValue for _PhyLinkDownReason", reason))
-        controller.PhyLinkDownReason.set(reason);
+        change(controllers, controller,
+               [reason](VLNMPCA_PortController& shown) { shown.PhyLinkDownReason.set(reason); });
 }
 
 // The serial number by which functions know their card: what the card's own data say of it may be
 // another one.
-void update_board_temperature(const ProviderAgent& agent, VLNMPCA_Card& card) {
-    if (const auto* port = find_port(agent, IDENTITY_SERIAL, card.VLNSerialNumber.value))
-        readBoardTemperature(port->DeviceID.value.c_str(), card);
+void update_board_temperature(ProviderAgent& agent, uint32 card) {
+    auto& cards = agent.m_VLNMPCA_Card_map;
+    if (const auto* port = find_port(agent, IDENTITY_SERIAL, cards[card]->VLNSerialNumber.value))
+        change(cards, card, [port](VLNMPCA_Card& shown) {
+            readBoardTemperature(port->DeviceID.value.c_str(), shown);
+        });
 }
 
 } // namespace
@@ -172,7 +178,7 @@ void UpdatePhyLinkDownReason(ProviderAgent& agent) {
     Attribute_Buffer buffer(AX_PORT_ATTRIBUTES_SIZE);
     const auto& controllers = agent.m_VLNMPCA_PortController_map;
     for (uint32 i = 0; i < controllers.size(); ++i)
-        update_phy_link_down_reason(agent, *controllers[i], buffer);
+        update_phy_link_down_reason(agent, i, buffer);
     VLN_LOG(VLN_DBG, "UpdatePhyLinkDownReason(): Successful");
 }
 
@@ -197,7 +203,7 @@ void UpdateBoardTemp(ProviderAgent& agent) {
         return;
     const auto& cards = agent.m_VLNMPCA_Card_map;
     for (uint32 i = 0; i < cards.size(); ++i)
-        update_board_temperature(agent, *cards[i]);
+        update_board_temperature(agent, i);
     VLN_LOG(VLN_DBG, "UpdateBoardTemp(): Successful");
 }
 

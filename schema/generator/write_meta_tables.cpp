@@ -1,6 +1,8 @@
+#include "cimple/fold.h"
 #include "schema/generator/cpp_text.h"
 #include "schema/generator/generator.h"
 
+#include <bit>
 #include <set>
 #include <sstream>
 
@@ -273,6 +275,20 @@ std::string tables(const Catalogue& catalogue, Span span) {
     return out.str();
 }
 
+// The table that finds a class by its name: half full, so that few names meet.
+std::vector<std::size_t> name_slots(const Catalogue& catalogue) {
+    const auto& classes = catalogue.schema.classes();
+    std::vector<std::size_t> slots(std::bit_ceil(2 * classes.size()));
+    for (std::size_t i = 0; i < classes.size(); i++) {
+        const auto count = static_cast<std::uint32_t>(slots.size());
+        std::size_t slot = cimple::name_slot(classes[i]->name().c_str(), count);
+        while (slots[slot] != 0)
+            slot = (slot + 1) % slots.size();
+        slots[slot] = i + 1;
+    }
+    return slots;
+}
+
 std::string repository(const Catalogue& catalogue) {
     std::ostringstream out;
     out << BANNER << "#include \"meta_repository.h\"\n\n";
@@ -281,8 +297,13 @@ std::string repository(const Catalogue& catalogue) {
     out << "\nnamespace cimple {\n\nconstexpr const Meta_Class* all[] = {\n";
     for (const auto& schema_class : catalogue.schema.classes())
         out << "    &" << schema_class->name() << "::static_meta_class,\n";
-    out << "};\n\nconstinit const Meta_Repository meta_repository = {all, "
-        << catalogue.schema.classes().size() << "};\n\n} // namespace cimple\n";
+    const std::vector<std::size_t> slots = name_slots(catalogue);
+    out << "};\n\nconstexpr uint16 name_slots[] = {";
+    for (std::size_t i = 0; i < slots.size(); i++)
+        out << (i % 16 == 0 ? "\n    " : " ") << slots[i] << ",";
+    out << "\n};\n\nconstinit const Meta_Repository meta_repository = {all, "
+        << catalogue.schema.classes().size() << ", name_slots, " << slots.size()
+        << "};\n\n} // namespace cimple\n";
     return out.str();
 }
 

@@ -8,7 +8,7 @@ namespace cimple {
 
 namespace {
 
-sint32 change(ProviderAgent& agent, const Tuning_Setting& setting, uint32 value) {
+sint32 apply(ProviderAgent& agent, const Tuning_Setting& setting, uint32 value) {
     // A value beyond the signed range turns negative, and is refused as such.
     if ((agent.m_ConfigFile.*setting.set)(static_cast<sint32>(value)) != 0) {
         VLN_LOG(VLN_ERR, "%s", setting.refused);
@@ -33,9 +33,10 @@ sint32 modify(ProviderAgent& agent, const VLNMPCA_ProviderConfigSetting* model,
             continue;
         const uint32 value = instance->current.value;
         if (i < NUM_TUNING_SETTINGS)
-            if (const sint32 status = change(agent, tuning_settings[i], value))
+            if (const sint32 status = apply(agent, tuning_settings[i], value))
                 return status;
-        settings[i]->current.set(value);
+        change(settings, i,
+               [value](VLNMPCA_ProviderConfigSetting& setting) { setting.current.set(value); });
         return MODIFY_INSTANCE_OK;
     }
     VLN_LOG(VLN_ERR, "Instance does not exist");

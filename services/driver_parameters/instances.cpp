@@ -93,12 +93,12 @@ const Parameter_Kind* kind_of(const Setting& setting) {
     return nullptr;
 }
 
-void set_flags(Instance* association, const Parameter_Kind& kind) {
-    auto* setting = cast<CIM_ElementSettingData>(association);
-    if (!setting)
-        return;
-    for (const auto flag : FLAGS)
-        (setting->*flag).set(flag == kind.flag ? SETTING_IS : SETTING_IS_NOT);
+Association_Details flags_of(const Parameter_Kind& kind) {
+    return [&kind](Instance& association) {
+        for (const auto flag : FLAGS)
+            (cast<CIM_ElementSettingData>(&association)->*flag)
+                .set(flag == kind.flag ? SETTING_IS : SETTING_IS_NOT);
+    };
 }
 
 // What the library tells of one scope now, in the settings that stand for it. A setting that is not
@@ -110,8 +110,8 @@ void update_settings(ProviderAgent& agent, const String& port_name, Parameter_Sc
     for (const AX_DriverParam& record : records)
         for (const Parameter_Kind* kind : LOCAL_ORDER) {
             const auto now = setting_instance(record, *kind, scope, port_name);
-            if (auto* setting = agent.m_VLNMPCA_DriverParameterSettingData_map.lookup(now.get()))
-                setting->Value.set(now->Value.value);
+            change(agent.m_VLNMPCA_DriverParameterSettingData_map, now.get(),
+                   [&](Setting& setting) { setting.Value.set(now->Value.value); });
         }
 }
 
@@ -180,15 +180,15 @@ uint32 join_driver_parameters(const Map_Scope& scope) {
             continue;
         }
         if (service)
-            set_flags(associate(agent.m_VLNMPCA_DriverElementSettingData_map, service, &setting),
-                      *kind);
+            associate(agent.m_VLNMPCA_DriverElementSettingData_map, service, &setting, {},
+                      flags_of(*kind));
         if (setting.ConfigurationName.value != LOCAL_CONFIGURATION)
             continue;
         const auto* port = find_in_system(agent, agent.m_VLNMPCA_FCPort_map,
                                           &VLNMPCA_FCPort::DeviceID, setting.ElementName.value);
         if (port)
-            set_flags(associate(agent.m_VLNMPCA_LocalPortElementSettingData_map, port, &setting),
-                      *kind);
+            associate(agent.m_VLNMPCA_LocalPortElementSettingData_map, port, &setting, {},
+                      flags_of(*kind));
     }
     return MAP_OK;
 }

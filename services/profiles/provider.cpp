@@ -15,15 +15,15 @@ namespace {
 
 constexpr char PLATFORM_CLASS[] = "OMC_RegisteredBaseServerProfile";
 
-using Profiles = std::vector<Ref<VLNMPCA_RegisteredProfile>>;
+using Profiles = std::vector<Ref<const VLNMPCA_RegisteredProfile>>;
 
-// Copies, so that no lock of the agent is held during the up-call.
+// Counted, so that no lock of the agent is held during the up-call.
 Profiles registered_profiles(ProviderAgent& agent) {
     return behind(agent, adapter_maps_gate, [&agent] {
         const auto& store = agent.m_VLNMPCA_RegisteredProfile_map;
         Profiles profiles;
         for (uint32 i = 0; i < store.size(); ++i)
-            profiles.emplace_back(clone(store[i]));
+            profiles.push_back(Ref<const VLNMPCA_RegisteredProfile>::share(store[i]));
         return profiles;
     });
 }
@@ -56,11 +56,10 @@ Ref<PG_RegisteredProfile> base_server_profile() {
 
 Ref<VLNMPCA_BaseServerReferencedProfile>
 reference_to(const Ref<PG_RegisteredProfile>& base_server,
-             const Ref<VLNMPCA_RegisteredProfile>& profile) {
-    auto association = make_instance<VLNMPCA_BaseServerReferencedProfile>();
-    association->Antecedent = Ref<PG_RegisteredProfile>(base_server).release();
-    association->Dependent = Ref<VLNMPCA_RegisteredProfile>(profile).release();
-    return association;
+             const Ref<const VLNMPCA_RegisteredProfile>& profile) {
+    auto association = association_of(&VLNMPCA_BaseServerReferencedProfile::static_meta_class,
+                                      {base_server.get(), profile.get()});
+    return Ref<VLNMPCA_BaseServerReferencedProfile>(association.release());
 }
 
 void enumerate(ProviderAgent& agent, const Enum_Instances_Handler& handler) {

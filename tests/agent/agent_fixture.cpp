@@ -168,7 +168,7 @@ void Long_Operation::end() {
 int count_instances(const Meta_Class& meta_class) {
     struct Counter {
         int delivered = 0;
-        static bool take(Instance* instance, sint32, void* self) {
+        static bool take(const Instance* instance, sint32, void* self) {
             ++static_cast<Counter*>(self)->delivered;
             unref(instance);
             return true;

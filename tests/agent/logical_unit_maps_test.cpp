@@ -42,15 +42,13 @@ TEST_F(Logical_Units_Test, APathNeedsItsEndsAndStandsOnce) {
 
     Log_Capture log;
     const auto join = [&](const Instance* from, const Instance* to) {
-        return maps.joinPath(
-            {Unit_Transport::FC, association_end(from), association_end(to), "I:T"}, unit, device);
+        return maps.joinPath({Unit_Transport::FC, from, to, "I:T"}, unit, device);
     };
     EXPECT_FALSE(join(nullptr, target.get()));
     EXPECT_EQ(log.count(VLN_ERR, "Could not find VLNMPCA_SCSIProtocolEndpoint Initiator instance."),
               1);
     EXPECT_FALSE(join(initiator.get(), nullptr));
-    const Unit_Path wrong = {Unit_Transport::ISCSI, association_end(initiator.get()),
-                             association_end(target.get()), "I:T"};
+    const Unit_Path wrong = {Unit_Transport::ISCSI, initiator.get(), target.get(), "I:T"};
     EXPECT_FALSE(maps.joinPath(wrong, unit, device)) << "endpoints of the other transport";
     EXPECT_EQ(paths.size(), 0u);
     EXPECT_TRUE(join(initiator.get(), target.get()));

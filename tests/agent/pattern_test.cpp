@@ -35,13 +35,13 @@ protected:
 
 struct Taken {
     std::vector<std::string> names;
+    std::vector<Ref<const VLNMPCA_Product>> instances;
     bool more = true;
 
-    static bool take(Instance* instance, sint32, void* self) {
+    static bool take(const Instance* instance, sint32, void* self) {
         auto& taken = *static_cast<Taken*>(self);
-        taken.names.push_back(static_cast<VLNMPCA_Product*>(instance)->Name.value.c_str());
-        static_cast<VLNMPCA_Product*>(instance)->Name.set("the handler's own");
-        unref(instance);
+        taken.instances.emplace_back(instance);
+        taken.names.push_back(taken.instances.back()->Name.value.c_str());
         return taken.more;
     }
 };
@@ -50,20 +50,28 @@ const Pattern_Row& product_row() {
     return pattern_table[pattern_id<VLNMPCA_Product>];
 }
 
-bool refuse(Instance* instance, sint32, void*) {
+bool refuse(const Instance* instance, sint32, void*) {
     unref(instance);
     throw std::runtime_error("client gone");
 }
 
 } // namespace
 
-TEST_F(Pattern_Test, DeliversClonesInOrder) {
-    VLNMPCA_Product* first = put_product("a");
+TEST_F(Pattern_Test, SharesWhatItDelivers) {
+    const VLNMPCA_Product* first = put_product("a");
     put_product("b");
     Taken taken;
     EXPECT_EQ(pattern_enum_instances(product_row(), {&Taken::take, &taken}), 0);
     EXPECT_EQ(taken.names, (std::vector<std::string>{"a", "b"}));
-    EXPECT_STREQ(first->Name.value.c_str(), "a");
+    EXPECT_EQ(taken.instances[0].get(), first);
+
+    auto& store = agent->m_VLNMPCA_Product_map;
+    const auto rename = [](VLNMPCA_Product& product) { product.ElementName.set("changed"); };
+    const auto* changed = change(store, first, rename);
+    EXPECT_NE(changed, first) << "somebody reads the former one";
+    EXPECT_TRUE(first->ElementName.value.empty());
+    EXPECT_EQ(change(store, changed, rename), changed) << "nobody else has this one";
+    EXPECT_EQ(store.find(first), 0) << "the index knows it by its keys";
 
     taken = {};
     taken.more = false;

@@ -155,7 +155,7 @@ TEST_F(Association_Test, AClassThatIsNoAssociationFails) {
 TEST_F(Association_Test, TheProcedureClosesTheStreamOfRealAnswers) {
     static int closings;
     static sint32 closing_status;
-    const Instance_Proc handler = [](Instance* instance, sint32 status, void*) {
+    const Instance_Proc handler = [](const Instance* instance, sint32 status, void*) {
         closings += !instance;
         closing_status = status;
         unref(instance);

@@ -67,6 +67,8 @@ Value store(const CMPIValue* value, CMPIType type) {
         stored.state = CMPI_nullValue;
         return stored;
     }
+    if (type == CMPI_chars)
+        return text(reinterpret_cast<const char*>(value)); // which it is
     if (is_object(type))
         stored.object = handle(static_cast<void*>(value->inst))->data;
     else

@@ -49,6 +49,12 @@ std::string read_scenario(const char* name) {
     return content.str();
 }
 
+std::string one_target(unsigned volumes) {
+    return R"({"include": "parts/cna.json", "cards": [{"use": "cna", "functions": [{"use": "nic"},
+        {"use": "fcoe", "targets": {"luns": )" +
+           std::to_string(volumes) + R"(, "wwpn": "50:25:64:C0:00:00:00:01"}}]}]})";
+}
+
 void simulate(const std::string& scenario_text) {
     char error[512] = "";
     vlnsim_reset();

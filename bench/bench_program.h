@@ -9,6 +9,8 @@
 
 std::string read_scenario(const char* name); // the text of a file of the scenarios
 
+std::string one_target(unsigned volumes); // a scenario with volumes alone
+
 // The process is a host with that scenario, in a fresh folder and on a virtual clock.
 void simulate(const std::string& scenario_text);
 

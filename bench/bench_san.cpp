@@ -30,13 +30,6 @@ std::string san_of(unsigned units) {
     return text.replace(at, as_it_is.size(), "\"luns\": " + std::to_string(units / TARGETS) + ",");
 }
 
-// One target that has volumes alone.
-std::string volumes(unsigned count) {
-    return R"({"include": "parts/cna.json", "cards": [{"use": "cna", "functions": [{"use": "nic"},
-        {"use": "fcoe", "targets": {"luns": )" +
-           std::to_string(count) + R"(, "wwpn": "50:25:64:C0:00:00:00:01"}}]}]})";
-}
-
 } // namespace
 
 // The one enumeration that is counted.
@@ -68,7 +61,7 @@ int main(int argc, char** argv) {
         fail("usage: bench_san pass|resident UNITS, or volumes COUNT");
     const std::string mode = argv[1];
     const auto count = static_cast<unsigned>(std::strtoul(argv[2], nullptr, 10));
-    simulate(mode == "volumes" ? volumes(count) : san_of(count));
+    simulate(mode == "volumes" ? one_target(count) : san_of(count));
     host::Options options;
     options.strict = false;
     host::Manager manager(options);

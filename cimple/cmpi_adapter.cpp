@@ -268,8 +268,8 @@ const Meta_Class* Call::find_class(const CMPIObjectPath* path) const {
     return find_meta_class(repository(), name.c_str());
 }
 
-Converter Call::converter(const CMPIObjectPath* path) const {
-    return {broker, repository(), cmpi::name_space(path)};
+Converter Call::converter(const String& name_space) const {
+    return {broker, repository(), name_space};
 }
 
 // ---- Frame ----

@@ -248,6 +248,7 @@ bool any_end(const Meta_Class* association, const char* role, Visit visit) {
 // the functions shows 5 all the same, which is meant.
 struct Request_Source {
     Ref<Instance> instance;
+    String name_space = {}; // its path's
     Answer nothing = CMPI_RC_OK;
 };
 
@@ -263,13 +264,18 @@ Request_Source make_source(const Call& call, const CMPIObjectPath* path, const c
             return is_subclass(end->meta_class, meta_class);
         };
         // A class that is no association is left to the operation, which fails for it.
-        if (!is_association(call) || any_end(association, "", accepts))
-            source.instance = make_cimple_reference(call.converter(path), meta_class, path);
+        if (is_association(call) && !any_end(association, "", accepts))
+            return source;
+        source.name_space = cmpi::name_space(path);
+        source.instance =
+            make_cimple_reference(call.converter(source.name_space), meta_class, path);
         return source;
     }
+    source.name_space = cmpi::name_space(path);
     source.nothing = Answer(CMPI_RC_OK, CMPI_RC_ERR_INVALID_CLASS);
     any_end(path ? association : nullptr, role, [&](const Meta_Reference* end) {
-        source.instance = make_foreign_reference(call.converter(path), end->meta_class, path);
+        source.instance =
+            make_foreign_reference(call.converter(source.name_space), end->meta_class, path);
         return static_cast<bool>(source.instance);
     });
     return source;
@@ -282,7 +288,7 @@ CMPIStatus associator_names(CMPIAssociationMI* mi, const CMPIContext* context,
         const Request_Source source = make_source(call, path, text(role));
         if (!source.instance)
             return source.nothing;
-        Delivery delivery = {call, result, path, nullptr, cmpi::name_space(path)};
+        Delivery delivery = {call, result, nullptr, source.name_space};
         const Request request = {source.instance.get(), text(result_class), text(role),
                                  text(result_role)};
         return map_status(ASSOCIATOR_NAMES_STATUS,
@@ -298,7 +304,7 @@ CMPIStatus associators(CMPIAssociationMI* mi, const CMPIContext* context, const 
         const Request_Source source = make_source(call, path, text(role));
         if (!source.instance)
             return CMPI_RC_OK; // here the trace shows the answer, unlike in the other functions
-        Delivery delivery = {call, result, path, properties, cmpi::name_space(path)};
+        Delivery delivery = {call, result, properties, source.name_space};
         const Request request = {source.instance.get(), text(result_class), text(role),
                                  text(result_role)};
         const sint32 status =
@@ -331,7 +337,7 @@ CMPIStatus run_references(CMPIAssociationMI* mi, const CMPIContext* context, con
         const Ref<Instance> model = make_association_model(call);
         if (properties)
             filter_properties(model.get(), properties, true);
-        Delivery delivery = {call, result, path, properties, cmpi::name_space(path)};
+        Delivery delivery = {call, result, properties, source.name_space};
         return map_status(REFERENCES_STATUS,
                           enum_references_with_fallback(call, source.instance.get(), model.get(),
                                                         text(role), handler, &delivery));

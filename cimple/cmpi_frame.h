@@ -27,7 +27,7 @@ struct Call {
     const Meta_Repository* repository() const;
     // The class of the path; null outside the repository.
     const Meta_Class* find_class(const CMPIObjectPath* path) const;
-    Converter converter(const CMPIObjectPath* path) const;
+    Converter converter(const String& name_space) const;
 
 private:
     template <class T>
@@ -107,11 +107,10 @@ int map_status(const Status_Row (&table)[N], sint32 status) {
 struct Delivery {
     const Call& call;
     const CMPIResult* result;
-    const CMPIObjectPath* path; // of the request
-    const char** properties;    // null: all
-    String name_space;          // of the path
-    int error = CMPI_RC_OK;     // the first; nothing is forwarded after it
-    End_Paths ends = {};        // what the delivered associations refer to
+    const char** properties; // null: all
+    String name_space;       // of the request's path
+    int error = CMPI_RC_OK;  // the first; nothing is forwarded after it
+    End_Paths ends = {};     // what the delivered associations refer to
 };
 
 // Returns the path of the instance, or the instance, in this namespace. An error is kept; false

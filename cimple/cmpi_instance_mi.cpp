@@ -46,20 +46,21 @@ constexpr Status_Row MODIFY_INSTANCE_STATUS[] = {
 // answers OK without it. The difference is meant.
 
 // An instance of the path's class with its keys. Fails for a class that the library does not know.
-int make_keys(const Call& call, const CMPIObjectPath* path, Ref<Instance>& keys) {
+int make_keys(const Call& call, const CMPIObjectPath* path, const String& name_space,
+              Ref<Instance>& keys) {
     const Meta_Class* meta_class = call.find_class(path);
     if (!meta_class)
         return CMPI_RC_ERR_FAILED;
-    keys = make_cimple_reference(call.converter(path), meta_class, path);
+    keys = make_cimple_reference(call.converter(name_space), meta_class, path);
     return CMPI_RC_OK;
 }
 
-int make_instance(const Call& call, const CMPIObjectPath* path, const CMPIInstance* source,
-                  Ref<Instance>& instance) {
+int make_instance(const Call& call, const CMPIObjectPath* path, const String& name_space,
+                  const CMPIInstance* source, Ref<Instance>& instance) {
     const Meta_Class* meta_class = call.find_class(path);
     if (!meta_class)
         return CMPI_RC_ERR_FAILED;
-    instance = make_cimple_instance(call.converter(path), meta_class, source);
+    instance = make_cimple_instance(call.converter(name_space), meta_class, source);
     return CMPI_RC_OK;
 }
 
@@ -81,11 +82,12 @@ sint32 enumerate(const Call& call, const Instance* model, Instance_Proc handler,
 CMPIStatus enum_instance_names(CMPIInstanceMI* mi, const CMPIContext* context,
                                const CMPIResult* result, const CMPIObjectPath* path) {
     return run_call(mi, context, "enumInstanceNames", [&](const Call& call) -> int {
+        const String name_space = cmpi::name_space(path);
         Ref<Instance> model;
-        if (const int rc = make_keys(call, path, model); rc != CMPI_RC_OK)
+        if (const int rc = make_keys(call, path, name_space, model); rc != CMPI_RC_OK)
             return rc;
         nullify_non_keys(model.get());
-        Delivery delivery = {call, result, path, nullptr, cmpi::name_space(path)};
+        Delivery delivery = {call, result, nullptr, name_space};
         const sint32 status =
             enumerate(call, model.get(), delivery_handler<deliver_enumerated_path>, delivery);
         if (status == ENUM_INSTANCES_OK)
@@ -97,12 +99,13 @@ CMPIStatus enum_instance_names(CMPIInstanceMI* mi, const CMPIContext* context,
 CMPIStatus enum_instances(CMPIInstanceMI* mi, const CMPIContext* context, const CMPIResult* result,
                           const CMPIObjectPath* path, const char** properties) {
     return run_call(mi, context, "enumInstances", [&](const Call& call) -> int {
+        const String name_space = cmpi::name_space(path);
         Ref<Instance> model;
-        if (const int rc = make_keys(call, path, model); rc != CMPI_RC_OK)
+        if (const int rc = make_keys(call, path, name_space, model); rc != CMPI_RC_OK)
             return rc;
         if (properties)
             filter_properties(model.get(), properties, true);
-        Delivery delivery = {call, result, path, properties, cmpi::name_space(path)};
+        Delivery delivery = {call, result, properties, name_space};
         const sint32 status =
             enumerate(call, model.get(), delivery_handler<deliver_enumerated_instance>, delivery);
         const int rc = map_status(ENUM_INSTANCES_STATUS, status);
@@ -149,8 +152,9 @@ sint32 get_instance_with_fallback(const Call& call, const Instance* model,
 CMPIStatus get_instance(CMPIInstanceMI* mi, const CMPIContext* context, const CMPIResult* result,
                         const CMPIObjectPath* path, const char** properties) {
     return run_call(mi, context, "getInstance", [&](const Call& call) -> int {
+        const String name_space = cmpi::name_space(path);
         Ref<Instance> model;
-        if (const int rc = make_keys(call, path, model); rc != CMPI_RC_OK)
+        if (const int rc = make_keys(call, path, name_space, model); rc != CMPI_RC_OK)
             return rc;
         nullify(model.get(), true, true, 0); // not null: wanted
         if (properties)
@@ -160,7 +164,7 @@ CMPIStatus get_instance(CMPIInstanceMI* mi, const CMPIContext* context, const CM
         const sint32 status = get_instance_with_fallback(call, model.get(), found);
         if (status != GET_INSTANCE_OK)
             return map_status(GET_INSTANCE_STATUS, status);
-        Delivery delivery = {call, result, path, properties, cmpi::name_space(path)};
+        Delivery delivery = {call, result, properties, name_space};
         if (!deliver_instance(delivery, found.get(), delivery.name_space.c_str()))
             return delivery.error;
         cmpi::return_done(result);
@@ -173,13 +177,15 @@ CMPIStatus get_instance(CMPIInstanceMI* mi, const CMPIContext* context, const CM
 CMPIStatus create_instance(CMPIInstanceMI* mi, const CMPIContext* context, const CMPIResult* result,
                            const CMPIObjectPath* path, const CMPIInstance* source) {
     return run_call(mi, context, "createInstance", [&](const Call& call) -> int {
+        const String name_space = cmpi::name_space(path);
         Ref<Instance> instance;
-        if (const int rc = make_instance(call, path, source, instance); rc != CMPI_RC_OK)
+        if (const int rc = make_instance(call, path, name_space, source, instance);
+            rc != CMPI_RC_OK)
             return rc;
         const sint32 status = call.provider(OP_CREATE_INSTANCE, instance.get());
         if (status != CREATE_INSTANCE_OK)
             return map_status(CREATE_INSTANCE_STATUS, status);
-        Delivery delivery = {call, result, path, nullptr, cmpi::name_space(path)};
+        Delivery delivery = {call, result, nullptr, name_space};
         if (!deliver_path(delivery, instance.get(), delivery.name_space.c_str()))
             return delivery.error;
         cmpi::return_done(result);
@@ -191,8 +197,10 @@ CMPIStatus modify_instance(CMPIInstanceMI* mi, const CMPIContext* context, const
                            const CMPIObjectPath* path, const CMPIInstance* source,
                            const char** properties) {
     return run_call(mi, context, "modifyInstance", [&](const Call& call) -> int {
+        const String name_space = cmpi::name_space(path);
         Ref<Instance> instance;
-        if (const int rc = make_instance(call, path, source, instance); rc != CMPI_RC_OK)
+        if (const int rc = make_instance(call, path, name_space, source, instance);
+            rc != CMPI_RC_OK)
             return rc;
         const Ref<Instance> model(clone(instance.get()));
         filter_properties(model.get(), properties, true);
@@ -208,8 +216,9 @@ CMPIStatus modify_instance(CMPIInstanceMI* mi, const CMPIContext* context, const
 CMPIStatus delete_instance(CMPIInstanceMI* mi, const CMPIContext* context, const CMPIResult* result,
                            const CMPIObjectPath* path) {
     return run_call(mi, context, "deleteInstance", [&](const Call& call) -> int {
+        const String name_space = cmpi::name_space(path);
         Ref<Instance> keys;
-        if (const int rc = make_keys(call, path, keys); rc != CMPI_RC_OK)
+        if (const int rc = make_keys(call, path, name_space, keys); rc != CMPI_RC_OK)
             return rc;
         const int rc =
             map_status(DELETE_INSTANCE_STATUS, call.provider(OP_DELETE_INSTANCE, keys.get()));

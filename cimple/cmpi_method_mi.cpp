@@ -12,12 +12,11 @@ constexpr Status_Row INVOKE_METHOD_STATUS[] = {
 };
 
 // Output parameters into out, the return value into the result.
-int return_outputs(const Call& call, const CMPIResult* result, const CMPIObjectPath* path,
+int return_outputs(const Call& call, const CMPIResult* result, const String& name_space,
                    const Instance* method, CMPIArgs* out) {
     CMPIValue value;
     CMPIType type;
-    const int rc =
-        make_method_out(call.broker, cmpi::name_space(path).c_str(), method, out, value, type);
+    const int rc = make_method_out(call.broker, name_space.c_str(), method, out, value, type);
     if (rc != CMPI_RC_OK)
         return rc;
     if (type != CMPI_null) // the interface has no way to return a null value
@@ -42,12 +41,14 @@ CMPIStatus invoke_method(CMPIMethodMI* mi, const CMPIContext* context, const CMP
         if (name_equal(cmpi::class_name(path).c_str(), meta_method->name))
             return CMPI_RC_ERR_INVALID_CLASS;
 
-        const Converter converter = call.converter(path);
+        const Converter converter = call.converter(cmpi::name_space(path));
         const Ref<Instance> self = make_cimple_reference(converter, meta_class, path);
         const Ref<Instance> method = make_method_instance(converter, meta_method, in);
         const sint32 status = call.provider(OP_INVOKE_METHOD, self.get(), method.get());
         const int rc = map_status(INVOKE_METHOD_STATUS, status);
-        return rc != CMPI_RC_OK ? rc : return_outputs(call, result, path, method.get(), out);
+        return rc != CMPI_RC_OK
+                   ? rc
+                   : return_outputs(call, result, converter.name_space, method.get(), out);
     });
 }
 

@@ -410,11 +410,40 @@ Ref<Instance> make_instance(const Converter& converter, const Meta_Class* meta_c
 
 } // namespace
 
+// The keys of a path that has those of the class under their names, as most do: then no name has
+// to be asked for. False, and something of the instance may be set, for any other path.
+bool read_keys_by_name(const Converter& converter, const Meta_Class* meta_class,
+                       const CMPIObjectPath* path, Instance* out) {
+    CMPICount left = meta_class->num_keys;
+    CMPICount count = 0;
+    if (!path || !From_Path{path}.count(count) || count != left)
+        return false;
+    for (uint32 i = 0; i < meta_class->num_meta_features && left > 0; i++) {
+        const Meta_Feature* key = meta_class->meta_features[i];
+        if (!(key->flags & FLAG_KEY))
+            continue;
+        --left;
+        CMPIStatus status = cmpi::GOOD_STATUS;
+        CMPIData data = path->ft->getKey(path, key->name, &status);
+        if (!cmpi::good(status) || (data.state & CMPI_notFound))
+            return false;
+        From_Path::adjust(data, expected_type(key));
+        if (!assign(converter, meta_class, key, data, out))
+            CIMPLE_WARN("conversion error: %s.%s", meta_class->name, key->name);
+    }
+    return true;
+}
+
 // ---- Entry points ----
 
 Ref<Instance> make_cimple_reference(const Converter& converter, const Meta_Class* meta_class,
                                     const CMPIObjectPath* path) {
-    return make_instance(converter, meta_class, FLAG_KEY, From_Path{path});
+    Ref<Instance> instance(create(meta_class));
+    nullify(instance.get(), true, true);
+    if (!read_keys_by_name(converter, meta_class, path, instance.get()))
+        return make_instance(converter, meta_class, FLAG_KEY, From_Path{path});
+    set_name_space_recursive(instance.get(), converter.name_space.c_str(), false);
+    return instance;
 }
 
 Ref<Instance> make_foreign_reference(const Converter& converter, const Meta_Class* base,

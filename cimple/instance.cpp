@@ -230,21 +230,6 @@ void destroy(Instance* instance) noexcept {
 
 // ---- Members by description ----
 
-const uint8* null_flag(const Instance* instance, const Meta_Feature* feature) {
-    uint32 position;
-    if (feature->flags & FLAG_PROPERTY) {
-        const Meta_Property* p = as_property(feature);
-        position = p->offset + type_size(p->subscript != 0 ? uint32{TYPE_INSTANCE} : p->type);
-    } else {
-        position = as_reference(feature)->offset + type_size(TYPE_INSTANCE);
-    }
-    return static_cast<const uint8*>(member(instance, position));
-}
-
-uint8* null_flag(Instance* instance, const Meta_Feature* feature) {
-    return const_cast<uint8*>(null_flag(const_cast<const Instance*>(instance), feature));
-}
-
 bool is_null(const Instance* instance, const Meta_Feature* feature) {
     if (feature->flags & FLAG_METHOD)
         return true;

@@ -164,8 +164,18 @@ inline void* member(Instance* instance, uint32 offset) {
     return reinterpret_cast<char*>(instance) + offset;
 }
 // The null flag of a property, or of an array of references.
-uint8* null_flag(Instance* instance, const Meta_Feature* feature);
-const uint8* null_flag(const Instance* instance, const Meta_Feature* feature);
+inline uint32 null_flag_offset(const Meta_Feature* feature) {
+    if (!(feature->flags & FLAG_PROPERTY))
+        return static_cast<const Meta_Reference*>(feature)->offset + type_size(TYPE_INSTANCE);
+    const auto* p = static_cast<const Meta_Property*>(feature);
+    return p->offset + type_size(p->subscript != 0 ? uint32{TYPE_INSTANCE} : p->type);
+}
+inline uint8* null_flag(Instance* instance, const Meta_Feature* feature) {
+    return static_cast<uint8*>(member(instance, null_flag_offset(feature)));
+}
+inline const uint8* null_flag(const Instance* instance, const Meta_Feature* feature) {
+    return static_cast<const uint8*>(member(instance, null_flag_offset(feature)));
+}
 // A feature's value is null: its flag, or the null pointer of a scalar reference.
 bool is_null(const Instance* instance, const Meta_Feature* feature);
 // The pointer of a scalar reference member.

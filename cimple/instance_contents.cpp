@@ -109,10 +109,15 @@ void copy_keys(Instance* dest, const Instance* src) {
 }
 
 void nullify(Instance* instance, bool keys, bool non_keys, uint8 value) {
+    if (!keys && !non_keys)
+        return;
+    const bool all = keys && non_keys;
     for (const Meta_Feature* feature : features(instance)) {
-        if ((feature->flags & FLAG_METHOD) || is_scalar_reference(feature))
+        if (!all && is_key(feature) != keys)
             continue;
-        if (is_key(feature) ? keys : non_keys)
+        const bool has_flag = (feature->flags & FLAG_PROPERTY) ||
+                              ((feature->flags & FLAG_REFERENCE) && !is_scalar_reference(feature));
+        if (has_flag)
             *null_flag(instance, feature) = value;
     }
 }

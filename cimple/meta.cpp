@@ -44,17 +44,9 @@ constexpr const char* FLAG_WORDS[32] = {
     "EmbeddedInstance", //
 };
 
-struct Type_Row {
-    const char* name;
-    uint32 size;
-};
-
-constexpr Type_Row TYPES[NUM_TYPES] = {
-    {"boolean", sizeof(boolean)}, {"uint8", sizeof(uint8)},       {"sint8", sizeof(sint8)},
-    {"uint16", sizeof(uint16)},   {"sint16", sizeof(sint16)},     {"uint32", sizeof(uint32)},
-    {"sint32", sizeof(sint32)},   {"uint64", sizeof(uint64)},     {"sint64", sizeof(sint64)},
-    {"real32", sizeof(real32)},   {"real64", sizeof(real64)},     {"char16", sizeof(char16)},
-    {"string", sizeof(String)},   {"datetime", sizeof(Datetime)},
+constexpr const char* TYPE_WORDS[NUM_TYPES] = {
+    "boolean", "uint8",  "sint8",  "uint16", "sint16", "uint32", "sint32",
+    "uint64",  "sint64", "real32", "real64", "char16", "string", "datetime",
 };
 static_assert(sizeof(String) == sizeof(void*) && sizeof(Datetime) == sizeof(void*));
 static_assert(sizeof(Array_Base) == sizeof(void*));
@@ -207,7 +199,12 @@ bool is_subclass(const Meta_Class* ancestor, const Meta_Class* descendant) {
     if (descendant->flags & FLAG_METHOD) // a method has no super class to walk to
         return ancestor == descendant || name_equal(ancestor->name, descendant->name);
     for (const Meta_Class* c = descendant; c; c = c->super_meta_class) {
-        if (c == ancestor || name_equal(c->name, ancestor->name))
+        if (c == ancestor)
+            return true;
+        // Of one repository's own records no two have the same name.
+        if ((c->meta_repository != ancestor->meta_repository || c->refs != 0 ||
+             ancestor->refs != 0) &&
+            name_equal(c->name, ancestor->name))
             return true;
     }
     return false;
@@ -233,18 +230,14 @@ bool identical(const Meta_Class* a, const Meta_Class* b, bool deep) {
 
 Type type_name_to_code(const char* text) {
     for (uint32 code = 0; code < NUM_TYPES; ++code) {
-        if (name_equal(TYPES[code].name, text))
+        if (name_equal(TYPE_WORDS[code], text))
             return static_cast<Type>(code);
     }
     return TYPE_NONE;
 }
 
 const char* type_name(uint32 type) {
-    return type < NUM_TYPES ? TYPES[type].name : type == TYPE_INSTANCE ? "instance" : "unknown";
-}
-
-uint32 type_size(uint32 type) {
-    return type < NUM_TYPES ? TYPES[type].size : sizeof(void*);
+    return type < NUM_TYPES ? TYPE_WORDS[type] : type == TYPE_INSTANCE ? "instance" : "unknown";
 }
 
 const char* flag_name(uint32 bit) {

@@ -180,7 +180,14 @@ bool identical(const Meta_Class* a, const Meta_Class* b, bool deep = false);
 Type type_name_to_code(const char* text);
 const char* type_name(uint32 type);
 // Bytes a scalar of the type takes in an instance, without its null flag.
-uint32 type_size(uint32 type);
+inline constexpr uint8 TYPE_SIZES[NUM_TYPES] = {
+    sizeof(boolean), sizeof(uint8),  sizeof(sint8),  sizeof(uint16), sizeof(sint16),
+    sizeof(uint32),  sizeof(sint32), sizeof(uint64), sizeof(sint64), sizeof(real32),
+    sizeof(real64),  sizeof(char16), sizeof(void*),  sizeof(void*),
+};
+constexpr uint32 type_size(uint32 type) noexcept {
+    return type < NUM_TYPES ? TYPE_SIZES[type] : sizeof(void*);
+}
 // Word of a flag bit, 0 to 31.
 const char* flag_name(uint32 bit);
 // Bit mask of a flag word in any case, 0 if there is none.

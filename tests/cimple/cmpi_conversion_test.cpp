@@ -322,7 +322,7 @@ TEST_F(Conversion_Test, FailuresOfTheBroker) {
     broker.failures.clear();
     const auto path = fake::path_data("", "Test_Holder");
     for (const char* function :
-         {"getPropertyAt", "getPropertyCount", "getKeyAt", "getKeyCount", "getCharPtr",
+         {"getPropertyAt", "getPropertyCount", "getKey", "getKeyAt", "getKeyCount", "getCharPtr",
           "getClassName", "getNameSpace", "getObjectPath", "getSize", "getElementAt"}) {
         for (int n = 0; n < 12; n++) {
             broker.failures = {{function, n}};

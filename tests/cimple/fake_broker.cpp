@@ -134,6 +134,17 @@ CMPIStatus set_member(const void* container, const char* function, const char* n
     return OK;
 }
 
+CMPIData get_member(const void* container, const char* function, const char* name,
+                    CMPIStatus* status) {
+    const std::lock_guard guard(the_mutex);
+    const Value* value = data(container).find(name);
+    if (owner(container).fails(function) || !value) {
+        set(status, FAILED);
+        return {};
+    }
+    return load(owner(container), *value);
+}
+
 CMPIData get_member_at(const void* container, const char* function, CMPICount index,
                        CMPIString** name, CMPIStatus* status) {
     const std::lock_guard guard(the_mutex);
@@ -211,6 +222,8 @@ CMPIObjectPathFT path_table = {
         },
     .addKey = [](CMPIObjectPath* p, const char* name, const CMPIValue* value,
                  CMPIType type) { return set_member(p, "addKey", name, value, type); },
+    .getKey = [](const CMPIObjectPath* p, const char* name,
+                 CMPIStatus* status) { return get_member(p, "getKey", name, status); },
     .getKeyAt =
         [](const CMPIObjectPath* p, CMPICount index, CMPIString** name, CMPIStatus* status) {
             return get_member_at(p, "getKeyAt", index, name, status);

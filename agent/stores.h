@@ -1,8 +1,8 @@
 // The instance stores of the agent: one for each class that is answered from memory.
 //
-// A store owns its instances; an association holds clones of its two ends, so nothing points from
-// one store into another and they may be cleared in any order. m_DataMutex guards all of them. The
-// classes are only declared here: who reads properties includes the class's own header.
+// A store counts its instances, an association shares its ends with other stores, so nothing points
+// from one store into another and they may be cleared in any order. m_DataMutex guards all of them.
+// The classes are only declared here: who reads properties includes the class's own header.
 #ifndef VLN_AGENT_STORES_H
 #define VLN_AGENT_STORES_H
 

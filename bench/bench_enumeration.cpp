@@ -1,11 +1,10 @@
 // One enumeration of VLNMPCA_EthernetPort, in a function that callgrind can be told to count alone.
 //
-//   bench_enumeration floor|provider|clones|bound|direct|memory COUNT
+//   bench_enumeration floor|provider|bound|direct|memory COUNT
 //
-// floor: the hand-written provider; provider: the library, its store filled up to COUNT; clones:
-// only the two copies of each instance that the library's locking demands; bound, direct: calls of
-// a function of the management library, with its binding and without; memory: resident kilobytes
-// after the first enumeration of a fresh process.
+// floor: the hand-written provider; provider: the library, its store filled up to COUNT; bound,
+// direct: calls of a function of the management library, with its binding and without; memory:
+// resident kilobytes after the first enumeration of a fresh process.
 #include "bench/bench_hooks.h"
 #include "bench/bench_program.h"
 #include "host/manager.h"
@@ -33,7 +32,7 @@ extern "C" __attribute__((noinline)) std::size_t vln_measured(host::Manager& man
 
 int main(int argc, char** argv) {
     if (argc != 3)
-        fail("usage: bench_enumeration floor|provider|clones|bound|direct|memory COUNT");
+        fail("usage: bench_enumeration floor|provider|bound|direct|memory COUNT");
     const std::string mode = argv[1];
     const auto count = static_cast<unsigned>(std::strtoul(argv[2], nullptr, 10));
     host::Options options;
@@ -58,8 +57,7 @@ int main(int argc, char** argv) {
     }
     if (!floor && hook<decltype(&vln_bench_fill)>("vln_bench_fill")(count) != count)
         fail("the store could not be filled");
-    const char* work = mode == "clones"   ? "vln_bench_clones"
-                       : mode == "bound"  ? "vln_bench_bound_calls"
+    const char* work = mode == "bound"    ? "vln_bench_bound_calls"
                        : mode == "direct" ? "vln_bench_direct_calls"
                                           : nullptr;
     const std::size_t seen = vln_measured(manager, work ? hook<void (*)()>(work) : nullptr);

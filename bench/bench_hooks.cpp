@@ -30,16 +30,6 @@ unsigned vln_bench_fill(unsigned count) {
     return store.size();
 }
 
-void vln_bench_clones() {
-    ProviderAgent* agent = ProviderAgent::current();
-    auto& store = agent->m_VLNMPCA_EthernetPort_map;
-    Instance_Map_Base copies(store.meta_class());
-    for (uint32 i = 0; i < store.size(); ++i)
-        copies.insert(clone(store.at(i)));
-    for (uint32 i = 0; i < copies.size(); ++i)
-        destroy(clone(copies.at(i)));
-}
-
 void vln_bench_bound_calls() {
     for (unsigned i = 0; i < VLN_BENCH_CALLS; ++i)
         AX_GetNumberOfLocalAdapters();

@@ -8,10 +8,6 @@
 // of its own, up to the count. The first enumeration must be over. Answers the size of the store.
 VLN_BENCH_HOOK unsigned vln_bench_fill(unsigned count);
 
-// Does with that store what an enumeration owes to its locks, and no more: a clone of each instance
-// into a local map, and one more of each to give away.
-VLN_BENCH_HOOK void vln_bench_clones();
-
 // Call one function of the management library so many times: through its bound function, and by a
 // pointer to it. The difference is what the binding costs.
 inline constexpr unsigned VLN_BENCH_CALLS = 100000;

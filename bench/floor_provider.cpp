@@ -8,6 +8,8 @@
 // that has nothing to say.
 #include "cmpi/cmpi.h"
 
+#include <strings.h>
+
 #include <cstdio>
 #include <cstdlib>
 #include <span>
@@ -260,28 +262,39 @@ CMPIInstanceMI* instance_mi(const CMPIBroker* b) {
     return &mi;
 }
 
-// ---- An association with nothing to say ----
+// ---- An association with nothing to say: it looks at the source's class, and that is all ----
+
+const char* const END_CLASSES[] = {"VLNMPCA_PhysicalConnector", "VLNMPCA_EthernetPort"};
+
+CMPIStatus refuse(const CMPIObjectPath* source) {
+    CMPIString* name = source->ft->getClassName(source, nullptr);
+    bool known = false;
+    for (const char* end : END_CLASSES)
+        known = known || strcasecmp(name->ft->getCharPtr(name, nullptr), end) == 0;
+    name->ft->release(name);
+    return known ? unsupported() : ok();
+}
 
 CMPIStatus cleanup_association(CMPIAssociationMI*, const CMPIContext*, CMPIBoolean) {
     return ok();
 }
 CMPIStatus associators(CMPIAssociationMI*, const CMPIContext*, const CMPIResult*,
-                       const CMPIObjectPath*, const char*, const char*, const char*, const char*,
-                       const char**) {
-    return ok();
+                       const CMPIObjectPath* source, const char*, const char*, const char*,
+                       const char*, const char**) {
+    return refuse(source);
 }
 CMPIStatus associator_names(CMPIAssociationMI*, const CMPIContext*, const CMPIResult*,
-                            const CMPIObjectPath*, const char*, const char*, const char*,
+                            const CMPIObjectPath* source, const char*, const char*, const char*,
                             const char*) {
-    return ok();
+    return refuse(source);
 }
 CMPIStatus references(CMPIAssociationMI*, const CMPIContext*, const CMPIResult*,
-                      const CMPIObjectPath*, const char*, const char*, const char**) {
-    return ok();
+                      const CMPIObjectPath* source, const char*, const char*, const char**) {
+    return refuse(source);
 }
 CMPIStatus reference_names(CMPIAssociationMI*, const CMPIContext*, const CMPIResult*,
-                           const CMPIObjectPath*, const char*, const char*) {
-    return ok();
+                           const CMPIObjectPath* source, const char*, const char*) {
+    return refuse(source);
 }
 
 } // namespace

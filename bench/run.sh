@@ -1,12 +1,15 @@
 #!/usr/bin/env bash
 # Prints what an enumeration, a walk and a refresh cost, from instruction counts (which repeat), then
 # times and sizes.
-#   bench/run.sh BUILD-FOLDER
+#   bench/run.sh BUILD-FOLDER [BUILD-FOLDER]
+# The requests of both; all else of the first.
 set -euo pipefail
-build="$1"
 # What the compiler did not optimise takes four times as many instructions.
-grep -qx 'CMAKE_BUILD_TYPE:STRING=Release' "$build/CMakeCache.txt" ||
-    { echo "bench: $build is not configured from a preset" >&2; exit 1; }
+for build in "$@"; do
+    grep -qx 'CMAKE_BUILD_TYPE:STRING=Release' "$build/CMakeCache.txt" ||
+        { echo "bench: $build is not configured from a preset" >&2; exit 1; }
+done
+build="$1"
 work="$(mktemp -d)"
 trap 'rm -rf "$work"' EXIT
 
@@ -25,16 +28,43 @@ instructions() {
     count --toggle-collect=vln_measured "$build/bin/bench_enumeration" "$1" "$2"
 }
 
-echo "Enumerating VLNMPCA_EthernetPort through the in-process object manager, instructions per instance"
-echo "(floor: a provider written by hand; clones: the two copies that the locking rules demand)"
-printf '%9s %10s %10s %10s %24s\n' instances floor clones library '(library-clones)/floor'
-for count in 100 1000 20000; do
-    floor=$(($(instructions floor $count) / count))
-    clones=$(($(instructions clones $count) / count))
-    library=$(($(instructions provider $count) / count))
-    printf '%9d %10d %10d %10d %24s\n' $count $floor $clones $library \
-        "$(awk "BEGIN { printf \"%.3f\", ($library - $clones) / $floor }")"
+# What one answer of a kind of request costs: "floor library".
+request() {
+    local folder="$1" what="$2" each="$3" floor library
+    floor=$(count --toggle-collect=vln_measured "$folder/bin/bench_requests" floor "$what" 4000)
+    library=$(count --toggle-collect=vln_measured "$folder/bin/bench_requests" library "$what" 4000)
+    echo $((floor / each)) $((library / each))
+}
+
+echo "Requests through the in-process object manager, instructions an answer, of 1,000 Ethernet ports and"
+echo "4,000 storage volumes (floor: providers written by hand; the association has nothing to say)"
+printf '%6s %-22s %9s %9s %9s %8s  %s\n' bits request floor library own ratio goal
+row() { # BITS NAME FLOOR LIBRARY GOAL
+    printf '%6s %-22s %9d %9d %9d %8s  %s\n' "$1" "$2" "$3" "$4" $(($4 - $3)) \
+        "$(awk "BEGIN { printf \"%.2f\", $4 / $3 }")" "$5"
+}
+for folder in "$@"; do
+    bits=$(sed -n 's/^VLN_WORD_SIZE:STRING=//p' "$folder/CMakeCache.txt")
+    build="$folder"
+    row "$bits" "port" $(($(instructions floor 1000) / 1000)) $(($(instructions provider 1000) / 1000)) \
+        "own at most 3000"
+    read -r floor library <<<"$(request "$folder" instances 4000)"
+    row "$bits" "volume" "$floor" "$library" ""
+    read -r floor library <<<"$(request "$folder" names 4000)"
+    row "$bits" "name of a volume" "$floor" "$library" "ratio at most 1.5"
+    read -r floor library <<<"$(request "$folder" get 100)"
+    row "$bits" "get of a volume" "$floor" "$library" "ratio at most 1.2"
+    read -r floor library <<<"$(request "$folder" association 100)"
+    row "$bits" "empty association" "$floor" "$library" "own at most 4000"
 done
+build="$1"
+all=$(count --toggle-collect=vln_measured "$build/bin/bench_requests" library associations 4000)
+read -r asked <"$work/result"
+echo "All $asked associations that have nothing to say about a volume: $((all / asked)) instructions each, the"
+echo "object manager's included"
+few=$(($(instructions provider 100) / 100))
+many=$(($(instructions provider 20000) / 20000))
+echo "A port among 100: $few; among 20,000: $many"
 
 calls=100000 # as bench/bench_hooks.h has it
 bound=$(instructions bound 100)
@@ -101,7 +131,7 @@ printf 'Enumerating VLNMPCA_StorageVolume: %d instructions per instance of 40, %
     $few $many "$(awk "BEGIN { printf \"%.3f\", $many / $few }")"
 printf 'objects of the object manager alive at the peak of it, 4000 volumes: %s\n' "$(cat "$work/result")"
 read -r before after made <<<"$("$san" resident 4096)"
-printf 'resident memory with 4,096 units, every class enumerated once: %d KiB for %d instances, at most 65536; %d KiB of it since the module was loaded\n' \
+printf 'resident memory with 4,096 units, every class enumerated once: %d KiB for %d instances, at most 49152; %d KiB of it since the module was loaded\n' \
     "$after" "$made" $((after - before))
 
 module="$build/lib/libvorlan_mpca_provider.so"

@@ -21,17 +21,17 @@ constexpr uint8 fold(char c) noexcept {
 }
 
 // The same for names that differ in case only.
-constexpr uint64 name_hash(const char* name) noexcept {
-    uint64 hash = 0xCBF29CE484222325u; // FNV-1a
+constexpr uint32 name_hash(const char* name) noexcept {
+    uint32 hash = 0x811C9DC5u; // FNV-1a
     for (; *name; ++name)
-        hash = (hash ^ fold(*name)) * 0x100000001B3u;
+        hash = (hash ^ fold(*name)) * 0x01000193u;
     return hash;
 }
 
 // Where in a table of so many slots, a power of two, the search for a name begins.
 constexpr uint32 name_slot(const char* name, uint32 slots) noexcept {
-    const uint64 hash = name_hash(name);
-    return static_cast<uint32>(hash ^ hash >> 32) & (slots - 1);
+    const uint32 hash = name_hash(name);
+    return (hash ^ hash >> 16) & (slots - 1);
 }
 
 } // namespace cimple

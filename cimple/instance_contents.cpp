@@ -29,6 +29,7 @@ void copy_features(Instance* dest, const Instance* src, const Instance* model, u
     if (dest == src || dest->__meta_class != src->__meta_class ||
         (model && model->__meta_class != src->__meta_class))
         return;
+    expect_unshared(dest);
     for (const Meta_Feature* feature : features(src)) {
         if ((feature->flags & mask) != mask || (model && is_null(model, feature)))
             continue;
@@ -67,8 +68,10 @@ bool is_scalar_reference(const Meta_Feature* feature) {
 }
 
 void set_name_space(Instance* instance, const String& name_space, bool overwrite) {
-    if (overwrite || instance->__name_space.empty())
+    if (overwrite || instance->__name_space.empty()) {
+        expect_unshared(instance);
         instance->__name_space = name_space;
+    }
     for (const Meta_Feature* feature : features(instance)) {
         if (!(feature->flags & FLAG_REFERENCE))
             continue;
@@ -111,6 +114,7 @@ void copy_keys(Instance* dest, const Instance* src) {
 void nullify(Instance* instance, bool keys, bool non_keys, uint8 value) {
     if (!keys && !non_keys)
         return;
+    expect_unshared(instance);
     const bool all = keys && non_keys;
     for (const Meta_Feature* feature : features(instance)) {
         if (!all && is_key(feature) != keys)
@@ -131,6 +135,7 @@ void nullify_non_keys(Instance* instance) {
 }
 
 void clear(Instance* instance) {
+    expect_unshared(instance);
     instance->__name_space.clear();
     for (const Meta_Feature* feature : features(instance)) {
         if (feature->flags & FLAG_PROPERTY)

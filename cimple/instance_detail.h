@@ -40,6 +40,14 @@ inline const Array<Instance*>& references(const Instance* instance, const Meta_R
     return member_as<Array<Instance*>>(instance, feature->offset);
 }
 
+// What others count is theirs as well: to be called before a write. Builds that check say so at
+// once; what is written past these functions shows later (shared_instances.h).
+inline void expect_unshared([[maybe_unused]] const Instance* instance) {
+#ifdef CIMPLE_CHECK_LOCKS
+    CIMPLE_ASSERT(!is_shared(instance));
+#endif
+}
+
 // Copies the value and the null flag of a property into one of the same type and subscript, which
 // may stand at another offset.
 void copy_value(Instance* to, const Meta_Property* in_to, const Instance* from,

@@ -4,7 +4,9 @@
 #include "derivedObjects/pattern.h"
 #include "tests/agent/agent_fixture.h"
 
+#include <atomic>
 #include <stdexcept>
+#include <thread>
 
 namespace cimple {
 
@@ -77,6 +79,38 @@ TEST_F(Pattern_Test, SharesWhatItDelivers) {
     taken.more = false;
     EXPECT_EQ(pattern_enum_instances(product_row(), {&Taken::take, &taken}), 0);
     EXPECT_EQ(taken.names.size(), 1u) << "the handler has asked to stop";
+}
+
+// Two properties that are changed together are read together, however long a reader takes.
+TEST_F(Pattern_Test, NoReaderSeesHalfAChange) {
+    constexpr int CHANGES = 2000;
+    put_product("0");
+    auto& store = agent->m_VLNMPCA_Product_map;
+    std::atomic<bool> done{false};
+    const Instance_Proc compare = [](const Instance* instance, sint32, void*) {
+        const Ref<const VLNMPCA_Product> product(instance);
+        const std::string name = product->Caption.value.c_str();
+        std::this_thread::yield();
+        EXPECT_EQ(name, product->Description.value.c_str());
+        return true;
+    };
+    std::vector<std::thread> readers;
+    for (int i = 0; i < 3; ++i)
+        readers.emplace_back([&] {
+            while (!done)
+                pattern_enum_instances(product_row(), {compare, nullptr});
+        });
+    for (int i = 1; i <= CHANGES; ++i) {
+        Auto_Mutex lock(agent->m_DataMutex);
+        change(store, 0u, [i](VLNMPCA_Product& product) {
+            product.Caption.set(std::to_string(i).c_str());
+            product.Description.set(std::to_string(i).c_str());
+        });
+    }
+    done = true;
+    for (std::thread& reader : readers)
+        reader.join();
+    EXPECT_STREQ(store[0]->Caption.value.c_str(), std::to_string(CHANGES).c_str());
 }
 
 TEST_F(Pattern_Test, ExceptionsEndInTheGuardOfTheShape) {

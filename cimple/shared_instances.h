@@ -17,10 +17,10 @@ class Shared_Instances {
 public:
     void reserve(std::size_t count) { _instances.reserve(count); }
     void add(const Instance* instance) {
-        _instances.push_back(Ref<const Instance>::share(instance));
 #ifdef CIMPLE_CHECK_LOCKS
-        _as_taken.emplace_back(clone(instance));
+        _as_taken.push_back(Ref<Instance>(clone(instance)));
 #endif
+        _instances.push_back(Ref<const Instance>::share(instance));
     }
 
     std::size_t size() const noexcept {

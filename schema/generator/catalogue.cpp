@@ -1,5 +1,6 @@
 #include "schema/generator/cpp_text.h"
 #include "schema/generator/generator.h"
+#include "schema/mof_parser/word_map.h"
 
 #include <algorithm>
 #include <fstream>
@@ -85,6 +86,7 @@ void check_feature(const mof::Schema& schema, const mof::Schema_Class& owner,
     check_key(owner, feature);
     check_parameters(owner, feature);
     check_target(schema, feature);
+    mof::Word_Map::read(feature);
     check_spelling(feature.position, feature.name, owner.find(feature.name)->first->name);
     // The engine's array members grow: a fixed length would be a promise that nobody keeps.
     if (feature.array > 0)
@@ -92,6 +94,7 @@ void check_feature(const mof::Schema& schema, const mof::Schema_Class& owner,
     for (const mof::Parameter& parameter : feature.parameters) {
         check_name(schema, parameter, method_type(owner.name(), feature));
         check_target(schema, parameter);
+        mof::Word_Map::read(parameter);
         if (parameter.array > 0)
             throw mof::Error(parameter.position, "an array of fixed length is not supported");
     }

@@ -62,10 +62,11 @@ std::string qualifier_declarations(const mof::Document& document) {
     std::ostringstream out;
     for (const mof::Qualifier_Declaration& each : document.qualifiers) {
         out << "Qualifier " << each.name << " : " << mof::type_name(each.type)
-            << (each.array == mof::scalar ? "" : "[]") << " = ";
-        // The words that we use have boolean defaults or none.
+            << (each.array == mof::scalar ? "" : "[]");
+        // The words that we use have boolean defaults or none, and a list goes without.
         bool boolean = each.default_value && each.default_value->kind == mof::Value::Kind::boolean;
-        out << (!boolean ? "null" : each.default_value->boolean ? "true" : "false");
+        if (each.array == mof::scalar)
+            out << " = " << (!boolean ? "null" : each.default_value->boolean ? "true" : "false");
         joined(out, "Scope", each.scopes);
         joined(out, "Flavor", each.flavors);
         out << ";\n";

@@ -1,4 +1,4 @@
-// Splits MOF text into tokens. Internal to the parser.
+// Splits MOF text into tokens, and what numbers the types hold. Internal to the parser.
 #ifndef SCHEMA_MOF_PARSER_LEXER_H
 #define SCHEMA_MOF_PARSER_LEXER_H
 
@@ -51,6 +51,14 @@ private:
     std::uint32_t _line = 1;
     std::uint32_t _column = 1;
 };
+
+struct Integer_Range {
+    Type type;
+    std::uint64_t max;       // largest value
+    std::uint64_t below = 0; // magnitude of the smallest
+};
+// Null for a type that is no integer.
+const Integer_Range* integer_range(Type type);
 
 } // namespace mof
 

@@ -30,11 +30,6 @@ std::string shown(const Token& token) {
 
 // ---- Fitting a value to its type ----
 
-struct Integer_Range {
-    Type type;
-    std::uint64_t max;       // largest value
-    std::uint64_t below = 0; // magnitude of the smallest
-};
 constexpr Integer_Range INTEGER_RANGES[] = {
     {Type::uint8, 0xFF},        {Type::sint8, 0x7F, 0x80},
     {Type::uint16, 0xFFFF},     {Type::sint16, 0x7FFF, 0x8000},
@@ -42,12 +37,16 @@ constexpr Integer_Range INTEGER_RANGES[] = {
     {Type::uint64, ~0ull},      {Type::sint64, ~0ull >> 1, 1ull << 63},
 };
 
+} // namespace
+
 const Integer_Range* integer_range(Type type) {
     for (const Integer_Range& range : INTEGER_RANGES)
         if (range.type == type)
             return &range;
     return nullptr;
 }
+
+namespace {
 
 // 25 characters: yyyymmddhhmmss.mmmmmmsutc or ddddddddhhmmss.mmmmmm:000, with '*' for an unknown
 // digit.

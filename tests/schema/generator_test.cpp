@@ -103,6 +103,38 @@ TEST_F(Generated, ASecondRunTouchesNothing) {
     EXPECT_GT(files, 441u);
 }
 
+// What documents a class reaches object managers, and costs the library nothing.
+TEST(Generator, DescriptionsStayInTheMof) {
+    const generator::Output here(".");
+    const std::string qualifiers = contents(MOF_FOLDER "/qualifiers.mof");
+    const std::string documented = R"([Version("1.0.0"), Description("Long, "
+    "and wrapped.")]
+class VLNMPCA_A
+{
+    [Key, Description("Name.")] string Id;
+    [PUnit("byte"), Description("Room.")] uint64 Size;
+
+    [Description("Runs."), ValueMap{"0", ".."}, Values{"Done", "Failed"}]
+    uint32 Run(
+        [In, Description("How."), ValueMap{"1"}, Values{"At once"}] uint8 Mode);
+};)";
+    here.write("documented.mof", qualifiers + documented);
+    here.write("plain.mof", qualifiers + "class VLNMPCA_A { [Key] string Id; uint64 Size;"
+                                         " uint32 Run([In] uint8 Mode); };");
+    for (const char* name : {"plain", "documented"}) {
+        fs::remove_all(name);
+        const std::string to = std::string(name) + "/out " + name + "/share 1 1 1";
+        ASSERT_EQ(run(name + std::string(".mof ") + to), (std::pair<std::string, int>("", 0)));
+    }
+    EXPECT_NE(contents("documented/share/vorlan_mpca_provider.mof").find(documented),
+              std::string::npos);
+    for (const auto& entry : fs::recursive_directory_iterator("plain/out"))
+        if (entry.is_regular_file()) {
+            const fs::path other = "documented" / fs::relative(entry.path(), "plain");
+            EXPECT_EQ(contents(entry.path()), contents(other)) << other;
+        }
+}
+
 TEST(Generator, EndsWithThePlaceOfTheFault) {
     const generator::Output here(".");
     here.write("mof/main.mof", "#pragma include (\"part.mof\")\n");
@@ -149,6 +181,22 @@ TEST(Generator, RefusesWhatTheTablesCannotHold) {
         {"class A { uint8 v[3]; };", ":1:17: an array of fixed length is not supported"},
         {"class A { uint8 f(uint8 v[3]); };", ":1:25: an array of fixed length is not supported"},
         {"class A { uint8 v[] = {1, null}; };", ":1:27: null inside an array"},
+        // Words for values
+        {"class A { [ValueMap{\"1\"}, Values{\"a\", \"b\"}] uint8 v; };",
+         ":1:27: Values has 2 words for the 1 entries of ValueMap"},
+        {"class A { [Values{\"a\"}] uint8 f(); };", ":1:12: ValueMap and Values belong together"},
+        {"class A { uint8 f([ValueMap{\"1\"}] uint8 x); };",
+         ":1:20: ValueMap and Values belong together"},
+        {"class A { [ValueMap{\"2..1\"}, Values{\"a\"}] uint8 v; };",
+         ":1:12: '2..1' of ValueMap is no value of the type"},
+        {"class A { [ValueMap{\"256\"}, Values{\"a\"}] uint8 v; };",
+         ":1:12: '256' of ValueMap is no value of the type"},
+        {"class A { [ValueMap{\"x\"}, Values{\"a\"}] uint8 v; };",
+         ":1:12: 'x' of ValueMap is no value of the type"},
+        {"class A { [ValueMap{\"1..4\", \"4\"}, Values{\"a\", \"b\"}] uint8 v; };",
+         ":1:12: '4' of ValueMap is claimed twice"},
+        {"class A { [ValueMap{\"1\"}, Values{\"a\"}] boolean v; };",
+         ":1:12: a boolean has no ValueMap"},
         // Keys and ends
         {"[Abstract] class VLNMPCA_A { [Key] uint8 x; };",
          ":1:18: a provided class cannot be abstract"},

@@ -1,4 +1,5 @@
 #include "schema/mof_parser/mof.h"
+#include "schema/mof_parser/word_map.h"
 
 #include <gtest/gtest.h>
 
@@ -103,6 +104,28 @@ TEST(MofSchema, RefusesWhatDoesNotHoldTogether) {
             EXPECT_STREQ(error.what(), bad.message) << bad.text;
         }
     }
+}
+
+TEST(MofWords, RangesAndTheRest) {
+    const mof::Document document = mof::parse_text(R"(
+        class A {
+            [ValueMap{"-2", "0x3..5", "6..", ".."}, Values{"below", "some", "many", "rest"}]
+            sint16 number;
+            [ValueMap{"a", "b"}, Values{"first", "second"}] string text[];
+            [ValueMap{"..0", "18446744073709551615"}, Values{"none", "all"}] uint64 wide;
+            uint8 plain;
+        };)",
+                                                   "t.mof");
+    const std::vector<mof::Feature>& features = document.classes[0].features;
+    const auto numbers = mof::Word_Map::read(features[0]);
+    for (const auto& [value, word] : std::map<int, std::string>{
+             {-2, "below"}, {3, "some"}, {5, "some"}, {6, "many"}, {32767, "many"}, {2, "rest"}})
+        EXPECT_EQ(*numbers->find(std::int64_t{value}), word) << value;
+    const auto texts = mof::Word_Map::read(features[1]);
+    EXPECT_EQ(*texts->find("b"), "second");
+    EXPECT_EQ(texts->find("c"), nullptr);
+    EXPECT_THROW(mof::Word_Map::read(features[2]), mof::Error) << "past what an answer shows";
+    EXPECT_FALSE(mof::Word_Map::read(features[3]));
 }
 
 } // namespace

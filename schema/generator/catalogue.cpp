@@ -117,6 +117,11 @@ void check_class(const mof::Schema_Class& schema_class) {
                       [](const mof::Schema_Feature& feature) {
                           return feature.kind() == mof::Feature_Kind::reference;
                       });
+    // MOF tells an association by the first word of the list; some compilers insist.
+    const mof::Qualifiers& qualifiers = schema_class.qualifiers();
+    if (mof::is_true(qualifiers, "Association") &&
+        !mof::same_name(qualifiers.front().name, "Association"))
+        refuse("Association is the first qualifier of a class");
     if (schema_class.is_association && references < 2)
         refuse("an association has two references at least");
     if (!is_provided(schema_class))

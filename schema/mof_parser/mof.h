@@ -122,6 +122,7 @@ struct Feature : Declaration {
     Feature_Kind kind = Feature_Kind::property;
     std::optional<Value> default_value; // also for an explicit "= null"
     std::vector<Parameter> parameters;
+    std::string text; // as written, from its qualifiers to the semicolon
     bool is_override() const { return find(qualifiers, "Override") != nullptr; }
 };
 

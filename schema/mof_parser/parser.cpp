@@ -174,6 +174,10 @@ private:
     Value scalar_value();
     Value value();
     std::string joined_text();
+    // From a token's first byte to the end of the present one, which is a sign.
+    std::string text_since(std::size_t start) const {
+        return _sources.back()->text.substr(start, _token.offset + 1 - start);
+    }
 
     const Reader& _reader;
     std::vector<std::unique_ptr<Source>> _sources; // the innermost include last
@@ -367,13 +371,14 @@ void Parser::class_declaration() {
     while (!is_sign('}'))
         declared.features.push_back(feature());
     advance();
-    declared.text = _sources.back()->text.substr(start, _token.offset + 1 - start);
+    declared.text = text_since(start);
     expect_sign(';', "after the class");
     _document.classes.push_back(std::move(declared));
 }
 
 Feature Parser::feature() {
     Feature declared;
+    const std::size_t start = _token.offset;
     if (is_sign('['))
         declared.qualifiers = qualifiers();
     type_and_name(declared, "a feature");
@@ -392,6 +397,7 @@ Feature Parser::feature() {
         }
         embedded_target(declared);
     }
+    declared.text = text_since(start);
     expect_sign(';', "after the feature");
     return declared;
 }

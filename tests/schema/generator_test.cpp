@@ -7,6 +7,7 @@
 
 #include <algorithm>
 #include <cstdio>
+#include <set>
 
 namespace {
 
@@ -61,27 +62,164 @@ TEST_F(Generated, RegistrationStanzas) {
     EXPECT_EQ(text.compare(0, 37, "[VLNMPCA_SoftwareInstallationService]"), 0);
 }
 
-// Reads as a compiler does that knows only what came before.
-TEST_F(Generated, SharedMofReadsInOnePass) {
-    const std::string all = contents("share/vorlan_mpca_qualifiers.mof") +
-                            contents("share/vorlan_mpca_base.mof") +
-                            contents("share/vorlan_mpca_provider.mof");
-    const mof::Schema schema(mof::parse_text(all, "share"));
-    EXPECT_EQ(schema.classes().size(), 441u);
-    EXPECT_FALSE(schema.document().qualifiers.empty());
-    for (const auto& each : schema.classes()) {
-        const auto known = [&](const mof::Declaration& declaration) {
-            if (declaration.target.empty())
-                return;
-            EXPECT_LE(schema.find(declaration.target)->number, each->number)
-                << each->name() << " names " << declaration.target;
-        };
-        for (const mof::Feature& feature : each->declaration->features) {
-            known(feature);
-            for (const mof::Parameter& parameter : feature.parameters)
-                known(parameter);
-        }
+// ---- The layers of MOF ----
+
+constexpr const char* QUALIFIERS = "10_vorlan_mpca_qualifiers.mof";
+constexpr const char* BASE = "20_vorlan_mpca_base.mof";
+constexpr const char* PROVIDER = "30_vorlan_mpca_provider.mof";
+constexpr const char* ADDITIONS = "final/20_vorlan_mpca_additions.mof";
+constexpr const char* INTEROP = "interop/30_vorlan_mpca_interop.mof";
+
+mof::Document document_of(const std::vector<const char*>& files) {
+    std::string text;
+    for (const char* file : files)
+        text += contents(std::string("share/mof/") + file);
+    return mof::parse_text(text, "share");
+}
+
+using Names = std::set<std::string>;
+
+Names names_of(const mof::Document& document) {
+    Names names;
+    for (const mof::Class& each : document.classes)
+        names.insert(each.name);
+    return names;
+}
+
+// The superclass, and the classes of references and embedded objects.
+Names named_by(const mof::Class& declared) {
+    Names names;
+    for (const mof::Feature& feature : declared.features) {
+        names.insert(feature.target);
+        for (const mof::Parameter& parameter : feature.parameters)
+            names.insert(parameter.target);
     }
+    names.insert(declared.superclass);
+    names.erase("");
+    return names;
+}
+
+// As a compiler reads it that knows only what came before; and each class has its version.
+void expect_loads(const mof::Document& document) {
+    const mof::Schema schema{mof::Document(document)};
+    Names known;
+    for (const mof::Class& each : document.classes) {
+        known.insert(each.name);
+        for (const std::string& name : named_by(each))
+            EXPECT_TRUE(known.count(name)) << each.name << " names " << name;
+        EXPECT_TRUE(mof::find(each.qualifiers, "Version")) << each.name;
+    }
+}
+
+bool is_experimental(const mof::Qualifiers& qualifiers) {
+    return mof::is_true(qualifiers, "Experimental");
+}
+
+// Of the base classes that are Experimental here these are in Final releases all the same.
+const Names FINAL_LATER = {"CIM_DiagnosticSettingData", "CIM_VLANEndpointSettingData"};
+
+// Gives a class what it would have from a superclass that is not there.
+void fold(mof::Class& into, const mof::Class& superclass) {
+    into.superclass = superclass.superclass;
+    for (mof::Feature inherited : superclass.features) {
+        const auto own =
+            std::find_if(into.features.begin(), into.features.end(),
+                         [&](const mof::Feature& each) { return each.name == inherited.name; });
+        if (own == into.features.end())
+            into.features.push_back(inherited);
+        else if (!inherited.is_override())
+            std::erase_if(own->qualifiers,
+                          [](const auto& each) { return each.name == "Override"; });
+    }
+}
+
+// A Final CIM Schema as poor as one can be: whatever has been Experimental is not there.
+mof::Document final_schema() {
+    mof::Document document = document_of({QUALIFIERS, BASE});
+    std::map<std::string, mof::Class> gone;
+    std::vector<mof::Class> classes;
+    for (mof::Class& each : document.classes) {
+        if (const auto found = gone.find(each.superclass); found != gone.end())
+            fold(each, found->second);
+        std::erase_if(each.features,
+                      [](const auto& one) { return is_experimental(one.qualifiers); });
+        if (is_experimental(each.qualifiers) && !FINAL_LATER.count(each.name))
+            gone.emplace(each.name, each);
+        else
+            classes.push_back(each);
+    }
+    document.classes = std::move(classes);
+    return document;
+}
+
+mof::Document over(mof::Document below, const std::vector<const char*>& files) {
+    for (mof::Class& each : document_of(files).classes)
+        below.classes.push_back(std::move(each));
+    return below;
+}
+
+TEST_F(Generated, LayersLoadOverWhatTheyNeed) {
+    expect_loads(document_of({QUALIFIERS, BASE, PROVIDER}));
+    expect_loads(over(final_schema(), {ADDITIONS, PROVIDER}));
+    expect_loads(document_of({QUALIFIERS, BASE, INTEROP}));
+    expect_loads(over(final_schema(), {INTEROP}));
+    EXPECT_EQ(names_of(document_of({PROVIDER})).size(), 299u);
+    EXPECT_EQ(names_of(document_of({BASE})).size(), 139u);
+    // As tools take a folder: by the names of its files.
+    Names files;
+    for (const auto& entry : fs::directory_iterator("share/mof"))
+        if (entry.is_regular_file())
+            files.insert(entry.path().filename());
+    EXPECT_EQ(files, (Names{QUALIFIERS, BASE, PROVIDER}));
+}
+
+TEST_F(Generated, AdditionsAreWhatOursNeedAndNoFinalSchemaHas) {
+    Names used;
+    for (const mof::Class& each : document_of({ADDITIONS, PROVIDER}).classes)
+        used.merge(named_by(each));
+    const Names present = names_of(over(final_schema(), {PROVIDER}));
+    Names missing;
+    std::set_difference(used.begin(), used.end(), present.begin(), present.end(),
+                        std::inserter(missing, missing.end()));
+    EXPECT_EQ(names_of(document_of({ADDITIONS})), missing);
+    EXPECT_EQ(missing, (Names{"CIM_ProductElementComponent", "CIM_SCSIArbitraryLogicalUnit",
+                              "CIM_iSCSISessionStatistics"}));
+}
+
+TEST_F(Generated, InteropHasWhatTellsOfProfiles) {
+    const Names interop = names_of(document_of({INTEROP}));
+    for (const mof::Class& each : document_of({PROVIDER}).classes)
+        EXPECT_TRUE(each.name.find("Profile") == std::string::npos || interop.count(each.name))
+            << each.name;
+    EXPECT_LT(interop.size(), 30u);
+}
+
+// What is written reads back as it was: the generator makes the same of it again.
+TEST_F(Generated, MofOfTheLayersIsWhole) {
+    std::string all;
+    for (const char* file : {QUALIFIERS, BASE, PROVIDER})
+        all += std::string("#pragma include (\"share/mof/") + file + "\")\n";
+    generator::Output(".").write("again.mof", all);
+    ASSERT_EQ(run("again.mof out_again share_again 1 1 1"), (std::pair<std::string, int>("", 0)));
+    for (const char* file : {QUALIFIERS, BASE, PROVIDER, ADDITIONS, INTEROP})
+        EXPECT_EQ(contents(std::string("share_again/mof/") + file),
+                  contents(std::string("share/mof/") + file));
+    // Nothing of the catalogue is lost but what is of other parties.
+    const mof::Schema catalogue = mof::load_schema(MOF_FOLDER "/catalogue.mof");
+    const mof::Schema written = mof::load_schema("again.mof");
+    const auto features = [](const mof::Schema_Class& of) {
+        std::string text;
+        for (const mof::Schema_Feature& each : of.features)
+            if (each.name() != "LocationIndicator") // in the class that sets it
+                text += each.feature->text + "\n";
+        return text;
+    };
+    for (const auto& each : catalogue.classes())
+        if (each->name().starts_with("CIM_") || each->name().starts_with("VLNMPCA_")) {
+            EXPECT_EQ(features(*each), features(*written.find(each->name())));
+        }
+    EXPECT_EQ(written.find("CIM_LogicalDevice")->find("LocationIndicator"), nullptr);
+    EXPECT_NE(written.find("VLNMPCA_EthernetPort")->find("LocationIndicator"), nullptr);
 }
 
 TEST_F(Generated, ASecondRunTouchesNothing) {
@@ -126,7 +264,7 @@ class VLNMPCA_A
         const std::string to = std::string(name) + "/out " + name + "/share 1 1 1";
         ASSERT_EQ(run(name + std::string(".mof ") + to), (std::pair<std::string, int>("", 0)));
     }
-    EXPECT_NE(contents("documented/share/vorlan_mpca_provider.mof").find(documented),
+    EXPECT_NE(contents("documented/share/mof/30_vorlan_mpca_provider.mof").find(documented),
               std::string::npos);
     for (const auto& entry : fs::recursive_directory_iterator("plain/out"))
         if (entry.is_regular_file()) {
@@ -204,6 +342,8 @@ TEST(Generator, RefusesWhatTheTablesCannotHold) {
          ":1:29: a provided class has a key at least"},
         {"[Association] class A { [Key] A ref x; };",
          ":1:21: an association has two references at least"},
+        {"[Abstract, Association] class A { [Key] A ref x; [Key] A ref y; };",
+         ":1:31: Association is the first qualifier of a class"},
         {"class A { [Key] uint8 x; }; class B : A { [Key] uint8 y; };",
          ":1:55: 'y' is a key below A, which has its keys"},
         {"class A { [Key] uint8 x; uint8 y; }; class B : A { [Override(\"y\"), Key] uint8 y; };",

@@ -1,5 +1,8 @@
 #include "host/class_repository.h"
 
+#include <algorithm>
+#include <limits>
+
 namespace host {
 
 namespace {
@@ -16,7 +19,50 @@ CMPIType cmpi_type(const mof::Declaration& declaration) {
     return declaration.array == mof::scalar ? type : static_cast<CMPIType>(type | CMPI_ARRAY);
 }
 
+// A text qualifier's value.
+std::string text_of(const mof::Qualifier* qualifier) {
+    return qualifier ? qualifier->value.text : "";
+}
+
+// Null where nothing is said, as of most base classes. Find gives a qualifier by its name.
+template <class Find>
+std::shared_ptr<const Meaning> meaning_of(mof::Type type, Find find) {
+    Meaning meaning{text_of(find("Description")), text_of(find("PUnit")),
+                    mof::Word_Map::read(find("ValueMap"), find("Values"), type)};
+    if (meaning.description.empty() && meaning.unit.empty() && !meaning.words)
+        return nullptr;
+    return std::make_shared<const Meaning>(std::move(meaning));
+}
+
+std::shared_ptr<const Meaning> meaning_of(const mof::Schema_Feature& feature) {
+    return meaning_of(feature.feature->type,
+                      [&](const char* name) { return mof::Schema::qualifier(feature, name); });
+}
+
+std::shared_ptr<const Meaning> inherited(const Class& from, const std::string& name) {
+    const Property* property = from.superclass->find_property(name);
+    return property ? property->meaning : from.superclass->find_method(name)->result.meaning;
+}
+
+std::shared_ptr<const Meaning> meaning_of(const mof::Parameter& parameter) {
+    return meaning_of(parameter.type,
+                      [&](const char* name) { return mof::find(parameter.qualifiers, name); });
+}
+
 } // namespace
+
+const std::string* word_of(const Slot_Type& slot, const Value& value) {
+    if (!slot.meaning || !slot.meaning->words || value.is_null() || value.is_array())
+        return nullptr;
+    const mof::Word_Map& words = *slot.meaning->words;
+    if (value.type == CMPI_string)
+        return words.find(value.as_text());
+    if (is_unsigned(value.type)) {
+        constexpr std::uint64_t largest = std::numeric_limits<std::int64_t>::max();
+        return words.find(static_cast<std::int64_t>(std::min(value.as_unsigned(), largest)));
+    }
+    return is_signed(value.type) ? words.find(value.as_signed()) : nullptr;
+}
 
 const Parameter* Method::find(std::string_view wanted) const {
     for (const Parameter& parameter : parameters)
@@ -76,29 +122,37 @@ Class& ClassRepository::append(std::string name, const Class* superclass) {
     return *_classes.back();
 }
 
+Slot_Type ClassRepository::slot_of(const mof::Declaration& declaration) const {
+    return {cmpi_type(declaration), declaration.is_embedded(), find(declaration.target)};
+}
+
+Method ClassRepository::method_of(const mof::Feature& declared, Slot_Type result) const {
+    Method method{
+        declared.name, std::move(result), mof::is_true(declared.qualifiers, "Static"), {}};
+    for (const mof::Parameter& each : declared.parameters) {
+        Slot_Type slot = slot_of(each);
+        slot.meaning = meaning_of(each);
+        method.parameters.push_back({std::move(slot), each.name, each.is_in(), each.is_out()});
+    }
+    return method;
+}
+
 void ClassRepository::fill(Class& target, const mof::Schema_Class& source) {
-    const auto slot = [this](const mof::Declaration& declaration) {
-        return Slot_Type{cmpi_type(declaration), declaration.is_embedded(),
-                         find(declaration.target)};
-    };
     target.is_association = source.is_association;
     target.text = source.declaration->text;
+    target.description = text_of(mof::find(source.qualifiers(), "Description"));
     for (const mof::Schema_Feature& feature : source.features) {
+        Slot_Type slot = slot_of(*feature.feature);
+        // What is inherited as it is means what it means above.
+        slot.meaning = feature.local ? meaning_of(feature) : inherited(target, feature.name());
         if (feature.kind() == mof::Feature_Kind::method) {
-            Method method{feature.name(),
-                          slot(*feature.feature),
-                          mof::is_true(feature.feature->qualifiers, "Static"),
-                          {}};
-            for (const mof::Parameter& parameter : feature.feature->parameters)
-                method.parameters.push_back(
-                    {slot(parameter), parameter.name, parameter.is_in(), parameter.is_out()});
-            target.methods.push_back(std::move(method));
+            target.methods.push_back(method_of(*feature.feature, std::move(slot)));
             continue;
         }
         if (feature.key)
             target.keys.push_back(target.properties.size());
         target.index.emplace(feature.name(), target.properties.size());
-        target.properties.push_back({slot(*feature.feature), feature.name(), feature.key});
+        target.properties.push_back({std::move(slot), feature.name(), feature.key});
     }
 }
 

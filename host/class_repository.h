@@ -7,7 +7,7 @@
 
 #include "host/text.h"
 #include "host/value.h"
-#include "schema/mof_parser/mof.h"
+#include "schema/mof_parser/word_map.h"
 
 #include <memory>
 #include <optional>
@@ -19,12 +19,23 @@ namespace host {
 
 struct Class;
 
+// What the MOF tells people of a property, a parameter or a method.
+struct Meaning {
+    std::string description;
+    std::string unit; // as PUnit has it
+    std::optional<mof::Word_Map> words;
+};
+
 // What a property, a parameter and the result of a method have in common.
 struct Slot_Type {
     CMPIType type = CMPI_string; // an embedded object has the type string, as in MOF
     bool embedded = false;
     const Class* target = nullptr; // of a reference or an embedded instance; null: any class
+    std::shared_ptr<const Meaning> meaning = nullptr; // null: the MOF says nothing
 };
+
+// The word for a value, or for an element of an array; null: the MOF has none.
+const std::string* word_of(const Slot_Type& slot, const Value& value);
 
 struct Property : Slot_Type {
     std::string name;
@@ -40,7 +51,7 @@ struct Parameter : Slot_Type {
 
 struct Method {
     std::string name;
-    Slot_Type result;
+    Slot_Type result; // with the meaning of the method
     bool is_static = false;
     std::vector<Parameter> parameters;
     const Parameter* find(std::string_view name) const;
@@ -53,6 +64,7 @@ struct Class {
     std::vector<Method> methods;
     std::vector<std::size_t> keys; // indices of properties
     std::string text;              // the declaration in MOF; empty for a class of the platform file
+    std::string description;
     bool is_association = false;
 
     static constexpr std::size_t npos = static_cast<std::size_t>(-1);
@@ -89,6 +101,8 @@ public:
 private:
     Class& append(std::string name, const Class* superclass);
     void fill(Class& target, const mof::Schema_Class& source);
+    Slot_Type slot_of(const mof::Declaration& declaration) const; // without meaning
+    Method method_of(const mof::Feature& declared, Slot_Type result) const;
 
     std::vector<std::unique_ptr<Class>> _classes;
     Name_Map<const Class*> _by_name;

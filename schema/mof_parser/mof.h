@@ -214,6 +214,11 @@ public:
     static bool is_subclass(const Schema_Class* ancestor, const Schema_Class* descendant);
     bool is_subclass(std::string_view ancestor, std::string_view descendant) const;
 
+    // A qualifier of a feature as it stands for the feature's class: an override that does not state
+    // it has that of the declaration that it overrides. Null: none has it. Not for the few that are
+    // not inherited.
+    static const Qualifier* qualifier(const Schema_Feature& feature, std::string_view name);
+
 private:
     std::unique_ptr<Document> _document;
     std::vector<std::unique_ptr<const Schema_Class>> _classes;

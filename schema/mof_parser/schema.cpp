@@ -228,6 +228,17 @@ const Schema_Class* Schema::find(std::string_view name) const {
     return found == _by_name.end() ? nullptr : found->second;
 }
 
+const Qualifier* Schema::qualifier(const Schema_Feature& feature, std::string_view name) {
+    const Schema_Feature* at = &feature;
+    while (at) {
+        if (const Qualifier* found = mof::find(at->feature->qualifiers, name))
+            return found;
+        const Schema_Class* above = at->owner->superclass;
+        at = above ? above->find(feature.name()) : nullptr;
+    }
+    return nullptr;
+}
+
 bool Schema::is_subclass(const Schema_Class* ancestor, const Schema_Class* descendant) {
     for (; descendant; descendant = descendant->superclass)
         if (descendant == ancestor)

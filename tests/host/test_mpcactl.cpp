@@ -65,6 +65,39 @@ TEST(Mpcactl, PrintsMof) {
                    "    Note  = NULL;\n};\n");
 }
 
+TEST(Mpcactl, PrintsWordsBesideValues) {
+    const auto words = [](std::vector<std::string> command) {
+        command.push_back("--words");
+        return run(command).out;
+    };
+    EXPECT_EQ(words({"enum", "Test_Good", "-p", "Level"}), "Level\n1 (Low)\n2\n3 (High)\n");
+    EXPECT_EQ(words({"assoc", A, "-p", "Level,Words"}),
+              "Level  Words\n0      one (First */ of all), two,three, NULL\n");
+    EXPECT_EQ(words({"get", A, "-p", "Level,Words", "--format", "mof"}),
+              "instance of Test_Good\n{\n"
+              "    Name  = \"a\";\n"
+              "    Level = 1 /* Low */;\n"
+              "    Words = {\"one\" /* First * / of all */, \"two,three\", NULL};\n};\n");
+    EXPECT_EQ(words({"invoke", A, "Echo", "Number=5"}),
+              "ReturnValue  0 (Done)\nNumberOut    5 (Five)\n");
+    EXPECT_EQ(words({"get", A, "--format", "json"}), run({"get", A, "--format", "json"}).out)
+        << "programs read numbers";
+}
+
+TEST(Mpcactl, AClassShowsWhatItMeans) {
+    const std::string text = run({"class", "Test_Good"}).out;
+    for (const char* part :
+         {"by the module\n\nSays what it hears.\n\nProperties\n",
+          "for a second line of the\n      text. [decibel]\n      1 Low; 3.. High\n  Big ",
+          "  uint32 Echo\n      Gives back what it is given.\n      0 Done; .. Failed\n    in "})
+        EXPECT_NE(text.find(part), std::string::npos) << part << "\n" << text;
+    const auto json = nlohmann::json::parse(run({"class", "Test_Good", "--format", "json"}).out);
+    EXPECT_EQ(json["description"], "Says what it hears.");
+    EXPECT_EQ(json["properties"][1]["unit"], "decibel");
+    EXPECT_EQ(json["methods"][0]["values"].dump(),
+              R"([{"value":"0","word":"Done"},{"value":"..","word":"Failed"}])");
+}
+
 TEST(Mpcactl, ChangesAndCalls) {
     EXPECT_EQ(run({"create", "Test_Good", "Name=it's, \"new\"", "Level=0x10"}).out,
               "Test_Good.Name=\"it's, \\\"new\\\"\"\n");

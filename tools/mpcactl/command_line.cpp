@@ -59,6 +59,8 @@ void add_common_options(CLI::App& app, Command& command) {
         ->type_name("FORMAT")
         ->take_last();
     app.add_flag("--wide", command.wide, "Tables with whole cells, however long their rows");
+    app.add_flag("--words", command.words,
+                 "Beside a value the word that it stands for, in tables and MOF");
 }
 
 // The options of the program, which each of its commands takes as well.
@@ -139,7 +141,8 @@ private:
     void add_class_commands() {
         CLI::App& classes = add("classes", "List the classes that the module serves");
         classes.add_flag("--all", _command.all, "All known classes, served or not");
-        class_argument(add("class", "Show a class: bases, keys, properties and methods"));
+        class_argument(
+            add("class", "Show a class: bases, keys, properties and methods, and what they mean"));
         CLI::App& enumerate = add("enum", "List the instances of a class and its subclasses");
         class_argument(enumerate);
         property_option(enumerate);

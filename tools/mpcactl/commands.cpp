@@ -49,8 +49,8 @@ Print_Context print_context(const Session& session, const Command& command) {
         size.ws_col > 0)
         width = size.ws_col;
     const bool cut_cells = terminal && !command.wide;
-    return {session.classes(),  command.format, command.name_space,
-            command.properties, width,          cut_cells};
+    return {session.classes(), command.format, command.name_space, command.properties, width,
+            cut_cells,         command.words};
 }
 
 host::Property_List properties(const Command& command,

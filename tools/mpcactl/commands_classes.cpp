@@ -4,6 +4,7 @@
 #include "host/value_json.h"
 
 #include <cstdio>
+#include <sstream>
 
 namespace mpcactl {
 
@@ -46,29 +47,49 @@ const char* direction(const host::Parameter& parameter) {
     return parameter.in && parameter.out ? "in out" : parameter.out ? "out" : "in";
 }
 
+// Adds what the MOF tells of it, if anything.
+host::Json with_meaning(host::Json json, const host::Slot_Type& slot) {
+    if (!slot.meaning)
+        return json;
+    if (!slot.meaning->description.empty())
+        json["description"] = slot.meaning->description;
+    if (!slot.meaning->unit.empty())
+        json["unit"] = slot.meaning->unit;
+    if (slot.meaning->words)
+        for (const mof::Word_Map::Entry& entry : slot.meaning->words->entries())
+            json["values"].push_back({{"value", entry.value}, {"word", entry.word}});
+    return json;
+}
+
 host::Json to_json(const host::Class& known, bool served) {
     host::Json properties = host::Json::array(), methods = host::Json::array();
     for (const host::Property& each : known.properties)
-        properties.push_back({{"name", each.name},
-                              {"type", type_text(each)},
-                              {"key", each.key},
-                              {"origin", origin(known, each.name)}});
+        properties.push_back(with_meaning({{"name", each.name},
+                                           {"type", type_text(each)},
+                                           {"key", each.key},
+                                           {"origin", origin(known, each.name)}},
+                                          each));
     for (const host::Method& method : known.methods) {
         host::Json parameters = host::Json::array();
         for (const host::Parameter& each : method.parameters)
-            parameters.push_back({{"name", each.name},
-                                  {"type", type_text(each)},
-                                  {"in", each.in},
-                                  {"out", each.out}});
-        methods.push_back({{"name", method.name},
-                           {"type", type_text(method.result)},
-                           {"static", method.is_static},
-                           {"parameters", parameters}});
+            parameters.push_back(with_meaning({{"name", each.name},
+                                               {"type", type_text(each)},
+                                               {"in", each.in},
+                                               {"out", each.out}},
+                                              each));
+        methods.push_back(with_meaning({{"name", method.name},
+                                        {"type", type_text(method.result)},
+                                        {"static", method.is_static},
+                                        {"parameters", parameters}},
+                                       method.result));
     }
-    return {
+    host::Json json = {
         {"name", known.name}, {"bases", base_names(known)}, {"association", known.is_association},
         {"served", served},   {"keys", key_names(known)},   {"properties", properties},
         {"methods", methods}};
+    if (!known.description.empty())
+        json["description"] = known.description;
+    return json;
 }
 
 std::string joined(const host::Json& names) {
@@ -78,23 +99,71 @@ std::string joined(const host::Json& names) {
     return text;
 }
 
+constexpr std::size_t TEXT_WIDTH = 100;
+
+// Words of a text, in lines of one indentation.
+void print_text(const std::string& text, const std::string& indentation) {
+    std::istringstream words(to_line(text));
+    std::string line;
+    for (std::string word; words >> word;) {
+        if (!line.empty() && indentation.size() + line.size() + 1 + word.size() > TEXT_WIDTH) {
+            std::printf("%s%s\n", indentation.c_str(), line.c_str());
+            line.clear();
+        }
+        line += (line.empty() ? "" : " ") + word;
+    }
+    if (!line.empty())
+        std::printf("%s%s\n", indentation.c_str(), line.c_str());
+}
+
+// Description and unit, and the values that have a word: "0 Off; 1 On".
+void print_meaning(const host::Slot_Type& slot, const std::string& indentation) {
+    if (!slot.meaning)
+        return;
+    const std::string& unit = slot.meaning->unit;
+    print_text(slot.meaning->description + (unit.empty() ? "" : " [" + unit + "]"), indentation);
+    if (!slot.meaning->words)
+        return;
+    std::string values;
+    for (const mof::Word_Map::Entry& entry : slot.meaning->words->entries())
+        values += (values.empty() ? "" : "; ") + entry.value + " " + entry.word;
+    print_text(values, indentation);
+}
+
 using Rows = std::vector<std::vector<std::string>>;
 
-// Columns side by side, each line indented.
-void print_rows(const Rows& rows, const std::string& indentation) {
+// Columns side by side, each line indented; behind each line what the slot of its row means, if
+// there are slots.
+void print_rows(const Rows& rows, const std::string& indentation,
+                const std::vector<const host::Slot_Type*>& slots = {}) {
     std::vector<std::size_t> widths;
     for (const auto& row : rows)
         for (std::size_t i = 0; i < row.size(); ++i) {
             widths.resize(std::max(widths.size(), i + 1));
             widths[i] = std::max(widths[i], row[i].size());
         }
-    for (const auto& row : rows) {
+    for (std::size_t at = 0; at < rows.size(); ++at) {
         std::string line = indentation;
-        for (std::size_t i = 0; i < row.size(); ++i)
-            line += row[i] + std::string(widths[i] - row[i].size() + 2, ' ');
+        for (std::size_t i = 0; i < rows[at].size(); ++i)
+            line += rows[at][i] + std::string(widths[i] - rows[at][i].size() + 2, ' ');
         line.erase(line.find_last_not_of(' ') + 1);
         std::printf("%s\n", line.c_str());
+        if (!slots.empty())
+            print_meaning(*slots[at], indentation + "    ");
     }
+}
+
+void print_method(const host::Method& method) {
+    std::printf("  %s %s%s\n", type_text(method.result).c_str(), method.name.c_str(),
+                method.is_static ? " (static)" : "");
+    print_meaning(method.result, "      ");
+    Rows parameters;
+    std::vector<const host::Slot_Type*> slots;
+    for (const host::Parameter& each : method.parameters) {
+        parameters.push_back({direction(each), each.name, type_text(each)});
+        slots.push_back(&each);
+    }
+    print_rows(parameters, "    ", slots);
 }
 
 void print_class(const host::Class& known, bool served) {
@@ -104,21 +173,21 @@ void print_class(const host::Class& known, bool served) {
                 {"Keys", keys.empty() ? "none" : keys},
                 {"Served", served ? "by the module" : "by nobody, its subclasses may be"}},
                "");
+    if (!known.description.empty())
+        std::printf("\n");
+    print_text(known.description, "");
     Rows properties;
-    for (const host::Property& each : known.properties)
+    std::vector<const host::Slot_Type*> slots;
+    for (const host::Property& each : known.properties) {
         properties.push_back(
             {each.name, type_text(each), each.key ? "key" : "", "of " + origin(known, each.name)});
-    std::printf("\nProperties%s\n", properties.empty() ? ": none" : "");
-    print_rows(properties, "  ");
-    std::printf("\nMethods%s\n", known.methods.empty() ? ": none" : "");
-    for (const host::Method& method : known.methods) {
-        std::printf("  %s %s%s\n", type_text(method.result).c_str(), method.name.c_str(),
-                    method.is_static ? " (static)" : "");
-        Rows parameters;
-        for (const host::Parameter& each : method.parameters)
-            parameters.push_back({direction(each), each.name, type_text(each)});
-        print_rows(parameters, "    ");
+        slots.push_back(&each);
     }
+    std::printf("\nProperties%s\n", properties.empty() ? ": none" : "");
+    print_rows(properties, "  ", slots);
+    std::printf("\nMethods%s\n", known.methods.empty() ? ": none" : "");
+    for (const host::Method& method : known.methods)
+        print_method(method);
 }
 
 } // namespace

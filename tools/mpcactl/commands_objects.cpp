@@ -71,12 +71,12 @@ int invoke(Session& session, const Command& command) {
         read_inputs(session.classes(), method, command.assignments, command.name_space);
     const host::Method_Result result = take(session.manager().invoke(path, method.name, inputs));
     const Print_Context context = print_context(session, command);
-    print_method_result(context, result);
+    print_method_result(context, method, result);
     if (!command.check || is_zero(result.value))
         return EXIT_FINE;
     std::fflush(stdout);
     std::fprintf(stderr, "mpcactl: %s returned %s\n", method.name.c_str(),
-                 to_cell(result.value, context.name_space).c_str());
+                 to_cell(context, &method.result, result.value).c_str());
     return EXIT_CIM;
 }
 

@@ -22,7 +22,8 @@ Exit status: 0 done; 1 a CIM error (its CMPI word stands on standard error) or f
 provider; 2 wrong usage.)"},
     {"classes", R"(  mpcactl classes --all --format json)"},
     {"class", R"(  mpcactl class VLNMPCA_EthernetPort)"},
-    {"enum", R"(  mpcactl --simulate two-port-cna enum VLNMPCA_EthernetPort -p DeviceID,Speed)"},
+    {"enum", R"(  mpcactl --simulate two-port-cna enum VLNMPCA_EthernetPort -p DeviceID,Speed
+  mpcactl --simulate two-port-cna enum VLNMPCA_EthernetPort --words --format mof)"},
     {"names", R"(  mpcactl --simulate two-port-cna names CIM_NetworkPort)"},
     {"census", R"(  mpcactl --simulate two-port-cna census)"},
     {"get",

@@ -29,7 +29,7 @@ void print_instances(const Print_Context& context, const std::vector<host::Insta
     }
     if (context.format == Format::mof) {
         for (const host::Instance& instance : instances)
-            write(to_mof(instance, context.name_space));
+            write(to_mof(context, instance));
         return;
     }
     // Associations answer several classes: a table for each, in the order of first appearance.
@@ -77,7 +77,8 @@ void print_path(const Print_Context& context, const host::ObjectPath& path) {
         write(text + "\n");
 }
 
-void print_method_result(const Print_Context& context, const host::Method_Result& result) {
+void print_method_result(const Print_Context& context, const host::Method& method,
+                         const host::Method_Result& result) {
     if (context.format == Format::json) {
         host::Json outputs = host::Json::object();
         for (const host::Named_Value& output : result.outputs)
@@ -90,13 +91,14 @@ void print_method_result(const Print_Context& context, const host::Method_Result
     std::size_t width = std::string(return_value).size();
     for (const host::Named_Value& output : result.outputs)
         width = std::max(width, output.name.size());
-    const auto line = [&](const std::string& name, const host::Value& value) {
-        write(name + std::string(width - name.size() + 2, ' ') +
-              to_cell(value, context.name_space) + "\n");
+    const auto line = [&](const std::string& name, const host::Slot_Type* slot,
+                          const host::Value& value) {
+        write(name + std::string(width - name.size() + 2, ' ') + to_cell(context, slot, value) +
+              "\n");
     };
-    line(return_value, result.value);
+    line(return_value, &method.result, result.value);
     for (const host::Named_Value& output : result.outputs)
-        line(output.name, output.value);
+        line(output.name, method.find(output.name), output.value);
 }
 
 } // namespace mpcactl

@@ -17,6 +17,7 @@ struct Print_Context {
     std::vector<std::string> columns; // asked for, in this order; empty: what there is
     std::size_t width;                // of a row, in characters
     bool cut_cells;                   // texts are shortened to the width of a cell
+    bool words;                       // beside the values that stand for one; not in JSON
 };
 
 // JSON: a list. Tables: one for each class, keys first; instances that are too wide for a row are
@@ -26,14 +27,21 @@ void print_instance(const Print_Context& context, const host::Instance& instance
 // One path a line, JSON: a list of texts.
 void print_paths(const Print_Context& context, const std::vector<host::ObjectPath>& paths);
 void print_path(const Print_Context& context, const host::ObjectPath& path);
-void print_method_result(const Print_Context& context, const host::Method_Result& result);
+void print_method_result(const Print_Context& context, const host::Method& method,
+                         const host::Method_Result& result);
 
 // ---- Parts, used by the above ----
 
 // The instance as MOF: "instance of Class {...};".
-std::string to_mof(const host::Instance& instance, const std::string& name_space);
-// A value on one line, safe for a terminal: control characters are escaped.
-std::string to_cell(const host::Value& value, const std::string& name_space);
+std::string to_mof(const Print_Context& context, const host::Instance& instance);
+// The word for a scalar, where words are wanted and the slot, which may be null, has one.
+const std::string* wanted_word(const Print_Context& context, const host::Slot_Type* slot,
+                               const host::Value& value);
+// A text on one line, safe for a terminal: control characters are escaped.
+std::string to_line(const std::string& text);
+// A value on one line, with its word.
+std::string to_cell(const Print_Context& context, const host::Slot_Type* slot,
+                    const host::Value& value);
 // Cuts a text to so many characters, with an ellipsis.
 std::string cut(const std::string& text, std::size_t width);
 std::string to_table(const Print_Context& context, const host::Class& known,

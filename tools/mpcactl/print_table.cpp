@@ -25,13 +25,7 @@ std::string scalar_to_cell(const host::Value& value, const std::string& name_spa
             .dump(-1, ' ', false, host::Json::error_handler_t::replace);
     if (!std::holds_alternative<std::string>(value.data))
         return host::number_to_text(value);
-    // The escapes of a quoted text, without its quotes and without escaped quotes and backslashes.
-    std::string cell;
-    for (char c : value.as_text()) {
-        const std::string quoted = host::quote(std::string(1, c));
-        cell += c == '"' || c == '\\' ? std::string(1, c) : quoted.substr(1, quoted.size() - 2);
-    }
-    return cell;
+    return to_line(value.as_text());
 }
 
 bool any_has(const std::vector<const host::Instance*>& instances, const std::string& property) {
@@ -59,12 +53,12 @@ std::vector<std::string> choose_columns(const Print_Context& context, const host
 }
 
 // A property that was asked for and is not there is null.
-std::string cell_of(const Print_Context& context, const host::Instance& instance,
-                    const std::string& column) {
+std::string cell_of(const Print_Context& context, const host::Class& known,
+                    const host::Instance& instance, const std::string& column) {
     const host::Value* value = instance.property(column);
     if (!value)
         return context.columns.empty() ? "" : "NULL";
-    return to_cell(*value, context.name_space);
+    return to_cell(context, known.find_property(column), *value);
 }
 
 std::string padded(const std::string& text, std::size_t width) {
@@ -91,7 +85,8 @@ std::string rows_to_text(const Rows& rows, const std::vector<std::size_t>& width
 }
 
 // A line for each property, a blank line between instances.
-std::string to_list(const Print_Context& context, const std::vector<std::string>& columns,
+std::string to_list(const Print_Context& context, const host::Class& known,
+                    const std::vector<std::string>& columns,
                     const std::vector<const host::Instance*>& instances) {
     std::size_t width = 0;
     for (const std::string& column : columns)
@@ -101,21 +96,41 @@ std::string to_list(const Print_Context& context, const std::vector<std::string>
         text += text.empty() ? "" : "\n";
         for (const std::string& column : columns)
             if (instance->property(column))
-                text +=
-                    trimmed_line(padded(column, width + GAP) + cell_of(context, *instance, column));
+                text += trimmed_line(padded(column, width + GAP) +
+                                     cell_of(context, known, *instance, column));
     }
     return text;
 }
 
 } // namespace
 
-std::string to_cell(const host::Value& value, const std::string& name_space) {
+const std::string* wanted_word(const Print_Context& context, const host::Slot_Type* slot,
+                               const host::Value& value) {
+    return context.words && slot ? host::word_of(*slot, value) : nullptr;
+}
+
+std::string to_line(const std::string& text) {
+    // The escapes of a quoted text, without its quotes and without escaped quotes and backslashes.
+    std::string line;
+    for (char c : text) {
+        const std::string quoted = host::quote(std::string(1, c));
+        line += c == '"' || c == '\\' ? std::string(1, c) : quoted.substr(1, quoted.size() - 2);
+    }
+    return line;
+}
+
+std::string to_cell(const Print_Context& context, const host::Slot_Type* slot,
+                    const host::Value& value) {
+    const auto one = [&](const host::Value& scalar) {
+        const std::string* word = wanted_word(context, slot, scalar);
+        return scalar_to_cell(scalar, context.name_space) +
+               (word ? " (" + to_line(*word) + ")" : "");
+    };
     if (!value.is_array() || value.is_null())
-        return scalar_to_cell(value, name_space);
+        return one(value);
     std::string cell;
     for (const host::Value& element : value.as_array())
-        cell += (&element == &value.as_array().front() ? "" : ", ") +
-                scalar_to_cell(element, name_space);
+        cell += (&element == &value.as_array().front() ? "" : ", ") + one(element);
     return cell;
 }
 
@@ -146,7 +161,7 @@ std::string to_table(const Print_Context& context, const host::Class& known,
     for (const host::Instance* instance : instances) {
         rows.emplace_back();
         for (const std::string& column : columns) {
-            const std::string cell = cell_of(context, *instance, column);
+            const std::string cell = cell_of(context, known, *instance, column);
             rows.back().push_back(context.cut_cells ? cut(cell, CELL_WIDTH) : cell);
         }
     }
@@ -158,7 +173,7 @@ std::string to_table(const Print_Context& context, const host::Class& known,
         std::accumulate(widths.begin(), widths.end(), columns.size() * GAP) - GAP;
     // Columns that were asked for stand side by side however wide they are.
     if (context.columns.empty() && total > context.width)
-        return to_list(context, columns, instances);
+        return to_list(context, known, columns, instances);
     return rows_to_text(rows, widths);
 }
 

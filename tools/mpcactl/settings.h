@@ -28,6 +28,7 @@ struct Command {
     std::string name_space = "root/vorlan";
     Format format = Format::table;
     bool wide = false;
+    bool words = false;
 
     // Of single commands
     std::string class_name;

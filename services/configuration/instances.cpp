@@ -14,6 +14,7 @@ Ref<VLNMPCA_ProviderConfigSetting> configuration_setting(const Tuning_Setting& r
                                                          uint32 current) {
     auto setting = make_instance<VLNMPCA_ProviderConfigSetting>();
     setting->InstanceID.set(row.instance_id);
+    setting->ElementName.set(row.name);
     setting->paramname.set(row.name);
     setting->Description.set(row.description);
     setting->lowRange.set(row.low);

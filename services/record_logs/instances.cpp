@@ -72,6 +72,7 @@ Ref<VLNMPCA_RecordLog> nima_log_instance(const CIM_ComputerSystem& system) {
 Ref<VLNMPCA_EnabledRecordLogCapabilities> capabilities_instance() {
     auto capabilities = make_instance<VLNMPCA_EnabledRecordLogCapabilities>();
     capabilities->InstanceID.set("VLNMPCA provider log capabilities");
+    capabilities->ElementName.set("Vorlan CIM Provider log capabilities");
     for (uint16 state : {STATE_ENABLED, STATE_DISABLED}) {
         capabilities->RequestedStatesSupported.append(state);
         capabilities->LogParamsSupported.append(state);

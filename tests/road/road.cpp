@@ -43,6 +43,21 @@ void load(const std::string& scenario) {
     ASSERT_EQ(status, 0) << error;
 }
 
+// A number that stands for a word according to the class, and has none there, tells a client
+// nothing.
+void expect_words(const host::Class& known, const host::Instance& instance) {
+    for (const host::Named_Value& named : instance.properties) {
+        const host::Property* property = known.find_property(named.name);
+        if (!property || !property->meaning || !property->meaning->words)
+            continue;
+        const host::Value::Array one = {named.value};
+        for (const host::Value& value : named.value.is_array() ? named.value.as_array() : one)
+            EXPECT_TRUE(value.is_null() || host::word_of(*property, value))
+                << "no word for " << known.name << "." << named.name << " "
+                << text_of(instance, named.name);
+    }
+}
+
 } // namespace
 
 Road::Road(const Setup& setup) : _root(fresh_folder()) {
@@ -93,6 +108,8 @@ void Road::close() {
 std::vector<host::Instance> Road::enumerate(const std::string& class_name) {
     auto reply = _manager->enumerate(class_name);
     EXPECT_TRUE(reply.ok()) << class_name << ": " << host::rc_name(reply.status.rc);
+    for (const host::Instance& instance : reply.value)
+        expect_words(*_manager->classes().find(instance.class_name()), instance);
     return std::move(reply.value);
 }
 

@@ -33,7 +33,8 @@ public:
     ~Road();
 
     host::Manager& manager() { return *_manager; }
-    // The instances of a class; the call must succeed.
+    // The instances of a class; the call must succeed, and the MOF have a word for each number that
+    // stands for one.
     std::vector<host::Instance> enumerate(const std::string& class_name);
     // Instances of every class that has any.
     std::map<std::string, std::size_t> census();

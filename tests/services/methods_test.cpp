@@ -39,9 +39,13 @@ TEST(Methods, AreImplementedOrRefusedAsAgreed) {
             continue;
         host::Instance instance;
         instance.path = path_of(*known);
-        for (const host::Method& method : known->methods)
-            found << known->name << '.' << method.name << '\t'
-                  << word(road.manager().invoke(instance.path, method.name, {}).status) << '\n';
+        for (const host::Method& method : known->methods) {
+            const auto reply = road.manager().invoke(instance.path, method.name, {});
+            found << known->name << '.' << method.name << '\t' << word(reply.status) << '\n';
+            const bool coded = method.result.meaning && method.result.meaning->words;
+            EXPECT_TRUE(!coded || !reply.ok() || host::word_of(method.result, reply.value.value))
+                << known->name << '.' << method.name << ": no word for what it returns";
+        }
         found << known->name << "\tcreate " << word(road.manager().create(instance).status)
               << ", modify " << word(road.manager().modify(instance)) << ", delete "
               << word(road.manager().remove(instance.path)) << '\n';

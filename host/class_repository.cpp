@@ -28,8 +28,9 @@ std::string text_of(const mof::Qualifier* qualifier) {
 template <class Find>
 std::shared_ptr<const Meaning> meaning_of(mof::Type type, Find find) {
     Meaning meaning{text_of(find("Description")), text_of(find("PUnit")),
-                    mof::Word_Map::read(find("ValueMap"), find("Values"), type)};
-    if (meaning.description.empty() && meaning.unit.empty() && !meaning.words)
+                    mof::Word_Map::read(find("ValueMap"), find("Values"), type),
+                    mof::Word_Map::read(find("BitMap"), find("BitValues"), type)};
+    if (meaning.description.empty() && meaning.unit.empty() && !meaning.words && !meaning.bits)
         return nullptr;
     return std::make_shared<const Meaning>(std::move(meaning));
 }
@@ -49,19 +50,39 @@ std::shared_ptr<const Meaning> meaning_of(const mof::Parameter& parameter) {
                       [&](const char* name) { return mof::find(parameter.qualifiers, name); });
 }
 
+// "One, Other"; nothing where no bit has a word. Bits that mean the same are told once.
+std::optional<std::string> words_of_bits(const mof::Word_Map& bits, std::uint64_t value) {
+    std::vector<std::string> words;
+    for (int bit = 0; bit < 64; ++bit) {
+        const std::string* word = (value >> bit & 1) != 0 ? bits.find(std::int64_t{bit}) : nullptr;
+        if (word && std::find(words.begin(), words.end(), *word) == words.end())
+            words.push_back(*word);
+    }
+    std::string text;
+    for (const std::string& word : words)
+        text += (text.empty() ? "" : ", ") + word;
+    return words.empty() ? std::nullopt : std::optional(text);
+}
+
 } // namespace
 
-const std::string* word_of(const Slot_Type& slot, const Value& value) {
-    if (!slot.meaning || !slot.meaning->words || value.is_null() || value.is_array())
-        return nullptr;
+std::optional<std::string> word_of(const Slot_Type& slot, const Value& value) {
+    if (!slot.meaning || value.is_null() || value.is_array())
+        return std::nullopt;
+    if (slot.meaning->bits)
+        return words_of_bits(*slot.meaning->bits, value.as_unsigned());
+    if (!slot.meaning->words)
+        return std::nullopt;
     const mof::Word_Map& words = *slot.meaning->words;
+    constexpr std::uint64_t largest = std::numeric_limits<std::int64_t>::max();
+    const std::string* word = nullptr;
     if (value.type == CMPI_string)
-        return words.find(value.as_text());
-    if (is_unsigned(value.type)) {
-        constexpr std::uint64_t largest = std::numeric_limits<std::int64_t>::max();
-        return words.find(static_cast<std::int64_t>(std::min(value.as_unsigned(), largest)));
-    }
-    return is_signed(value.type) ? words.find(value.as_signed()) : nullptr;
+        word = words.find(value.as_text());
+    else if (is_unsigned(value.type))
+        word = words.find(static_cast<std::int64_t>(std::min(value.as_unsigned(), largest)));
+    else if (is_signed(value.type))
+        word = words.find(value.as_signed());
+    return word ? std::optional(*word) : std::nullopt;
 }
 
 const Parameter* Method::find(std::string_view wanted) const {

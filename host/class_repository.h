@@ -22,8 +22,9 @@ struct Class;
 // What the MOF tells people of a property, a parameter or a method.
 struct Meaning {
     std::string description;
-    std::string unit; // as PUnit has it
-    std::optional<mof::Word_Map> words;
+    std::string unit;                   // as PUnit has it
+    std::optional<mof::Word_Map> words; // of values
+    std::optional<mof::Word_Map> bits;  // of the bits of a value, the lowest is 0
 };
 
 // What a property, a parameter and the result of a method have in common.
@@ -34,8 +35,8 @@ struct Slot_Type {
     std::shared_ptr<const Meaning> meaning = nullptr; // null: the MOF says nothing
 };
 
-// The word for a value, or for an element of an array; null: the MOF has none.
-const std::string* word_of(const Slot_Type& slot, const Value& value);
+// The word for a value that is no array, or the words for its bits; nothing: the MOF has none.
+std::optional<std::string> word_of(const Slot_Type& slot, const Value& value);
 
 struct Property : Slot_Type {
     std::string name;

@@ -51,6 +51,12 @@ void check_target(const mof::Schema& schema, const mof::Declaration& declaration
                        schema.find(declaration.target)->name());
 }
 
+void check_words(const mof::Declaration& declaration) {
+    mof::Word_Map::read(declaration);
+    mof::Word_Map::read(mof::find(declaration.qualifiers, "BitMap"),
+                        mof::find(declaration.qualifiers, "BitValues"), declaration.type);
+}
+
 bool same_parameter(const mof::Parameter& a, const mof::Parameter& b) {
     return mof::same_name(a.name, b.name) && a.type == b.type && a.array == b.array &&
            mof::same_name(a.target, b.target) && a.is_embedded() == b.is_embedded() &&
@@ -86,7 +92,7 @@ void check_feature(const mof::Schema& schema, const mof::Schema_Class& owner,
     check_key(owner, feature);
     check_parameters(owner, feature);
     check_target(schema, feature);
-    mof::Word_Map::read(feature);
+    check_words(feature);
     check_spelling(feature.position, feature.name, owner.find(feature.name)->first->name);
     // The engine's array members grow: a fixed length would be a promise that nobody keeps.
     if (feature.array > 0)
@@ -94,7 +100,7 @@ void check_feature(const mof::Schema& schema, const mof::Schema_Class& owner,
     for (const mof::Parameter& parameter : feature.parameters) {
         check_name(schema, parameter, method_type(owner.name(), feature));
         check_target(schema, parameter);
-        mof::Word_Map::read(parameter);
+        check_words(parameter);
         if (parameter.array > 0)
             throw mof::Error(parameter.position, "an array of fixed length is not supported");
     }

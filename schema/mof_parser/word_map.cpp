@@ -63,33 +63,33 @@ std::optional<Word_Map> Word_Map::read(const Declaration& declaration) {
                 mof::find(declaration.qualifiers, "Values"), declaration.type);
 }
 
-std::optional<Word_Map> Word_Map::read(const Qualifier* value_map, const Qualifier* values,
-                                       Type type) {
-    if (!value_map && !values)
+std::optional<Word_Map> Word_Map::read(const Qualifier* map, const Qualifier* words, Type type) {
+    if (!map && !words)
         return std::nullopt;
-    if (!value_map || !values)
-        throw Error((value_map ? value_map : values)->position,
-                    "ValueMap and Values belong together");
-    const std::vector<Value>&from = value_map->value.elements, &to = values->value.elements;
+    if (!map || !words)
+        throw Error((map ? map : words)->position,
+                    (map ? map : words)->name + " stands alone, without " +
+                        (map ? "words for its entries" : "entries for its words"));
+    const std::vector<Value>&from = map->value.elements, &to = words->value.elements;
     if (from.size() != to.size())
-        throw Error(values->position, "Values has " + std::to_string(to.size()) +
-                                          " words for the " + std::to_string(from.size()) +
-                                          " entries of ValueMap");
+        throw Error(words->position, words->name + " has " + std::to_string(to.size()) +
+                                         " words for the " + std::to_string(from.size()) +
+                                         " entries of " + map->name);
     const Integer_Range* range = integer_range(type);
     if (!range && type != Type::string)
-        throw Error(value_map->position, std::string("a ") + type_name(type) + " has no ValueMap");
-    Word_Map map;
+        throw Error(map->position, std::string("a ") + type_name(type) + " has no " + map->name);
+    Word_Map result;
     for (std::size_t i = 0; i < from.size(); i++) {
         Entry entry{from[i].text, to[i].text};
         entry.rest = entry.value == RANGE;
         if (range && !entry.rest && !read_numbers(entry, *range))
-            refuse(*value_map, entry.value, "is no value of the type");
-        for (const Entry& earlier : map._entries)
+            refuse(*map, entry.value, "is no value of the type");
+        for (const Entry& earlier : result._entries)
             if (overlap(earlier, entry, range))
-                refuse(*value_map, entry.value, "is claimed twice");
-        map._entries.push_back(std::move(entry));
+                refuse(*map, entry.value, "is claimed twice");
+        result._entries.push_back(std::move(entry));
     }
-    return map;
+    return result;
 }
 
 const std::string* Word_Map::find(std::int64_t value) const {

@@ -1,5 +1,5 @@
 // What ValueMap and Values say together: which word stands for which value of a property, a
-// parameter or a method's result.
+// parameter or a method's result. BitMap and BitValues say the same of bits.
 #ifndef SCHEMA_MOF_PARSER_WORD_MAP_H
 #define SCHEMA_MOF_PARSER_WORD_MAP_H
 
@@ -15,9 +15,8 @@ public:
     // when their lengths differ, when an entry does not fit the type, or claims what an earlier one
     // has.
     static std::optional<Word_Map> read(const Declaration& declaration);
-    // The same of qualifiers that came down from several declarations.
-    static std::optional<Word_Map> read(const Qualifier* value_map, const Qualifier* values,
-                                        Type type);
+    // The same of a pair of qualifiers, wherever they come from.
+    static std::optional<Word_Map> read(const Qualifier* map, const Qualifier* words, Type type);
 
     // Null: the map does not know the value. A number past sint64 is taken for its largest.
     const std::string* find(std::int64_t value) const;

@@ -71,6 +71,7 @@ TEST(Mpcactl, PrintsWordsBesideValues) {
         return run(command).out;
     };
     EXPECT_EQ(words({"enum", "Test_Good", "-p", "Level"}), "Level\n1 (Low)\n2\n3 (High)\n");
+    EXPECT_EQ(words({"get", A, "-p", "Big"}), "Big\n18446744073709551615 (Sound, Light)\n");
     EXPECT_EQ(words({"assoc", A, "-p", "Level,Words"}),
               "Level  Words\n0      one (First */ of all), two,three, NULL\n");
     EXPECT_EQ(words({"get", A, "-p", "Level,Words", "--format", "mof"}),
@@ -89,6 +90,7 @@ TEST(Mpcactl, AClassShowsWhatItMeans) {
     for (const char* part :
          {"by the module\n\nSays what it hears.\n\nProperties\n",
           "for a second line of the\n      text. [decibel]\n      1 Low; 3.. High\n  Big ",
+          "      bit 0 Sound; bit 3 Light; bit 63 Sound\n",
           "  uint32 Echo\n      Gives back what it is given.\n      0 Done; .. Failed\n    in "})
         EXPECT_NE(text.find(part), std::string::npos) << part << "\n" << text;
     const auto json = nlohmann::json::parse(run({"class", "Test_Good", "--format", "json"}).out);

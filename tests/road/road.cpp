@@ -52,7 +52,7 @@ void expect_words(const host::Class& known, const host::Instance& instance) {
             continue;
         const host::Value::Array one = {named.value};
         for (const host::Value& value : named.value.is_array() ? named.value.as_array() : one)
-            EXPECT_TRUE(value.is_null() || host::word_of(*property, value))
+            EXPECT_TRUE(value.is_null() || host::word_of(*property, value).has_value())
                 << "no word for " << known.name << "." << named.name << " "
                 << text_of(instance, named.name);
     }

@@ -58,6 +58,9 @@ host::Json with_meaning(host::Json json, const host::Slot_Type& slot) {
     if (slot.meaning->words)
         for (const mof::Word_Map::Entry& entry : slot.meaning->words->entries())
             json["values"].push_back({{"value", entry.value}, {"word", entry.word}});
+    if (slot.meaning->bits)
+        for (const mof::Word_Map::Entry& entry : slot.meaning->bits->entries())
+            json["bits"].push_back({{"bit", entry.value}, {"word", entry.word}});
     return json;
 }
 
@@ -116,18 +119,23 @@ void print_text(const std::string& text, const std::string& indentation) {
         std::printf("%s%s\n", indentation.c_str(), line.c_str());
 }
 
-// Description and unit, and the values that have a word: "0 Off; 1 On".
+// Description and unit, and what has a word: "0 Off; 1 On", "bit 0 Sound; bit 3 Light".
 void print_meaning(const host::Slot_Type& slot, const std::string& indentation) {
     if (!slot.meaning)
         return;
-    const std::string& unit = slot.meaning->unit;
-    print_text(slot.meaning->description + (unit.empty() ? "" : " [" + unit + "]"), indentation);
-    if (!slot.meaning->words)
-        return;
-    std::string values;
-    for (const mof::Word_Map::Entry& entry : slot.meaning->words->entries())
-        values += (values.empty() ? "" : "; ") + entry.value + " " + entry.word;
-    print_text(values, indentation);
+    const host::Meaning& meaning = *slot.meaning;
+    print_text(meaning.description + (meaning.unit.empty() ? "" : " [" + meaning.unit + "]"),
+               indentation);
+    std::string words;
+    const auto add = [&](const std::optional<mof::Word_Map>& map, const char* what) {
+        if (!map)
+            return;
+        for (const mof::Word_Map::Entry& entry : map->entries())
+            words += (words.empty() ? "" : "; ") + (what + entry.value) + " " + entry.word;
+    };
+    add(meaning.words, "");
+    add(meaning.bits, "bit ");
+    print_text(words, indentation);
 }
 
 using Rows = std::vector<std::vector<std::string>>;

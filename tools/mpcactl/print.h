@@ -5,6 +5,7 @@
 #include "host/manager.h"
 #include "tools/mpcactl/settings.h"
 
+#include <optional>
 #include <string>
 #include <vector>
 
@@ -34,9 +35,10 @@ void print_method_result(const Print_Context& context, const host::Method& metho
 
 // The instance as MOF: "instance of Class {...};".
 std::string to_mof(const Print_Context& context, const host::Instance& instance);
-// The word for a scalar, where words are wanted and the slot, which may be null, has one.
-const std::string* wanted_word(const Print_Context& context, const host::Slot_Type* slot,
-                               const host::Value& value);
+// The word for a scalar on one line, where words are wanted and the slot, which may be null, has
+// one.
+std::optional<std::string> wanted_word(const Print_Context& context, const host::Slot_Type* slot,
+                                       const host::Value& value);
 // A text on one line, safe for a terminal: control characters are escaped.
 std::string to_line(const std::string& text);
 // A value on one line, with its word.

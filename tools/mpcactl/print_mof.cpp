@@ -33,8 +33,8 @@ std::string comment(std::string word) {
 std::string value_to_mof(const Print_Context& context, const host::Slot_Type* slot,
                          const host::Value& value) {
     const auto one = [&](const host::Value& scalar) {
-        const std::string* word = wanted_word(context, slot, scalar);
-        return scalar_to_mof(context, scalar) + (word ? comment(to_line(*word)) : "");
+        const auto word = wanted_word(context, slot, scalar);
+        return scalar_to_mof(context, scalar) + (word ? comment(*word) : "");
     };
     if (!value.is_array() || value.is_null())
         return one(value);

@@ -104,9 +104,10 @@ std::string to_list(const Print_Context& context, const host::Class& known,
 
 } // namespace
 
-const std::string* wanted_word(const Print_Context& context, const host::Slot_Type* slot,
-                               const host::Value& value) {
-    return context.words && slot ? host::word_of(*slot, value) : nullptr;
+std::optional<std::string> wanted_word(const Print_Context& context, const host::Slot_Type* slot,
+                                       const host::Value& value) {
+    const auto word = context.words && slot ? host::word_of(*slot, value) : std::nullopt;
+    return word ? std::optional(to_line(*word)) : std::nullopt;
 }
 
 std::string to_line(const std::string& text) {
@@ -122,9 +123,8 @@ std::string to_line(const std::string& text) {
 std::string to_cell(const Print_Context& context, const host::Slot_Type* slot,
                     const host::Value& value) {
     const auto one = [&](const host::Value& scalar) {
-        const std::string* word = wanted_word(context, slot, scalar);
-        return scalar_to_cell(scalar, context.name_space) +
-               (word ? " (" + to_line(*word) + ")" : "");
+        const auto word = wanted_word(context, slot, scalar);
+        return scalar_to_cell(scalar, context.name_space) + (word ? " (" + *word + ")" : "");
     };
     if (!value.is_array() || value.is_null())
         return one(value);

@@ -61,6 +61,7 @@ Ref<VLNMPCA_LANEndpoint> lan_endpoint_instance(const NICAdapterAttributes& adapt
 Ref<VLNMPCA_EnabledLogicalElementCapabilities> capabilities_instance(const String& port_name) {
     auto capabilities = make_instance<VLNMPCA_EnabledLogicalElementCapabilities>();
     capabilities->InstanceID.set(format_text("Capabilities:%s", port_name.c_str()));
+    capabilities->ElementName.set(capabilities->InstanceID.value);
     capabilities->ElementNameEditSupported.set(false);
     capabilities->RequestedStatesSupported.append(REQUESTED_STATE_ENABLED);
     return capabilities;

@@ -75,6 +75,21 @@ TEST(Census, TheOldRecordCallShowsTheSameHost) {
               "");
 }
 
+// Consoles list settings and capabilities by their ElementName.
+TEST(Census, SettingsAndCapabilitiesHaveNames) {
+    for (const std::string& scenario : counted_scenarios()) {
+        Road road({.scenario = scenario + ".json"});
+        const host::ClassRepository& classes = road.manager().classes();
+        for (const host::Class* known : road.manager().provider_classes()) {
+            if (!known->is_a(classes.find("CIM_SettingData")) &&
+                !known->is_a(classes.find("CIM_Capabilities")))
+                continue;
+            for (const host::Instance& instance : road.enumerate(known->name))
+                EXPECT_NE(road::text_of(instance, "ElementName"), "-") << known->name;
+        }
+    }
+}
+
 // Lines at the highest level are for faults: an administrator who looks for one finds no others.
 TEST(Census, AHealthyHostLogsNothingAtLevelOne) {
     for (const auto& file : std::filesystem::directory_iterator(VLN_SCENARIOS)) {

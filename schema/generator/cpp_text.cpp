@@ -37,7 +37,6 @@ constexpr Flag_Word FLAG_WORDS[] = {
     {"Static", "FLAG_STATIC"},
     {"Terminal", "FLAG_TERMINAL"},
     {"Weak", "FLAG_WEAK"},
-    {"Write", "FLAG_WRITE"},
 };
 
 constexpr std::array<const char*, 14> VALUE_TYPES = {
@@ -165,6 +164,10 @@ std::string feature_flags(const mof::Schema_Feature& feature) {
         mof::is_true(declared.qualifiers, "Read", true))
         flags += " | FLAG_READ";
     add_words(flags, declared.qualifiers);
+    // What a modify of our own classes changes is a word for clients, as their descriptions are:
+    // the provider decides by itself what it takes.
+    if (mof::is_true(declared.qualifiers, "Write") && !is_provided(*feature.owner))
+        flags += " | FLAG_WRITE";
     return flags;
 }
 

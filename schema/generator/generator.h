@@ -47,8 +47,10 @@ void write_meta_tables(const Catalogue& catalogue, const Output& output, std::si
 void write_providers(const Catalogue& catalogue, const Output& output, std::size_t parts);
 // entries_NN.cpp and export.map: what the object manager looks up.
 void write_entries(const Catalogue& catalogue, const Output& output, std::size_t parts);
-// mof/: the classes for the object managers' compilers, in layers; and the registration file.
+// mof/: the classes for the object managers' compilers, in layers.
 void write_share(const Catalogue& catalogue, const Output& output);
+// vorlan_mpca_provider.reg and registration/provider_module.mof: who serves which class.
+void write_registrations(const Catalogue& catalogue, const Output& output);
 
 // Whether a provided class is served in the interop namespace as well: profiles, and what joins
 // them to elements and to one another. A client looks there first (DSP1033).

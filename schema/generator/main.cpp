@@ -38,6 +38,7 @@ void generate(const char* source, const char* folder, const char* share,
     generator::write_providers(catalogue, output, parts.procs);
     generator::write_entries(catalogue, output, parts.entries);
     generator::write_share(catalogue, generator::Output(share));
+    generator::write_registrations(catalogue, generator::Output(share));
 }
 
 } // namespace

@@ -16,13 +16,6 @@ namespace generator {
 
 namespace {
 
-constexpr const char* GROUP = "vorlan_mpca";
-constexpr const char* LOCATION = "vorlan_mpca_provider";
-constexpr const char* NAME_SPACE = "root/vorlan";
-// Profiles are looked for in the interop namespace too (DSP1033).
-constexpr const char* PROFILE_CLASS = "VLNMPCA_RegisteredProfile";
-constexpr const char* INTEROP_NAME_SPACE = "root/pg_interop";
-
 // The release that the base classes are taken from.
 constexpr const char* CIM_SCHEMA_VERSION = "2.26.0";
 
@@ -182,23 +175,6 @@ private:
     std::set<const mof::Schema_Class*> _classes;
 };
 
-std::string registration_file(const Catalogue& catalogue) {
-    std::ostringstream out;
-    for (const mof::Schema_Class* each : catalogue.providers) {
-        out << "[" << each->name() << "]\n"
-            << "   provider: " << each->name() << "_Provider\n"
-            << "   location: " << LOCATION << "\n"
-            << "   type: instance method" << (each->is_association ? " association" : "") << "\n"
-            << "   group: " << GROUP << "\n"
-            << "   unload: never\n"
-            << "   namespace: " << NAME_SPACE;
-        if (each->name() == PROFILE_CLASS)
-            out << " " << INTEROP_NAME_SPACE;
-        out << "\n";
-    }
-    return out.str();
-}
-
 } // namespace
 
 bool is_interop(const Catalogue& catalogue, const mof::Schema_Class& schema_class) {
@@ -234,7 +210,6 @@ void write_share(const Catalogue& catalogue, const Output& output) {
     write("interop/30_vorlan_mpca_interop.mof",
           "// Profiles, and what conforms to them, for the interop namespace.\n",
           [&](const mof::Schema_Class& each) { return interop.has(each); });
-    output.write("vorlan_mpca_provider.reg", registration_file(catalogue));
 }
 
 } // namespace generator

@@ -8,6 +8,7 @@
 #include <algorithm>
 #include <cstdio>
 #include <set>
+#include <sstream>
 
 namespace {
 
@@ -38,28 +39,99 @@ protected:
     }
 };
 
-TEST_F(Generated, RegistrationStanzas) {
+// The part of a text from a beginning up to what the next part begins with.
+std::string part(const std::string& text, const std::string& begin, const std::string& next) {
+    const std::size_t place = text.find(begin);
+    return place == std::string::npos
+               ? ""
+               : text.substr(place, text.find(next, place + begin.size()) - place);
+}
+
+TEST_F(Generated, RegistrationInSections) {
     const std::string text = contents("share/vorlan_mpca_provider.reg");
-    const auto stanza = [&](const std::string& name) {
-        const std::size_t begin = text.find("[" + name + "]\n");
-        return begin == std::string::npos ? ""
-                                          : text.substr(begin, text.find('[', begin + 1) - begin);
-    };
-    EXPECT_EQ(stanza("VLNMPCA_Card"), "[VLNMPCA_Card]\n"
-                                      "   provider: VLNMPCA_Card_Provider\n"
-                                      "   location: vorlan_mpca_provider\n"
-                                      "   type: instance method\n"
-                                      "   group: vorlan_mpca\n"
-                                      "   unload: never\n"
-                                      "   namespace: root/vorlan\n");
-    EXPECT_NE(stanza("VLNMPCA_Realizes").find("   type: instance method association\n"),
-              std::string::npos);
-    EXPECT_NE(
-        stanza("VLNMPCA_RegisteredProfile").find("   namespace: root/vorlan root/pg_interop\n"),
-        std::string::npos);
-    EXPECT_EQ(std::count(text.begin(), text.end(), '['), 299);
+    EXPECT_EQ(part(text, "[VLNMPCA_Card]\n", "["), "[VLNMPCA_Card]\n"
+                                                   "   provider: VLNMPCA_Card_Provider\n"
+                                                   "   location: vorlan_mpca_provider\n"
+                                                   "   type: instance method\n"
+                                                   "   group: vorlan_mpca\n"
+                                                   "   unload: never\n"
+                                                   "   namespace: root/vorlan\n");
+    EXPECT_EQ(part(text, "[VLNMPCA_CardConformsToProfile]\n", "["),
+              "[VLNMPCA_CardConformsToProfile]\n"
+              "   provider: VLNMPCA_CardConformsToProfile_Provider\n"
+              "   location: vorlan_mpca_provider\n"
+              "   type: instance method association\n"
+              "   group: vorlan_mpca\n"
+              "   unload: never\n"
+              "   namespace: root/vorlan root/pg_interop\n");
     EXPECT_EQ(text.find(" \n"), std::string::npos);
     EXPECT_EQ(text.compare(0, 37, "[VLNMPCA_SoftwareInstallationService]"), 0);
+}
+
+TEST_F(Generated, RegistrationAsInstances) {
+    const std::string text = contents("share/registration/provider_module.mof");
+    EXPECT_EQ(text.find("instance of PG_ProviderModule\n{\n"
+                        "    Name = \"vorlan_mpca_provider\";\n"
+                        "    Vendor = \"Vorlan\";\n"
+                        "    Version = \"10.2.261\";\n"
+                        "    InterfaceType = \"CMPI\";\n"
+                        "    InterfaceVersion = \"2.0.0\";\n"
+                        "    Location = \"vorlan_mpca_provider\";\n"
+                        "    UserContext = 4;\n"
+                        "    ModuleGroupName = \"vorlan_mpca\";\n"
+                        "};\n"),
+              0u);
+    EXPECT_NE(text.find("instance of PG_Provider\n{\n"
+                        "    ProviderModuleName = \"vorlan_mpca_provider\";\n"
+                        "    Name = \"VLNMPCA_CardConformsToProfile_Provider\";\n"
+                        "};\n\n"
+                        "instance of PG_ProviderCapabilities\n{\n"
+                        "    ProviderModuleName = \"vorlan_mpca_provider\";\n"
+                        "    ProviderName = \"VLNMPCA_CardConformsToProfile_Provider\";\n"
+                        "    CapabilityID = \"VLNMPCA_CardConformsToProfile\";\n"
+                        "    ClassName = \"VLNMPCA_CardConformsToProfile\";\n"
+                        "    Namespaces = {\"root/vorlan\", \"root/PG_InterOp\"};\n"
+                        "    ProviderType = {2, 3, 5};\n"
+                        "    SupportedProperties = NULL;\n"
+                        "    SupportedMethods = NULL;\n"
+                        "};\n"),
+              std::string::npos);
+    EXPECT_NE(part(text, "ClassName = \"VLNMPCA_Card\"", "}\n;")
+                  .find("    Namespaces = {\"root/vorlan\"};\n    ProviderType = {2, 5};\n"),
+              std::string::npos);
+}
+
+// The classes under whose name a text names a namespace: the name stands between a word at the
+// beginning of a line and a character.
+std::set<std::string> classes_in(const std::string& text, const std::string& name_space,
+                                 const std::string& word, char end) {
+    std::istringstream lines(text);
+    std::set<std::string> found;
+    std::string name;
+    for (std::string line; std::getline(lines, line);) {
+        if (line.starts_with(word))
+            name = line.substr(word.size(), line.find(end, word.size()) - word.size());
+        if (line.find(name_space) != std::string::npos)
+            found.insert(name);
+    }
+    return found;
+}
+
+// Profiles are served in both namespaces, and so are the classes that a client walks over to the
+// elements and to other profiles. Both forms say the same.
+TEST_F(Generated, ProfileClassesAreRegisteredForInterop) {
+    const std::string sections = contents("share/vorlan_mpca_provider.reg");
+    const std::string instances = contents("share/registration/provider_module.mof");
+    const std::set<std::string> found = classes_in(sections, "root/pg_interop", "[", ']');
+    EXPECT_EQ(found, classes_in(instances, "root/PG_InterOp", "    ClassName = \"", '"'));
+    EXPECT_EQ(found.size(), 16u);
+    for (const std::string& name : found)
+        EXPECT_TRUE(name == "VLNMPCA_RegisteredProfile" || name == "VLNMPCA_ReferencedProfile" ||
+                    name == "VLNMPCA_BaseServerReferencedProfile" ||
+                    name.ends_with("ConformsToProfile"))
+            << name;
+    EXPECT_EQ(classes_in(sections, "root/vorlan", "[", ']').size(), 299u);
+    EXPECT_EQ(classes_in(instances, "\"root/vorlan\"", "    ClassName = \"", '"').size(), 299u);
 }
 
 // ---- The layers of MOF ----

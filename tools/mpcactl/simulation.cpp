@@ -121,14 +121,10 @@ void Simulation::prepare_root(fs::path root) {
         _temporary_root = pattern;
         root = pattern;
     }
-    std::error_code error;
-    for (const char* folder : {"etc", "var/log", "tmp", "proc"}) {
-        fs::create_directories(root / folder, error);
-        if (error)
-            throw Usage_Error("the folder " + (root / folder).string() +
-                              " cannot be made: " + error.message());
-    }
-    function<decltype(vlnsim_set_host_root)>("vlnsim_set_host_root")(fs::absolute(root).c_str());
+    char error[4096] = "";
+    if (function<decltype(vlnsim_make_host_root)>("vlnsim_make_host_root")(root.c_str(), error,
+                                                                           sizeof error) != 0)
+        throw Usage_Error(error);
 }
 
 // The libraries stay loaded: threads of a module may still be on their way out of them.

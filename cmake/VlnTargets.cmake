@@ -1,6 +1,8 @@
 # How a room of the product, a test and a library of GoogleTest are declared.
 
 set(VLN_GENERATED_DIR "${CMAKE_BINARY_DIR}/generated")
+# The generated files that object managers take.
+set(VLN_SHARE_DIR "${CMAKE_BINARY_DIR}/share")
 
 # A room of the product: an object library, since the rooms of the module call one another and are
 # linked into one shared library at the end. Its sources are all .cpp files of the folder.

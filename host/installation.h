@@ -1,4 +1,5 @@
-// Where the files of the object manager lie, seen from the running program.
+// Where the files of the object manager lie, seen from the running program: its folder is "bin" of an
+// installation, or of a build, whose folders are laid out more plainly.
 #ifndef HOST_INSTALLATION_H
 #define HOST_INSTALLATION_H
 
@@ -6,14 +7,13 @@
 
 namespace host {
 
-// The folder of the running program, without a slash at its end.
-std::string program_folder();
-
-// The class catalogue: beside an installed program in ../share, else in the source tree.
+// The provider module, and the folder of its simulated twin with the libraries that it needs.
+std::string module_path();
+std::string simulator_folder();
+// The folder of the simulator's scenarios.
+std::string scenario_folder();
+// The class catalogue, which has the platform's classes too, and the registration of the module.
 std::string catalogue_path();
-
-// The registration of the module, beside an installed program in ../share, else in the build's
-// ../share; "" where there is none.
 std::string registration_path();
 
 } // namespace host

@@ -19,7 +19,7 @@ void add_session_options(CLI::App& app, Session_Settings& session) {
                    "Registration of the module: which class is served in which namespace")
         ->type_name("FILE");
     app.add_option("--simulate", session.scenario,
-                   "Simulated host: a scenario file, or the name of one in simulator/scenarios")
+                   "Simulated host: a scenario file, or the name of one of the simulator's")
         ->type_name("SCENARIO");
     app.add_option("--keep", session.keep,
                    "With --simulate: keep what changes of the simulated host in this folder, for "

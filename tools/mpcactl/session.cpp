@@ -16,7 +16,7 @@ std::string module_path(const Session_Settings& settings) {
                                                               : settings.module;
     if (!settings.scenario.empty())
         return Simulation::module_path();
-    return host::program_folder() + "/../lib/libvorlan_mpca_provider.so";
+    return host::module_path();
 }
 
 host::Options host_options(const Session_Settings& settings, const std::string& name_space) {

@@ -21,13 +21,12 @@ namespace fs = std::filesystem;
 
 namespace {
 
-fs::path simulator_folder() {
-    return fs::path(host::program_folder()) / "../lib/simulator";
-}
-
-std::vector<fs::path> scenario_folders() {
-    return {MPCACTL_SCENARIOS,
-            fs::path(host::program_folder()) / "../share/vorlan_mpca_provider/scenarios"};
+fs::path simulator_file(const char* name) {
+    const fs::path file = fs::path(host::simulator_folder()) / name;
+    std::error_code error;
+    if (!fs::exists(file, error))
+        throw Usage_Error("the simulator is not installed: there is no " + file.string());
+    return file;
 }
 
 std::string find_scenario(const std::string& given) {
@@ -35,14 +34,13 @@ std::string find_scenario(const std::string& given) {
     if (fs::is_regular_file(given, error))
         return given;
     std::vector<std::string> known;
-    for (const fs::path& folder : scenario_folders()) {
-        for (const std::string& name : {given, given + ".json"})
-            if (given.find('/') == std::string::npos && fs::is_regular_file(folder / name, error))
-                return (folder / name).string();
-        for (const auto& entry : fs::directory_iterator(folder, error))
-            if (entry.path().extension() == ".json")
-                known.push_back(entry.path().stem().string());
-    }
+    const fs::path folder = host::scenario_folder();
+    for (const std::string& name : {given, given + ".json"})
+        if (given.find('/') == std::string::npos && fs::is_regular_file(folder / name, error))
+            return (folder / name).string();
+    for (const auto& entry : fs::directory_iterator(folder, error))
+        if (entry.path().extension() == ".json")
+            known.push_back(entry.path().stem().string());
     std::sort(known.begin(), known.end());
     std::string text = "there is no scenario " + given;
     if (!known.empty())
@@ -53,7 +51,7 @@ std::string find_scenario(const std::string& given) {
 } // namespace
 
 std::string Simulation::module_path() {
-    return (simulator_folder() / "libvorlan_mpca_provider.so").string();
+    return simulator_file("libvorlan_mpca_provider.so").string();
 }
 
 template <class Function>
@@ -65,8 +63,9 @@ Function* Simulation::function(const char* name) const {
 }
 
 Simulation::Simulation(const Session_Settings& settings) {
+    const fs::path library = simulator_file("libvlnsim.so");
     const std::string path = find_scenario(settings.scenario);
-    _library = dlopen((simulator_folder() / "libvlnsim.so").c_str(), RTLD_NOW | RTLD_GLOBAL);
+    _library = dlopen(library.c_str(), RTLD_NOW | RTLD_GLOBAL);
     if (!_library)
         throw Usage_Error(std::string("the simulator cannot be loaded: ") + dlerror());
     char error[4096] = "";

@@ -1,0 +1,17 @@
+# Where an installation has its libraries, below the prefix: the folder of the word size.
+
+set(libdir "")
+if(EXISTS "/etc/debian_version")
+    if(VLN_WORD_SIZE EQUAL 32)
+        set(libdir "lib/i386-linux-gnu")
+    elseif(CMAKE_LIBRARY_ARCHITECTURE)
+        set(libdir "lib/${CMAKE_LIBRARY_ARCHITECTURE}")
+    endif()
+elseif(VLN_WORD_SIZE EQUAL 64)
+    set(libdir "lib64")
+endif()
+if(NOT libdir)
+    set(libdir "lib")
+endif()
+set(VLN_INSTALL_LIBDIR "${libdir}" CACHE STRING "Folder of the libraries below the prefix")
+unset(libdir)

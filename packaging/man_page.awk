@@ -2,7 +2,7 @@
 #   awk -f man_page.awk -v version=V HELP GUIDE.md
 # HELP is what "PROGRAM --help" prints: its first line says what the program is, its "Usage:" is the
 # synopsis, its commands and examples are listed. The guide gives the rest, heading by heading. Of
-# Markdown it may use headings, paragraphs, tables, fenced blocks, `code` and **bold**.
+# Markdown it may use headings, paragraphs, lists, tables, fenced blocks, `code` and **bold**.
 
 function troff(text) {
     gsub(/\\/, "\\e", text)
@@ -103,11 +103,13 @@ fenced { line(troff($0)); next }
         }
     next
 }
+/^- / { print ".IP \\(bu 2"; table = paragraph = fresh = 0; line(inline(substr($0, 3))); next }
 /^$/ { table = 0; if (!fresh) paragraph = 1; next }
 {
     if (table || paragraph)
         print ".PP"
     table = paragraph = fresh = 0
+    sub(/^ +/, "") # of a list's item
     line(inline($0))
 }
 

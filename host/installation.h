@@ -1,5 +1,5 @@
-// Where the files of the object manager lie, seen from the running program: its folder is "bin" of an
-// installation, or of a build, whose folders are laid out more plainly.
+// Where the files of the object manager lie, seen from the running program: its folder is "bin" of
+// an installation, or of a build, whose folders are laid out more plainly.
 #ifndef HOST_INSTALLATION_H
 #define HOST_INSTALLATION_H
 

@@ -9,8 +9,8 @@
  * of a bare file name is satisfied by a library of that SONAME which is loaded already. In a child
  * process: put that folder on the library path and name a scenario in the environment variable
  * VLNSIM_SCENARIO; it is read at the first use of a library, unless a scenario was loaded before.
- * The module built for simulation does it by itself: where no scenario was loaded before, it takes the
- * environment's when it is loaded, with vlnsim_use_environment().
+ * The module built for simulation does it by itself: where no scenario was loaded before, it takes
+ * the environment's when it is loaded, with vlnsim_use_environment().
  *
  * Every function may be called by any thread at any time. Texts are UTF-8 and NUL-terminated.
  * Functions that fill a text buffer always terminate it and cut what does not fit. Nothing here
@@ -97,8 +97,8 @@ VLNSIM_API unsigned long vlnsim_lookups(const char* symbol);
 /* The folder that stands for the host's "/" in a module built for simulation. Null or "": none. */
 VLNSIM_API void vlnsim_set_host_root(const char* folder);
 
-/* The same, with the folders in it that the module writes to; what is missing is made. Returns 0, or 1
- * with a text in error, and then the root stays as it was. */
+/* The same, with the folders in it that the module writes to; what is missing is made. Returns 0,
+ * or 1 with a text in error, and then the root stays as it was. */
 VLNSIM_API int vlnsim_make_host_root(const char* folder, char* error, size_t size);
 
 /* Never null; the text stays valid until the process ends. */

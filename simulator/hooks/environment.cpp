@@ -1,5 +1,6 @@
 // The module for simulation never meets the machine's own management libraries: where the program
-// that loads it has chosen no simulated host, the environment's is there before the module asks for one.
+// that loads it has chosen no simulated host, the environment's is there before the module asks for
+// one.
 #include "simulator/vlnsim.h"
 
 namespace {

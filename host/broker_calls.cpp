@@ -57,10 +57,11 @@ Status refuse_recursion(Core& core, const Class& known) {
 }
 
 // As for a client, but a class of the module is reached in its own namespaces only.
-Status find_up_target(Core& core, const ObjectPath& path, Target& target) {
+Status find_up_target(Core& core, const ObjectPath& path, Target& target,
+                      Interface kind = Interface::instance) {
     if (path.name_space.empty())
         return {CMPI_RC_ERR_INVALID_NAMESPACE, "an up-call without a namespace"};
-    Status status = find_target(core, path.class_name, path.name_space, target);
+    Status status = find_target(core, path.class_name, path.name_space, kind, target);
     if (!status.ok() || target.platform)
         return status;
     if (core.is_provider_name_space(path.name_space))
@@ -83,16 +84,21 @@ Status for_each_target(Core& core, const ObjectPath& path, Visit visit) {
     if (!on_platform && !in_module)
         return {CMPI_RC_ERR_INVALID_NAMESPACE, "unknown namespace " + path.name_space};
     Status status;
-    if (on_platform)
+    bool asked = core.check_platform(*known, path.name_space).ok();
+    if (asked)
         status = visit(Target{known, path.name_space, true});
     for (const auto& candidate : core.classes.classes()) {
-        if (!in_module || !candidate->is_a(known) || !core.module.serves(*candidate))
+        if (!in_module || !candidate->is_a(known) || !core.module.serves(*candidate) ||
+            !core.registration.check(candidate->name, Interface::instance, path.name_space).ok())
             continue;
+        asked = true;
         if (status.ok())
             status = refuse_recursion(core, *candidate);
         if (status.ok())
             status = visit(Target{candidate.get(), path.name_space, false});
     }
+    if (!asked && !core.registration.is_empty())
+        return class_not_found(known->name, path.name_space);
     return status;
 }
 
@@ -318,7 +324,7 @@ CMPIData invoke_up(const CMPIBroker* broker, const CMPIContext* context, const C
     Target target;
     Named_Values fitted = inputs->values;
     Reply<Method_Result> reply;
-    reply.status = find_up_target(*call.core, call.path, target);
+    reply.status = find_up_target(*call.core, call.path, target, Interface::method);
     if (reply.ok())
         reply.status = check_inputs(*call.core, *target.known, method, fitted);
     if (reply.ok())

@@ -64,6 +64,35 @@ std::optional<std::string> words_of_bits(const mof::Word_Map& bits, std::uint64_
     return words.empty() ? std::nullopt : std::optional(text);
 }
 
+Value to_value(CMPIType type, const mof::Value& value) {
+    using Kind = mof::Value::Kind;
+    switch (value.kind) {
+    case Kind::boolean:
+        return Value::boolean(value.boolean);
+    case Kind::integer:
+        if (is_signed(type))
+            return Value::signed_number(
+                type,
+                static_cast<std::int64_t>(value.negative ? 0 - value.magnitude : value.magnitude));
+        [[fallthrough]];
+    case Kind::character:
+        return Value::unsigned_number(type, value.magnitude);
+    case Kind::real:
+        return Value::real(type, value.real);
+    case Kind::text:
+        return type == CMPI_dateTime ? Value::datetime(value.text) : Value::text(value.text);
+    case Kind::array: {
+        const auto element = static_cast<CMPIType>(type & ~CMPI_ARRAY);
+        Value::Array elements;
+        for (const mof::Value& each : value.elements)
+            elements.push_back(to_value(element, each));
+        return Value::array(element, std::move(elements));
+    }
+    default:
+        return Value::null(type);
+    }
+}
+
 } // namespace
 
 std::optional<std::string> word_of(const Slot_Type& slot, const Value& value) {
@@ -173,7 +202,10 @@ void ClassRepository::fill(Class& target, const mof::Schema_Class& source) {
         if (feature.key)
             target.keys.push_back(target.properties.size());
         target.index.emplace(feature.name(), target.properties.size());
-        target.properties.push_back({std::move(slot), feature.name(), feature.key});
+        Value value = feature.default_value ? to_value(slot.type, *feature.default_value)
+                                            : Value::null(slot.type);
+        target.properties.push_back(
+            {std::move(slot), feature.name(), feature.key, std::move(value)});
     }
 }
 

@@ -41,6 +41,7 @@ std::optional<std::string> word_of(const Slot_Type& slot, const Value& value);
 struct Property : Slot_Type {
     std::string name;
     bool key = false;
+    Value default_value = {}; // null: none
     bool is_reference() const { return (type & ~CMPI_ARRAY) == CMPI_ref; }
 };
 

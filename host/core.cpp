@@ -56,10 +56,25 @@ std::uint64_t Core::now() const {
 }
 
 bool Core::is_provider_name_space(std::string_view name_space) const {
+    if (!registration.is_empty())
+        return registration.has_name_space(name_space);
     const auto& more = options.more_name_spaces;
     return same_name(name_space, options.name_space) ||
            std::any_of(more.begin(), more.end(),
                        [&](const std::string& known) { return same_name(known, name_space); });
+}
+
+Status Core::check_platform(const Class& known, const std::string& name_space) const {
+    if (platform.has_name_space(name_space) &&
+        (registration.is_empty() || platform.serves(name_space, known, classes)))
+        return {};
+    if (!registration.is_empty())
+        return is_provider_name_space(name_space) || platform.has_name_space(name_space)
+                   ? class_not_found(known.name, name_space)
+                   : registration.unknown_name_space(name_space);
+    if (is_provider_name_space(name_space))
+        return {CMPI_RC_ERR_NOT_SUPPORTED, "no provider serves " + known.name};
+    return {CMPI_RC_ERR_INVALID_NAMESPACE, "unknown namespace " + name_space};
 }
 
 namespace {

@@ -44,6 +44,7 @@ public:
     std::atomic<std::size_t> calls{0};
     std::atomic<std::size_t> up_calls{0};
     std::atomic<std::size_t> left{0};
+    std::atomic<std::size_t> answer_peak{0};
     std::atomic<int> attached_threads{0};
 
     std::mutex records_mutex; // guards the two below
@@ -56,6 +57,8 @@ public:
             options.trace(line);
     }
     bool is_provider_name_space(std::string_view name_space) const;
+    // Whether the platform answers for a class that no provider of the module serves.
+    Status check_platform(const Class& known, const std::string& name_space) const;
     // Records what is alive as leaks and frees it.
     void report_leaks();
     // Records what a thread leaves behind when it detaches and frees it, in a way that no provider

@@ -1,11 +1,46 @@
 #include "host/manager.h"
 
+#include "host/answer_size.h"
 #include "host/core.h"
 #include "host/operations.h"
 
 #include <numeric>
 
 namespace host {
+
+namespace {
+
+// An answer as it goes to a client: whole, or not at all if it is larger than may be sent.
+template <class T, class Size_Of>
+Reply<std::vector<T>> limited(Core& core, Reply<std::vector<T>> reply, Size_Of size_of) {
+    std::size_t size = 0;
+    for (const T& object : reply.value)
+        size += size_of(object);
+    std::size_t peak = core.answer_peak;
+    while (size > peak && !core.answer_peak.compare_exchange_weak(peak, size)) {
+    }
+    if (const std::size_t limit = core.options.answer_limit; limit && size > limit)
+        return {{CMPI_RC_ERR_FAILED, "an answer of " + std::to_string(size) + " bytes, where " +
+                                         std::to_string(limit) + " may be sent: ask for less"},
+                {}};
+    return reply;
+}
+
+Reply<std::vector<Instance>> limited(Core& core, Reply<std::vector<Instance>> reply,
+                                     const Property_List& properties, Path_Form form) {
+    return limited(core, std::move(reply), [&](const Instance& instance) {
+        return xml_size(instance, properties ? nullptr : core.classes.find(instance.class_name()),
+                        form);
+    });
+}
+
+Reply<std::vector<ObjectPath>> limited(Core& core, Reply<std::vector<ObjectPath>> reply,
+                                       Path_Form form) {
+    return limited(core, std::move(reply),
+                   [&](const ObjectPath& path) { return xml_size(path, form); });
+}
+
+} // namespace
 
 Manager::Manager(Options options) : _core(std::make_shared<Core>(std::move(options))) {}
 
@@ -62,7 +97,11 @@ bool Manager::serves(const Class& known) const {
 }
 
 bool Manager::serves(const Class& known, const std::string& name_space) const {
-    return _core->module.serves(known) && _core->registration.check(known.name, name_space).ok();
+    const auto& registration = _core->registration;
+    return _core->module.serves(known) &&
+           registration.check(known.name, Interface::instance, name_space).ok() &&
+           (!known.is_association ||
+            registration.check(known.name, Interface::association, name_space).ok());
 }
 
 Parsed_Path Manager::parse_path(std::string_view text) const {
@@ -73,24 +112,27 @@ Reply<std::vector<Instance>> Manager::enumerate(const std::string& class_name,
                                                 const Property_List& properties,
                                                 const std::string& name_space) {
     Target target;
-    if (Status status = find_target(*_core, class_name, name_space, target); !status.ok())
+    if (Status status = find_target(*_core, class_name, name_space, Interface::instance, target);
+        !status.ok())
         return {status, {}};
-    return host::enumerate(*_core, target, properties);
+    return limited(*_core, host::enumerate(*_core, target, properties), properties,
+                   Path_Form::keys);
 }
 
 Reply<std::vector<ObjectPath>> Manager::enumerate_names(const std::string& class_name,
                                                         const std::string& name_space) {
     Target target;
-    if (Status status = find_target(*_core, class_name, name_space, target); !status.ok())
+    if (Status status = find_target(*_core, class_name, name_space, Interface::instance, target);
+        !status.ok())
         return {status, {}};
-    return host::enumerate_names(*_core, target);
+    return limited(*_core, host::enumerate_names(*_core, target), Path_Form::keys);
 }
 
 namespace {
 
 // Completes the namespace, and finds who is asked.
-Status prepare(Core& core, ObjectPath& path, Target& target) {
-    Status status = find_target(core, path.class_name, path.name_space, target);
+Status prepare(Core& core, ObjectPath& path, Target& target, Interface kind = Interface::instance) {
+    Status status = find_target(core, path.class_name, path.name_space, kind, target);
     path.name_space = target.name_space;
     return status;
 }
@@ -140,23 +182,28 @@ Status Manager::remove(const ObjectPath& path) {
 Reply<std::vector<Instance>> Manager::associators(const ObjectPath& path,
                                                   const Association_Filter& filter,
                                                   const Property_List& properties) {
-    return walk(*_core, path, Walk::associators, filter, properties);
+    return limited(*_core, walk(*_core, path, Walk::associators, filter, properties), properties,
+                   Path_Form::complete);
 }
 
 Reply<std::vector<ObjectPath>> Manager::associator_names(const ObjectPath& path,
                                                          const Association_Filter& filter) {
-    return walk_names(*_core, path, Walk::associators, filter);
+    return limited(*_core, walk_names(*_core, path, Walk::associators, filter),
+                   Path_Form::complete);
 }
 
 Reply<std::vector<Instance>> Manager::references(const ObjectPath& path,
                                                  const Association_Filter& filter,
                                                  const Property_List& properties) {
-    return walk(*_core, path, Walk::references, {filter.via, "", filter.role, ""}, properties);
+    const Association_Filter own{filter.via, "", filter.role, ""};
+    return limited(*_core, walk(*_core, path, Walk::references, own, properties), properties,
+                   Path_Form::complete);
 }
 
 Reply<std::vector<ObjectPath>> Manager::reference_names(const ObjectPath& path,
                                                         const Association_Filter& filter) {
-    return walk_names(*_core, path, Walk::references, {filter.via, "", filter.role, ""});
+    const Association_Filter own{filter.via, "", filter.role, ""};
+    return limited(*_core, walk_names(*_core, path, Walk::references, own), Path_Form::complete);
 }
 
 Reply<Method_Result> Manager::invoke(const ObjectPath& path, const std::string& method,
@@ -164,7 +211,7 @@ Reply<Method_Result> Manager::invoke(const ObjectPath& path, const std::string& 
     ObjectPath complete = path;
     Named_Values fitted = inputs;
     Target target;
-    Status status = prepare(*_core, complete, target);
+    Status status = prepare(*_core, complete, target, Interface::method);
     if (status.ok())
         status = check_inputs(*_core, *target.known, method, fitted);
     if (status.ok() && !(complete.keys.empty() && target.known->find_method(method)->is_static))
@@ -196,12 +243,13 @@ std::size_t Manager::live_object_count() const {
 }
 
 Statistics Manager::statistics() const {
-    return {_core->calls, _core->up_calls, _core->counters.created, _core->left,
-            _core->counters.peak};
+    return {_core->calls, _core->up_calls,      _core->counters.created,
+            _core->left,  _core->counters.peak, _core->answer_peak};
 }
 
 void Manager::restart_peak() {
     _core->counters.peak = _core->counters.alive.load();
+    _core->answer_peak = 0;
 }
 
 std::vector<Indication> Manager::indications() const {

@@ -27,9 +27,9 @@ namespace host {
 struct Options {
     std::string mof_path;          // "": the catalogue of the build or installation
     std::string platform_path;     // instances for up-calls; "": none
-    std::string registration_path; // who is served where; "": the module's classes, everywhere
+    std::string registration_path; // who is asked what where; "": the module's classes, everywhere
     std::string name_space = "root/vorlan";
-    // Where, beside name_space, up-calls reach the providers of the module.
+    // Where, beside name_space, up-calls reach the providers of a module without a registration.
     std::vector<std::string> more_name_spaces = {"root/pg_interop"};
     std::string principal = "root";
     // Released texts are overwritten and kept for a while, so that a late use is seen, and
@@ -38,6 +38,10 @@ struct Options {
     // Good elements of an enumeration come with the state CMPI_nullValue, as from one object
     // manager.
     bool elements_marked_null = false;
+    // Properties that a provider left null come with the default that their class gives them.
+    bool class_defaults = true;
+    // Bytes that an answer to a client may have as CIM-XML; 0: any number.
+    std::size_t answer_limit = 10'000'000;
     // Microseconds since the epoch, for new datetimes; empty: the system's clock.
     std::function<std::uint64_t()> clock;
     // Gets a line for each call into the provider and each up-call, on the thread that makes it.
@@ -92,6 +96,7 @@ struct Statistics {
     std::size_t objects_created = 0; // CMPI objects
     std::size_t objects_left = 0; // of these, freed by the end of their call, parameters included
     std::size_t objects_peak = 0; // the most alive at once
+    std::size_t answer_peak = 0;  // bytes of the largest answer to a client, as CIM-XML
 };
 
 class Manager {
@@ -119,13 +124,15 @@ public:
     // The classes that the module has a provider for, in the order of the catalogue.
     std::vector<const Class*> provider_classes() const;
     bool serves(const Class& known) const;
-    bool serves(const Class& known, const std::string& name_space) const; // as registered
+    // As registered; for an association class, also to be walked.
+    bool serves(const Class& known, const std::string& name_space) const;
     // Text as `path_to_text` writes it; a path without a namespace is in options().name_space.
     Parsed_Path parse_path(std::string_view text) const;
 
     // An empty namespace stands for options().name_space. A class without a provider is served from
-    // the platform. An unknown class is CMPI_RC_ERR_INVALID_CLASS; nothing of that reaches a
-    // provider.
+    // the platform. An unknown class is CMPI_RC_ERR_INVALID_CLASS, and so is one that nobody serves
+    // there once there is a registration; nothing of that reaches a provider.
+    // An answer beyond options().answer_limit is refused with CMPI_RC_ERR_FAILED.
     Reply<std::vector<Instance>> enumerate(const std::string& class_name,
                                            const Property_List& properties = std::nullopt,
                                            const std::string& name_space = "");
@@ -160,7 +167,7 @@ public:
     Live_Counts live_objects() const; // by kind, now
     std::size_t live_object_count() const;
     Statistics statistics() const;
-    void restart_peak(); // from what is alive now
+    void restart_peak(); // from what is alive now, and from no answer
     std::vector<Indication> indications() const;
     std::vector<Log_Message> log_messages() const;
 

@@ -357,13 +357,17 @@ InstanceBody to_body(Core& core, const Instance& instance) {
     return body;
 }
 
-Instance to_instance(const InstanceBody& body) {
+Instance to_instance(const InstanceBody& body, bool with_defaults) {
     Instance instance;
     instance.path.name_space = body.path.name_space;
     instance.path.class_name = body.path.class_name;
     for (std::size_t i = 0; i < body.values.size(); ++i) {
         const Property& property = body.known->properties[i];
-        if (body.values[i])
+        const bool left_null = !body.values[i] || body.values[i]->is_null();
+        if (with_defaults && left_null && !property.default_value.is_null() &&
+            (!body.wanted || (*body.wanted)[i]))
+            instance.properties.push_back({property.name, property.default_value});
+        else if (body.values[i])
             instance.properties.push_back({property.name, *body.values[i]});
         if (!property.key)
             continue;

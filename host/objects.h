@@ -209,8 +209,9 @@ CMPIData missing_data(CMPIType type = CMPI_null);
 // usable; a fault is recorded then.
 std::optional<Value> from_cmpi(Core& core, const CMPIValue* value, CMPIType type, const char* use);
 
-// The contents of an instance object, path and properties in the order of the class.
-Instance to_instance(const InstanceBody& body);
+// The contents of an instance object, path and properties in the order of the class; with the
+// class's defaults where a property that is wanted was left null, if told so.
+Instance to_instance(const InstanceBody& body, bool with_defaults = false);
 InstanceBody to_body(Core& core, const Instance& instance);
 ObjectPathBody to_body(Core& core, ObjectPath path);
 

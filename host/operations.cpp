@@ -6,19 +6,15 @@
 namespace host {
 
 Status find_target(Core& core, const std::string& class_name, const std::string& name_space,
-                   Target& target) {
+                   Interface kind, Target& target) {
     target.name_space = name_space.empty() ? core.options.name_space : name_space;
     target.known = core.classes.find(class_name);
     if (!target.known)
         return {CMPI_RC_ERR_INVALID_CLASS, "unknown class " + class_name};
-    if (core.module.serves(*target.known))
-        return core.registration.check(target.known->name, target.name_space);
+    if (core.module.serves(*target.known) || core.registration.has(target.known->name))
+        return core.registration.check(target.known->name, kind, target.name_space);
     target.platform = true;
-    if (core.platform.has_name_space(target.name_space))
-        return {};
-    if (core.is_provider_name_space(target.name_space))
-        return {CMPI_RC_ERR_NOT_SUPPORTED, "no provider serves " + target.known->name};
-    return {CMPI_RC_ERR_INVALID_NAMESPACE, "unknown namespace " + target.name_space};
+    return core.check_platform(*target.known, target.name_space);
 }
 
 // ---- Checks ----

@@ -15,9 +15,10 @@ struct Target {
     std::string name_space;
     bool platform = false; // else the class has a provider
 };
-// From a client, whose namespace reaches the providers whatever it is.
+// Who answers a request of the kind. Of a class that is not registered a client reaches the
+// provider in any namespace.
 Status find_target(Core& core, const std::string& class_name, const std::string& name_space,
-                   Target& target);
+                   Interface kind, Target& target);
 
 Reply<std::vector<Instance>> enumerate(Core& core, const Target& target,
                                        const Property_List& properties);

@@ -44,8 +44,11 @@ Plan make_plan(Core& core, const ObjectPath& path, const Association_Filter& fil
     plan.status = check_complete(core, plan.path);
     if (!plan.status.ok())
         return plan;
-    if (plan.status = core.registration.check_name_space(plan.path.name_space); !plan.status.ok())
+    if (!core.registration.is_empty() && !core.is_provider_name_space(plan.path.name_space) &&
+        !core.platform.has_name_space(plan.path.name_space)) {
+        plan.status = core.registration.unknown_name_space(plan.path.name_space);
         return plan;
+    }
     plan.source = core.classes.find(path.class_name);
     const Class* via = core.classes.find(filter.via);
     plan.result_class = core.classes.find(filter.result_class);
@@ -65,7 +68,7 @@ Plan make_plan(Core& core, const ObjectPath& path, const Association_Filter& fil
                                        can_reach(*known, *plan.source, filter, plan.result_class))
                 : can_reach(*known, *plan.source, filter, plan.result_class);
         if (asked && core.module.serves_association(*known) &&
-            core.registration.check(known->name, plan.path.name_space).ok())
+            core.registration.check(known->name, Interface::association, plan.path.name_space).ok())
             plan.associations.push_back(known.get());
     }
     if (via && plan.associations.empty())

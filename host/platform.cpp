@@ -133,6 +133,14 @@ bool Platform::has_name_space(std::string_view name_space) const {
     });
 }
 
+bool Platform::serves(std::string_view name_space, const Class& known,
+                      const ClassRepository& classes) const {
+    return std::any_of(_instances.begin(), _instances.end(), [&](const Instance& instance) {
+        return same_name(instance.path.name_space, name_space) &&
+               classes.find(instance.class_name())->is_a(&known);
+    });
+}
+
 std::vector<Instance> Platform::instances(std::string_view name_space, const Class& known,
                                           const ClassRepository& classes) const {
     std::vector<Instance> found;

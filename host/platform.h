@@ -23,6 +23,9 @@ public:
     void read_text(std::string_view text, const std::string& name, ClassRepository& classes);
 
     bool has_name_space(std::string_view name_space) const;
+    // Whether there are instances of the class or of its subclasses.
+    bool serves(std::string_view name_space, const Class& known,
+                const ClassRepository& classes) const;
     // Of the class and its subclasses, in the order of the file.
     std::vector<Instance> instances(std::string_view name_space, const Class& known,
                                     const ClassRepository& classes) const;

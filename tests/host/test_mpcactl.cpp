@@ -40,7 +40,7 @@ TEST(Mpcactl, PrintsATable) {
     const std::string list = run({"get", A}).out;
     EXPECT_EQ(list.substr(0, list.find('\n')),
               "Name  Level  Big                   Offset  Ratio  Flag  When                       "
-              "Words                 Note");
+              "Words                 Numbers  Note");
 }
 
 TEST(Mpcactl, PrintsJsonExactly) {
@@ -53,7 +53,7 @@ TEST(Mpcactl, PrintsJsonExactly) {
     EXPECT_TRUE(properties["Note"].is_null());
     EXPECT_EQ(properties["Words"].dump(), R"(["one","two,three",null])");
     EXPECT_EQ(properties["When"], "19700101000001.000000+000");
-    EXPECT_FALSE(properties.contains("Numbers"));
+    EXPECT_FALSE(properties.contains("Inner"));
 }
 
 TEST(Mpcactl, PrintsMof) {
@@ -244,9 +244,9 @@ TEST(Mpcactl, ACimErrorEndsWithOneAndItsWord) {
 }
 
 TEST(Mpcactl, ARequestGoesWhereItsClassIsRegistered) {
-    write_text("test.reg", "[Test_Good]\n   provider: Test_Good_Provider\n"
+    write_text("test.reg", "[Test_Good]\n   type: instance\n   group: test\n"
                            "   namespace: root/test root/other\n[Test_Link]\n"
-                           "   namespace: root/test\n");
+                           "   type: association\n   group: test\n   namespace: root/test\n");
     const auto in = [](const char* name_space, std::vector<std::string> command) {
         command.insert(command.end(), {"--registration", "test.reg", "--namespace", name_space});
         return run(command);
@@ -259,6 +259,13 @@ TEST(Mpcactl, ARequestGoesWhereItsClassIsRegistered) {
               "root/tset; did you mean root/test?\n");
     EXPECT_EQ(in("root/tset", {"assoc", A}).status, 1);
     EXPECT_EQ(in("root/other", {"names", "Test_Link"}).status, 1);
+}
+
+TEST(Mpcactl, AnAnswerThatIsTooLargeIsRefused) {
+    const Outcome refused = run({"enum", "Test_Good", "--answer-limit", "1000"});
+    EXPECT_EQ(refused.status, 1);
+    EXPECT_NE(refused.err.find("1000 may be sent"), std::string::npos) << refused.err;
+    EXPECT_EQ(run({"enum", "Test_Good", "--answer-limit", "0"}).status, 0);
 }
 
 TEST(Mpcactl, ProviderFaultsAndLeaksEndWithOne) {

@@ -63,7 +63,8 @@ struct Model {
             return host::same_name(row.known->name, path.class_name);
         });
     }
-    // Every instance, and every end of an association that is none of the module's.
+    // Every instance, and every end of an association that is none of the module's: in its own
+    // namespace, and in the module's, where a client asks for what it is associated with.
     Paths everything() const {
         Paths all;
         std::set<std::string> strangers;
@@ -72,8 +73,10 @@ struct Model {
                 all.push_back(instance.path);
                 for (const host::Named_Value& property : instance.properties) {
                     const host::ObjectPath* end = property.value.as_reference();
-                    if (end && !serves(*end) && strangers.insert(text(*end)).second)
-                        all.push_back(*end);
+                    if (!end || serves(*end) || !strangers.insert(text(*end)).second)
+                        continue;
+                    all.push_back(*end);
+                    all.push_back({"root/vorlan", end->class_name, end->keys});
                 }
             }
         }
@@ -98,11 +101,12 @@ struct Expected {
     Paths ends;
 };
 
-Expected expect_of(const Model& model, const host::ObjectPath& source) {
+Expected expect_of(const host::Manager& manager, const Model& model,
+                   const host::ObjectPath& source) {
     const host::Class* source_class = model.classes.find(source.class_name);
     Expected expected;
     for (const Model::Class_Row& row : model.rows) {
-        if (!row.known->is_association)
+        if (!row.known->is_association || !manager.serves(*row.known, source.name_space))
             continue;
         for (const host::Instance& association : row.instances) {
             std::vector<const host::ObjectPath*> others;
@@ -129,8 +133,8 @@ Expected expect_of(const Model& model, const host::ObjectPath& source) {
 
 void check_source(Road& road, const Model& model, const host::ObjectPath& source) {
     SCOPED_TRACE(text(source));
-    const Expected expected = expect_of(model, source);
     host::Manager& manager = road.manager();
+    const Expected expected = expect_of(manager, model, source);
     EXPECT_EQ(names(manager.reference_names(source).value, std::identity{}),
               names(expected.references, std::identity{}));
     EXPECT_EQ(texts(manager.associator_names(source).value), texts(expected.ends));

@@ -75,6 +75,8 @@ Road::Road(const Setup& setup) : _root(fresh_folder()) {
     host::Options options;
     options.elements_marked_null = setup.elements_marked_null;
     options.trace = setup.trace;
+    options.registration_path = VLN_REGISTRATION;
+    options.class_defaults = setup.class_defaults;
     if (!setup.platform.empty()) {
         options.platform_path = _root / "platform.json";
         std::ofstream(options.platform_path) << setup.platform;

@@ -24,6 +24,8 @@ struct Setup {
     bool libraries = true;                      // false: the host has none of the closed libraries
     bool log = false;                           // level 5 to the provider's log file
     bool elements_marked_null = false;          // as host::Options has it
+    // As host::Options has it; off, so that a test sees what the provider itself gave.
+    bool class_defaults = false;
     std::function<void(const std::string&)> trace = {}; // see host::Options
 };
 

@@ -34,6 +34,11 @@ void add_session_options(CLI::App& app, Session_Settings& session) {
         ->type_name("FILE");
     app.add_option("--mof", session.mof, "Class catalogue instead of the installed one")
         ->type_name("FILE");
+    app.add_option("--answer-limit", session.answer_limit,
+                   "Refuse answers that have more bytes as CIM-XML, as an object manager would; 0: "
+                   "none")
+        ->type_name("BYTES")
+        ->capture_default_str();
     app.add_flag("--trace-calls", session.trace_calls,
                  "Write calls, up-calls and simulated library calls to standard error");
 }

@@ -27,6 +27,7 @@ host::Options host_options(const Session_Settings& settings, const std::string& 
     if (settings.registration.empty() && settings.module.empty())
         options.registration_path = host::registration_path();
     options.name_space = name_space;
+    options.answer_limit = settings.answer_limit;
     options.more_name_spaces.push_back("root/vorlan");
     if (settings.trace_calls)
         options.trace = [](const std::string& line) { std::fprintf(stderr, "%s\n", line.c_str()); };

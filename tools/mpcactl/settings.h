@@ -18,6 +18,7 @@ struct Session_Settings {
     std::string host_root;
     std::string platform;
     std::string mof;
+    std::size_t answer_limit = 10'000'000; // bytes as CIM-XML; 0: any number
     bool trace_calls = false;
 };
 

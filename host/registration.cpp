@@ -12,9 +12,15 @@ namespace {
 
 constexpr Interface INTERFACES[] = {Interface::instance, Interface::association, Interface::method};
 
-bool contains(const std::vector<std::string>& names, std::string_view name) {
-    return std::any_of(names.begin(), names.end(),
-                       [&](const std::string& each) { return same_name(each, name); });
+// Object managers whose interop namespace is the one of today take the older name for it.
+std::string_view settled(std::string_view name_space) {
+    return same_name(name_space, "root/pg_interop") ? "root/interop" : name_space;
+}
+
+bool contains(const std::vector<std::string>& name_spaces, std::string_view wanted) {
+    return std::any_of(name_spaces.begin(), name_spaces.end(), [&](const std::string& each) {
+        return same_name(settled(each), settled(wanted));
+    });
 }
 
 unsigned bit(Interface kind) {

@@ -68,8 +68,9 @@ TEST_F(Registered, OnlyWhatIsRegisteredIsAsked) {
     EXPECT_EQ(nobody.status.message, "class not found: nobody serves Test_Platform in root/test");
     EXPECT_EQ(manager->statistics().calls, calls);
 
-    load("[Test_Good]\n   type: instance\n   namespace: root/test\n");
+    load("[Test_Good]\n   type: instance\n   namespace: root/test root/interop\n");
     EXPECT_TRUE(manager->get(A).ok());
+    EXPECT_TRUE(manager->enumerate("Test_Good", std::nullopt, "root/PG_InterOp").ok());
     EXPECT_EQ(manager->invoke(A, "Version", {}).status.rc, CMPI_RC_ERR_METHOD_NOT_AVAILABLE);
     EXPECT_TRUE(manager->associators(A).value.empty());
 }

@@ -195,7 +195,8 @@ CMPIStatus result_instance(const CMPIResult* result, const CMPIInstance* inst) n
     if (!body || !given)
         return answer(CMPI_RC_ERR_FAILED);
     Core& core = core_of(result);
-    Instance instance = to_instance(*given, core.options.class_defaults);
+    const bool with_defaults = core.options.strict && core.options.class_defaults;
+    Instance instance = to_instance(*given, with_defaults);
     CMPIrc rc = check_answer(core, *body, instance.path, "returnInstance");
     if (rc == CMPI_RC_OK)
         rc = check_references(core, instance);

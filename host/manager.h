@@ -33,7 +33,8 @@ struct Options {
     std::vector<std::string> more_name_spaces = {"root/pg_interop"};
     std::string principal = "root";
     // Released texts are overwritten and kept for a while, so that a late use is seen, and
-    // harmless.
+    // harmless. Off, there are no class defaults and no limit to answers either: what is measured
+    // then is the provider.
     bool strict = true;
     // Good elements of an enumeration come with the state CMPI_nullValue, as from one object
     // manager.
@@ -96,7 +97,7 @@ struct Statistics {
     std::size_t objects_created = 0; // CMPI objects
     std::size_t objects_left = 0; // of these, freed by the end of their call, parameters included
     std::size_t objects_peak = 0; // the most alive at once
-    std::size_t answer_peak = 0;  // bytes of the largest answer to a client, as CIM-XML
+    std::size_t answer_peak = 0;  // bytes of the largest answer, as CIM-XML, if there is a limit
 };
 
 class Manager {

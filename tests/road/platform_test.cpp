@@ -72,6 +72,14 @@ TEST(Platform, WithoutOneTheProviderMakesItsOwn) {
     EXPECT_EQ(chassis->class_name, "CIM_Chassis");
     EXPECT_EQ(chassis->key("Tag")->as_text(), "VLN MPCA:Chassis");
     EXPECT_GE(road.count_in_log("up-call method failed"), 1u);
+
+    // Nobody serves it: it is named as an end, and whoever asks for it whole gets nothing.
+    EXPECT_EQ(road.manager().get(*chassis).status.rc, CMPI_RC_ERR_INVALID_CLASS);
+    const host::ObjectPath card = *links[0].property("PartComponent")->as_reference();
+    const host::Association_Filter via{"VLNMPCA_ChassisContainsCard", "", "", ""};
+    EXPECT_EQ(road.manager().associator_names(card, via).value.size(), 1u);
+    const auto whole = road.manager().associators(card, via);
+    EXPECT_TRUE(whole.ok() && whole.value.empty());
 }
 
 // Keys are made of the host's name, or of "unknown" where it has none: they lead back to their

@@ -75,13 +75,11 @@ public:
 
     // Script: the named table functions fail; all calls, or the n-th from now.
     std::map<std::string, int> failures; // name to countdown, 0: every call
-    std::map<std::string, int> calls;    // name to number of calls
     std::vector<Data_Ref> upcall_instances;
     std::vector<std::string> upcalls; // "getInstance ns:Class"
     CMPIrc upcall_status = CMPI_RC_OK;
     Members method_outputs;
     Value method_result;
-    std::string principal;
 
     // What came back.
     std::vector<Data_Ref> returned_paths;

@@ -1,5 +1,6 @@
 // Keys: equality across classes, the hash that goes with it, and the store that rests on both.
 #include "cimple/instance_map.h"
+#include "cimple/shared_instances.h"
 #include "tests/cimple/test_schema.h"
 
 #include <gtest/gtest.h>
@@ -210,6 +211,24 @@ TEST(InstanceMap, IndexFollowsEveryChange) {
     EXPECT_EQ(map.find(own(make_base("id1", 7)).get()), -1);
     EXPECT_EQ(map.insert(make_base("id1", 7)), 0);
 }
+
+#ifdef CIMPLE_CHECK_LOCKS
+// Whoever writes what a reader has is found out: at once, or when the reader is done.
+TEST(InstanceMapDeathTest, AWriteToASharedInstanceEndsTheProcess) {
+    Instance_Map<Test_Base> map;
+    Test_Base* base = make_base("a", 1);
+    EXPECT_EQ(map.insert(base), 0);
+    Shared_Instances reader;
+    reader.add(map[0]);
+    EXPECT_DEATH(nullify_non_keys(base), "is_shared");
+    EXPECT_DEATH(
+        {
+            base->Id.set("b");
+            unref(reader.take(0));
+        },
+        "a shared instance is written");
+}
+#endif
 
 TEST(InstanceMap, SubclassMatchesBaseKey) {
     Instance_Map<Test_Base> map;

@@ -1,5 +1,6 @@
 // The control interface: scenario, faults, counts, records.
 #include "simulator/call.h"
+#include "simulator/firmware_image.h"
 #include "simulator/scenario.h"
 #include "simulator/state.h"
 
@@ -132,6 +133,20 @@ int vlnsim_set_value(const char* wwn, const char* table, const char* name, const
         if (!function)
             return fail("unknown WWN " + shown(wwn), error, size);
         set_value(*function, table, name, node);
+        return 0;
+    });
+}
+
+void vlnsim_reboot(void) {
+    Simulator& simulator = Simulator::instance();
+    std::lock_guard lock(simulator.mutex);
+    reboot(simulator.host);
+}
+
+int vlnsim_write_firmware(const char* path, const char* model, const char* version, size_t size,
+                          char* error, size_t error_size) {
+    return guarded(error, error_size, [&] {
+        write_file(path, firmware_image(model, version, size));
         return 0;
     });
 }

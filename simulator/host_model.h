@@ -84,6 +84,27 @@ struct Feature {
     AX_STATUS status = AX_STATUS_OK;
 };
 
+// The profiles of an adapter that has profile management.
+struct Profiles {
+    std::uint32_t active = 0;
+    std::vector<AX_Profile> list;
+};
+
+// When a change comes into force.
+enum class Effect : std::uint8_t { once, reset, reboot };
+
+// Statuses that the simulated library answers beside those of axapi.h.
+enum : AX_STATUS {
+    firmware_unreadable = 140,
+    firmware_no_image = 141,
+    firmware_damaged = 142,
+    firmware_of_other_model = 143,
+    boot_code_enabled = 221,
+};
+
+// How AX_SetPortEnabled tells it.
+enum : std::uint32_t { dynamic_at_once = 1, dynamic_at_reset = 5 };
+
 // One instance of the management library: a PCI function of a card.
 struct Function {
     std::uint32_t instance = 0;
@@ -112,6 +133,11 @@ struct Function {
     std::optional<std::uint32_t> beacon;
     std::optional<Driver_Parameters> driver_parameters;
     std::optional<Driver_Parameters> global_driver_parameters;
+    std::optional<Profiles> profiles;
+    std::uint32_t multichannel = 0; // its type
+    Effect firmware_effect = Effect::reset;
+    Effect port_effect = Effect::once;
+    std::uint32_t resets = 0;
 
     std::optional<std::string> hba_name; // the adapter's name in the HBA API, which then knows it
     std::uint32_t hba_ports = 1;
@@ -147,6 +173,9 @@ struct Host {
     std::vector<Function> functions;
     std::vector<Fault> faults;
 };
+
+// What the host's next start brings into force.
+void reboot(Host& host);
 
 // The eight bytes of a WWN, most significant first.
 void put_name(std::uint64_t wwn, std::uint8_t* bytes);

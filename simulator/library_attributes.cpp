@@ -197,7 +197,8 @@ AX_STATUS AX_SetAdapterAttribute(AX_WWN wwn, uint32_t identifier, const void* va
             if (identifier > 0xFFFF || length >= 0xFFFF)
                 return AX_STATUS_INVALID_ARGUMENT;
             Attribute attribute = Attribute::of_bytes(Bytes(bytes, bytes + length));
-            attribute.bytes.push_back(0); // whoever reads a text back may look for its end
+            if (length != sizeof(std::uint32_t))
+                attribute.bytes.push_back(0); // whoever reads a text back may look for its end
             set_attribute(*function, static_cast<std::uint16_t>(identifier), std::move(attribute));
             return AX_STATUS_OK;
         },

@@ -170,6 +170,50 @@ void read_records(const Node& values, Function& function) {
     }
 }
 
+Effect read_effect(const Node& values, std::string_view key,
+                   std::initializer_list<std::string_view> known, Effect otherwise) {
+    const auto node = values.member(key);
+    if (!node)
+        return otherwise;
+    const std::string given = node->text();
+    const auto found = std::find(known.begin(), known.end(), given);
+    if (found == known.end())
+        node->fail("unknown time \"" + given + "\"; " + known_list({known.begin(), known.size()}));
+    return static_cast<Effect>(found - known.begin());
+}
+
+Profiles read_profiles(const Node& values) {
+    values.expect_object({"active", "list"});
+    Profiles profiles;
+    profiles.active = values.number32("active", 0);
+    const auto list = values.member("list");
+    if (!list)
+        return profiles;
+    for (const Node& row : list->items()) {
+        row.expect_object({"id", "flags", "name"});
+        AX_Profile profile{};
+        profile.id = row.number32("id", static_cast<std::uint32_t>(profiles.list.size()));
+        profile.flags = row.number32("flags", 0);
+        const std::string name = row.wild_text("name", "");
+        if (name.size() > sizeof profile.name)
+            row.member("name")->fail("longer than " + std::to_string(sizeof profile.name) +
+                                     " bytes");
+        name.copy(profile.name, sizeof profile.name);
+        profiles.list.push_back(profile);
+    }
+    return profiles;
+}
+
+void read_changes(const Node& values, Function& function) {
+    function.firmware_effect =
+        read_effect(values, "firmwareTakesEffect", {"once", "reset", "reboot"}, Effect::reset);
+    function.port_effect =
+        read_effect(values, "portChangeTakesEffect", {"once", "reset"}, Effect::once);
+    function.multichannel = values.number32("multichannel", 0);
+    if (const auto node = values.member("profiles"))
+        function.profiles = read_profiles(*node);
+}
+
 bool read_mapping_by_unit(const Node& hba) {
     const std::string order = hba.text("order", "targets");
     if (order != "targets" && order != "units")
@@ -216,6 +260,10 @@ std::span<const std::string_view> function_keys() {
                                                 "features",
                                                 "driverType",
                                                 "beacon",
+                                                "firmwareTakesEffect",
+                                                "portChangeTakesEffect",
+                                                "multichannel",
+                                                "profiles",
                                                 "driverParameters",
                                                 "globalDriverParameters",
                                                 "adapterAttributes",
@@ -290,6 +338,7 @@ Function read_function(const Node& values) {
     read_statistics(values, function);
     read_features(values, function);
     read_records(values, function);
+    read_changes(values, function);
     read_san(values, type.in_hba_api, function);
     if (const auto targets = values.member("iscsiTargets"))
         function.iscsi_targets = read_iscsi_targets(*targets, function);

@@ -218,6 +218,7 @@ constexpr Piece PIECES[] = {
     table<list_parameters<&Function::global_driver_parameters>,
           set_parameter<&Function::global_driver_parameters>>("globalDriverParameters"),
     whole<&Function::beacon>("beacon"),
+    whole<&Function::resets>("resets"),
     whole<&Function::initiator>("initiator"),
     whole<&Function::network>("network"),
 };

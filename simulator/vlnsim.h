@@ -66,6 +66,15 @@ VLNSIM_API int vlnsim_save_state(const char* path, char* error, size_t size);
  * path/in/json: what is wrong" in error, and then the host stays as it was. */
 VLNSIM_API int vlnsim_load_state(const char* path, char* error, size_t size);
 
+/* Starts the host anew: what changes with a reboot, firmware on flash for one, comes into force.
+ * The provider sees it with its next refresh. */
+VLNSIM_API void vlnsim_reboot(void);
+
+/* Writes a firmware image for adapters of the model, with size bytes behind its head. Returns 0, or
+ * 1 with a text in error. */
+VLNSIM_API int vlnsim_write_firmware(const char* path, const char* model, const char* version,
+                                     size_t size, char* error, size_t error_size);
+
 /* ---- Libraries ---------------------------------------------------------------------------------
  */
 

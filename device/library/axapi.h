@@ -54,6 +54,9 @@ typedef uint32_t AX_STATUS;
 #define AX_STATUS_WWN_NOT_AVAILABLE 92u
 #define AX_STATUS_WWN_IN_PROGRESS 97u /* call again */
 #define AX_STATUS_PORTAL_EXISTS 116u  /* the portal stands with other login options */
+#define AX_STATUS_MAILBOX_FAILED 148u /* firmware download: internal error of the driver */
+#define AX_STATUS_MAILBOX_TIMEOUT 149u
+#define AX_STATUS_MAILBOX_BUSY 150u
 #define AX_STATUS_NOT_ANSWERING 190u
 #define AX_STATUS_LIST_TOO_SMALL 191u /* dump files, driver parameters: as AX_STATUS_MORE_DATA */
 #define AX_STATUS_REBOOT_NEEDED 247u  /* done, and a reboot is needed */

@@ -89,6 +89,7 @@ public:
         add_association_commands();
         add_method_command();
         add_hardware_command();
+        add_firmware_commands();
     }
 
     void add_run() {
@@ -219,6 +220,18 @@ private:
                  "globalDriverParameters");
         required(hardware, "NAME", _command.value_name, "Name or number in the table");
         required(hardware, "VALUE", _command.value, "New value; null takes it away");
+    }
+
+    void add_firmware_commands() {
+        add("reboot", "With --simulate: start the simulated host anew");
+        CLI::App& firmware =
+            add("simulate-firmware", "With --simulate: write a firmware image for its adapters");
+        required(firmware, "FILE", _command.file, "The file to write");
+        required(firmware, "MODEL", _command.model, "Model of the adapters that it is for");
+        required(firmware, "VERSION", _command.version, "Version that they run then");
+        firmware.add_option("--size", _command.size, "Bytes behind the image's head")
+            ->type_name("BYTES")
+            ->capture_default_str();
     }
 
     CLI::App& _app;

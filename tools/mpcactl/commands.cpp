@@ -14,6 +14,16 @@ int change_hardware(Session& session, const Command& command) {
     return EXIT_FINE;
 }
 
+int start_anew(Session& session, const Command&) {
+    session.simulation().reboot();
+    return EXIT_FINE;
+}
+
+int write_firmware(Session& session, const Command& command) {
+    session.simulation().write_firmware(command.file, command.model, command.version, command.size);
+    return EXIT_FINE;
+}
+
 struct Row {
     const char* name;
     int (*run)(Session& session, const Command& command);
@@ -35,6 +45,8 @@ constexpr Row COMMANDS[] = {
     {"ref-names", reference_names},
     {"invoke", invoke},
     {"hardware", change_hardware},
+    {"reboot", start_anew},
+    {"simulate-firmware", write_firmware},
 };
 
 } // namespace

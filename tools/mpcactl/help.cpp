@@ -46,6 +46,9 @@ provider; 2 wrong usage.)"},
      R"(  mpcactl --simulate two-port-cna invoke 'VLNMPCA_SoftwareInstallationService.Name="Vorlan MPCA Software Installation Service",SystemCreationClassName="CIM_ComputerSystem",SystemName="simulated-host",CreationClassName="VLNMPCA_SoftwareInstallationService"' StartService --check)"},
     {"hardware",
      R"(  mpcactl --simulate two-port-cna --keep host hardware 100002564C000000 portAttributes FunctionalPortState 3)"},
+    {"reboot", R"(  mpcactl --simulate two-port-cna --keep host reboot)"},
+    {"simulate-firmware",
+     R"(  mpcactl --simulate two-port-cna simulate-firmware new.img VMC-2210 10.4.255.3 --size 8388608)"},
     {"run", R"(  echo 'names VLNMPCA_Card' | mpcactl --simulate two-port-cna run -)"},
 };
 

@@ -44,6 +44,8 @@ struct Command {
     bool stop = false;
     bool quiet = false;
     std::string port, table, value_name, value;
+    std::string file, model, version;
+    std::size_t size = 4096; // of a firmware image, without its head
 };
 
 struct Settings {

@@ -147,6 +147,18 @@ void Simulation::set_value(const std::string& port, const std::string& table,
         throw Usage_Error(error);
 }
 
+void Simulation::reboot() {
+    function<decltype(vlnsim_reboot)>("vlnsim_reboot")();
+}
+
+void Simulation::write_firmware(const std::string& file, const std::string& model,
+                                const std::string& version, std::size_t size) {
+    char error[4096] = "";
+    if (function<decltype(vlnsim_write_firmware)>("vlnsim_write_firmware")(
+            file.c_str(), model.c_str(), version.c_str(), size, error, sizeof error) != 0)
+        throw Usage_Error(error);
+}
+
 std::vector<std::string> Simulation::violations(std::size_t from) const {
     auto* const count = function<decltype(vlnsim_violations)>("vlnsim_violations");
     auto* const text_of = function<decltype(vlnsim_violation)>("vlnsim_violation");

@@ -29,6 +29,11 @@ public:
     // which numbers may be as well. Throws Usage_Error.
     void set_value(const std::string& port, const std::string& table, const std::string& name,
                    const std::string& value);
+    // Starts the host anew.
+    void reboot();
+    // Writes a firmware image of so many bytes behind its head. Throws Usage_Error.
+    void write_firmware(const std::string& file, const std::string& model,
+                        const std::string& version, std::size_t size);
     // Breaches of the libraries' contract by the provider, from that of this number on.
     std::vector<std::string> violations(std::size_t from) const;
     // Writes the state that is to be kept, if any. Throws Usage_Error.

@@ -1,0 +1,251 @@
+// Firmware, resets, and what switches a port on and off.
+#include "simulator/call.h"
+#include "simulator/firmware_image.h"
+#include "simulator/identifiers.h"
+#include "simulator/scenario.h"
+
+#include <algorithm>
+#include <set>
+
+namespace vlnsim {
+namespace {
+
+// Calls visit for each function of the same ASIC: a card may have several.
+template <class Visit>
+void each_of_asic(Host& host, const Function& asic, Visit visit) {
+    for (Function& function : host.functions)
+        if (function.card == asic.card && function.sub_adapter == asic.sub_adapter)
+            visit(function);
+}
+
+bool on_one_port(const Function& a, const Function& b) {
+    const auto port = [](const Function& function) {
+        const auto found = function.adapter_attributes.find(adapter_port_number);
+        return found == function.adapter_attributes.end() ? 0 : found->second.number();
+    };
+    return a.card == b.card && port(a) == port(b);
+}
+
+std::uint32_t number_of(const Attribute_Map& map, std::uint16_t identifier) {
+    const auto found = map.find(identifier);
+    return found == map.end() ? 0 : found->second.number();
+}
+
+// What is on flash runs from now on.
+void start_firmware(Function& function) {
+    auto& attributes = function.adapter_attributes;
+    const auto flash = attributes.find(AX_HA_FIRMWARE_ON_FLASH);
+    if (flash == attributes.end())
+        return;
+    const Attribute version = flash->second;
+    attributes[AX_HA_FIRMWARE_VERSION] = version;
+    attributes[AX_HA_OPERATIONAL_FIRMWARE_VERSION] = version;
+    if (const auto file = attributes.find(AX_HA_IPL_FILENAME); file != attributes.end())
+        file->second = Attribute::of_text("VLN-" + version.text() + ".img");
+}
+
+// States of a port, of which two wait for a reset of the adapter.
+enum : std::uint32_t {
+    state_up = 2,
+    state_up_until_reset = 20,
+    state_down_until_reset = 21,
+    state_disabled = 22
+};
+
+void set_state(Function& function, std::uint32_t functional, std::uint32_t physical) {
+    function.port_attributes[port_functional_state] = Attribute::of_number(functional);
+    function.port_attributes[port_physical_state] = Attribute::of_number(physical);
+}
+
+void settle_port(Function& function) {
+    const std::uint32_t state = number_of(function.port_attributes, port_functional_state);
+    if (state == state_up_until_reset)
+        set_state(function, state_disabled, state_disabled);
+    else if (state == state_down_until_reset)
+        set_state(function, state_up, state_up);
+}
+
+AX_STATUS check_image(const Firmware_Image& image) {
+    switch (image.state) {
+    case Firmware_Image::State::unreadable:
+        return firmware_unreadable;
+    case Firmware_Image::State::no_image:
+        return firmware_no_image;
+    default:
+        return AX_STATUS_OK;
+    }
+}
+
+AX_STATUS check_image(const Firmware_Image& image, const Function& function) {
+    if (const AX_STATUS status = check_image(image))
+        return status;
+    if (image.state != Firmware_Image::State::whole)
+        return firmware_damaged;
+    return image.model == function.model ? AX_STATUS_OK : firmware_of_other_model;
+}
+
+} // namespace
+
+void reboot(Host& host) {
+    for (Function& function : host.functions) {
+        start_firmware(function);
+        settle_port(function);
+    }
+}
+
+namespace library {
+
+AX_STATUS AX_ImportHBAFileA(const char* file) {
+    return answer<AX_STATUS>(
+        Entry::AX_ImportHBAFileA,
+        [&](Call& call) -> AX_STATUS {
+            if (call.null(file, "file"))
+                return AX_STATUS_INVALID_ARGUMENT;
+            return check_image(read_firmware(file));
+        },
+        file);
+}
+
+AX_STATUS AX_VerifyFirmwareA(uint32_t, uint32_t, AX_WWN wwn, const char* file) {
+    return answer<AX_STATUS>(
+        Entry::AX_VerifyFirmwareA,
+        [&](Call& call) -> AX_STATUS {
+            if (call.null(file, "file"))
+                return AX_STATUS_INVALID_ARGUMENT;
+            const Function* function = call.function(wwn);
+            return function ? check_image(read_firmware(file), *function) : AX_STATUS_ILLEGAL_WWN;
+        },
+        wwn, file);
+}
+
+AX_STATUS AX_DownloadFirmware(AX_WWN wwn, const char* file, uint32_t options) {
+    return answer<AX_STATUS>(
+        Entry::AX_DownloadFirmware,
+        [&](Call& call) -> AX_STATUS {
+            if (call.null(file, "file"))
+                return AX_STATUS_INVALID_ARGUMENT;
+            const Function* asked = call.function(wwn);
+            if (!asked)
+                return AX_STATUS_ILLEGAL_WWN;
+            // Whatever the caller had verified: the file may be another one now.
+            const Firmware_Image image = read_firmware(file);
+            if (const AX_STATUS status = check_image(image, *asked))
+                return status;
+            each_of_asic(call.host, *asked, [&](Function& function) {
+                function.adapter_attributes[AX_HA_FIRMWARE_ON_FLASH] =
+                    Attribute::of_text(image.version);
+                if (asked->firmware_effect == Effect::once)
+                    start_firmware(function);
+            });
+            return asked->firmware_effect == Effect::reboot ? AX_STATUS_REBOOT_NEEDED
+                                                            : AX_STATUS_OK;
+        },
+        wwn, file, options);
+}
+
+AX_STATUS AX_ResetHBA(AX_WWN wwn) {
+    return answer<AX_STATUS>(
+        Entry::AX_ResetHBA,
+        [&](Call& call) -> AX_STATUS {
+            const Function* asked = call.function(wwn);
+            if (!asked)
+                return AX_STATUS_ILLEGAL_WWN;
+            each_of_asic(call.host, *asked, [&](Function& function) {
+                ++function.resets;
+                if (function.firmware_effect != Effect::reboot)
+                    start_firmware(function);
+                settle_port(function);
+            });
+            return AX_STATUS_OK;
+        },
+        wwn);
+}
+
+AX_STATUS AX_SetPortEnabled(AX_WWN wwn, uint32_t enabled, uint32_t* dynamic) {
+    return answer<AX_STATUS>(
+        Entry::AX_SetPortEnabled,
+        [&](Call& call) -> AX_STATUS {
+            if (call.null(dynamic, "dynamic"))
+                return AX_STATUS_INVALID_ARGUMENT;
+            const Function* asked = call.function(wwn);
+            if (!asked)
+                return AX_STATUS_ILLEGAL_WWN;
+            for (const Function& function : call.host.functions)
+                if (!enabled && on_one_port(function, *asked) &&
+                    number_of(function.adapter_attributes, AX_HA_BOOT_CODE_ENABLED) != 0)
+                    return boot_code_enabled;
+            const bool waits = asked->port_effect == Effect::reset;
+            for (Function& function : call.host.functions) {
+                const std::uint32_t physical =
+                    number_of(function.port_attributes, port_physical_state);
+                if (!on_one_port(function, *asked))
+                    continue;
+                if (waits)
+                    set_state(function, enabled ? state_down_until_reset : state_up_until_reset,
+                              physical);
+                else
+                    set_state(function, enabled ? state_up : state_disabled,
+                              enabled ? state_up : state_disabled);
+            }
+            *dynamic = waits ? dynamic_at_reset : dynamic_at_once;
+            call.out("dynamic", *dynamic);
+            return AX_STATUS_OK;
+        },
+        wwn, enabled);
+}
+
+AX_STATUS AX_ListProfiles(AX_WWN wwn, AX_ProfileList* list) {
+    return answer<AX_STATUS>(
+        Entry::AX_ListProfiles,
+        [&](Call& call) -> AX_STATUS {
+            if (call.null(list, "list"))
+                return AX_STATUS_INVALID_ARGUMENT;
+            const Function* function = call.function(wwn);
+            if (!function)
+                return AX_STATUS_ILLEGAL_WWN;
+            if (!function->profiles)
+                return AX_STATUS_NOT_SUPPORTED;
+            const auto& profiles = function->profiles->list;
+            auto needed = static_cast<std::uint32_t>(profiles.size());
+            call.out("room", list->count);
+            const bool too_small = call.too_small(list->count, needed);
+            list->count = needed;
+            call.out("count", list->count);
+            if (too_small)
+                return AX_STATUS_MORE_DATA;
+            list->activeProfileId = function->profiles->active;
+            list->configuredProfileId = function->profiles->active;
+            AX_Profile* entry = list->profile;
+            for (const AX_Profile& profile : profiles)
+                *entry++ = profile;
+            return AX_STATUS_OK;
+        },
+        wwn);
+}
+
+AX_STATUS AX_GetAdapterPortConfig(AX_WWN wwn, AX_AdapterPortConfig* config) {
+    return answer<AX_STATUS>(
+        Entry::AX_GetAdapterPortConfig,
+        [&](Call& call) -> AX_STATUS {
+            if (call.null(config, "config"))
+                return AX_STATUS_INVALID_ARGUMENT;
+            const Function* asked = call.function(wwn);
+            if (!asked)
+                return AX_STATUS_ILLEGAL_WWN;
+            *config = {};
+            std::set<std::uint32_t> ports;
+            each_of_asic(call.host, *asked, [&](Function& function) {
+                ports.insert(number_of(function.adapter_attributes, adapter_port_number));
+            });
+            config->portCount = static_cast<std::uint32_t>(ports.size());
+            config->activeProfileId = asked->profiles ? asked->profiles->active : 0;
+            config->configuredProfileId = config->activeProfileId;
+            config->mcType = static_cast<std::int32_t>(asked->multichannel);
+            config->configuredMCType = config->mcType;
+            return AX_STATUS_OK;
+        },
+        wwn);
+}
+
+} // namespace library
+} // namespace vlnsim

@@ -70,6 +70,23 @@ public:
     static AX_STATUS GetPhyPortSpeedAttributesValues(const HBA_WWN* name,
                                                      AX_PhyPortSpeed* settings);
 
+    // ---- Firmware (firmware.cpp) ----
+
+    // Has the adapter install the image of a file: AX_STATUS_REBOOT_NEEDED when it took and a
+    // reboot is needed. Nothing is tried twice.
+    static AX_STATUS vlncimDownloadFW(const HBA_WWN* name, const char* file);
+    static AX_STATUS vlncimReset(const HBA_WWN* name);
+    // The version on the adapter's flash, empty if it does not tell. 0 or 1.
+    static AX_STATUS GetFirmwareOnFlash(const HBA_WWN* name, std::string* version);
+
+    // ---- Switches of a port (port_state.cpp) ----
+
+    // dynamic: how the change comes into force; 5 after a reset of the adapter.
+    static AX_STATUS SetPortEnabled(const char* deviceId, bool enabled, uint32* dynamic);
+    // 1 on, 0 off, in force after a reboot. 2 when the profile in force forbids it, 4 when
+    // multichannel does.
+    static AX_STATUS SetSRIOVEnabledState(const HBA_WWN* name, uint32 state);
+
     // ---- Driver parameters (driver_parameters.cpp) ----
 
     // What the driver is set to: for the port with that device identifier or, global, for all of

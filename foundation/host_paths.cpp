@@ -34,4 +34,9 @@ std::string host_path(Host_File file) {
     return std::string(host_root()) + name_of(file);
 }
 
+std::string working_file(const std::string& name) {
+    const std::string root = host_root();
+    return root.empty() ? name : root + "/" + name;
+}
+
 } // namespace cimple

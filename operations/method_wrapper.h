@@ -94,6 +94,18 @@ public:
     static AX_STATUS FCoEGetDriverParam(const char* port, bool global,
                                         std::vector<AX_DriverParam>* parameters);
 
+    // ---- Files from and to other hosts (curl_transfer.cpp) ----
+
+    // Makes a local file of a URI. A path, "file:///..." or "file://localhost/..." that is there is
+    // answered as a path. Anything else libcurl fetches into a file of the object manager's
+    // working folder: fetched is true then, and the file is the caller's to remove. return_code is
+    // 0 or libcurl's code; 0 is no promise that the file exists, since without libcurl the path
+    // comes back as it is.
+    static void downloadFileUsingCurl(const char* uri, std::string& local_path, int& return_code,
+                                      bool& fetched);
+    // Sends a file to where the URI says; 0, or -1 after a line of the log.
+    static int uploadFileUsingCurl(const char* uri, const char* file);
+
     // Logs a status of the library with its text for it, if it has one, at level 5.
     static void logStatus(AX_STATUS status);
 };

@@ -31,6 +31,17 @@ std::uint32_t number_of(const Attribute_Map& map, std::uint16_t identifier) {
     return found == map.end() ? 0 : found->second.number();
 }
 
+// "V:version,D:date", of which the date stays.
+void set_version(Bytes& entry, const std::string& version) {
+    const std::string before(entry.begin(), entry.end());
+    const std::size_t start = before.find("V:");
+    if (start == before.npos)
+        return;
+    std::string after = before;
+    after.replace(start, before.find(',', start) - start, "V:" + version);
+    entry.assign(after.begin(), after.end());
+}
+
 // What is on flash runs from now on.
 void start_firmware(Function& function) {
     auto& attributes = function.adapter_attributes;
@@ -42,6 +53,9 @@ void start_firmware(Function& function) {
     attributes[AX_HA_OPERATIONAL_FIRMWARE_VERSION] = version;
     if (const auto file = attributes.find(AX_HA_IPL_FILENAME); file != attributes.end())
         file->second = Attribute::of_text("VLN-" + version.text() + ".img");
+    for (auto& [tag, entry] : function.fru_vpd)
+        if (tag == "FW")
+            set_version(entry, version.text());
 }
 
 // States of a port, of which two wait for a reset of the adapter.

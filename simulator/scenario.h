@@ -34,6 +34,7 @@ std::uint32_t read_identifier(const Node& value, std::string_view key,
                               std::span<const Identifier> table);
 
 std::vector<std::pair<std::string, Bytes>> read_vpd(const Node& values);
+Bytes read_vpd_value(const Node& value); // of one entry
 AX_iSCSI_InitiatorProperties read_initiator(const Node& values);
 // Options that are not given stay as they are.
 void read_login_options(const Node& values, AX_iSCSI_LoginOptions& options);

@@ -212,6 +212,21 @@ void read_login_options(const Node& values, AX_iSCSI_LoginOptions& options) {
     read_fields(values, login_fields, &options);
 }
 
+Bytes read_vpd_value(const Node& value) {
+    Bytes bytes;
+    if (value.is(Value::Kind::object)) {
+        bytes = read_attribute(value, nullptr).bytes;
+    } else if (value.is(Value::Kind::number)) {
+        bytes.push_back(static_cast<std::uint8_t>(value.number(0xFF)));
+    } else {
+        const std::string text = value.text();
+        bytes.assign(text.begin(), text.end());
+    }
+    if (bytes.size() > 255)
+        value.fail("longer than 255 bytes");
+    return bytes;
+}
+
 std::vector<std::pair<std::string, Bytes>> read_vpd(const Node& values) {
     values.expect_any_object();
     std::vector<std::pair<std::string, Bytes>> entries;
@@ -221,18 +236,7 @@ std::vector<std::pair<std::string, Bytes>> read_vpd(const Node& values) {
             continue;
         if (tag.size() != 2)
             value.fail("a tag of two characters is wanted");
-        Bytes bytes;
-        if (value.is(Value::Kind::object)) {
-            bytes = read_attribute(value, nullptr).bytes;
-        } else if (value.is(Value::Kind::number)) {
-            bytes.push_back(static_cast<std::uint8_t>(value.number(0xFF)));
-        } else {
-            const std::string text = value.text();
-            bytes.assign(text.begin(), text.end());
-        }
-        if (bytes.size() > 255)
-            value.fail("longer than 255 bytes");
-        entries.emplace_back(tag, std::move(bytes));
+        entries.emplace_back(tag, read_vpd_value(value));
     }
     return entries;
 }

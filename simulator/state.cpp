@@ -118,6 +118,17 @@ std::string key_of(Identifiers identifiers, std::uint32_t number) {
     return known ? std::string(known->name) : std::to_string(number);
 }
 
+// A text of plain characters as such, all else as bytes.
+Json text_or_bytes(const std::string& text, const Bytes& bytes) {
+    std::string escaped;
+    for (const char c : text) {
+        if (c < ' ' || c > '~')
+            return {{"bytes", hexadecimal(bytes.data(), bytes.size())}};
+        escaped += c == '{' ? "{{" : std::string(1, c); // a brace begins a placeholder
+    }
+    return escaped;
+}
+
 // As read_attribute takes it: what is of the kind of its identifier as such, all else as bytes.
 Json attribute_to_json(const Attribute& attribute, const Identifier* identifier) {
     const bool ends_with_nul = attribute.bytes.size() == attribute.length + std::size_t{1};
@@ -126,16 +137,8 @@ Json attribute_to_json(const Attribute& attribute, const Identifier* identifier)
                                                 : Attribute_Kind::bytes;
     if (kind == Attribute_Kind::number && attribute.bytes.size() == sizeof(std::uint32_t))
         return attribute.number();
-    if (kind == Attribute_Kind::text && ends_with_nul) {
-        std::string text;
-        bool plain = true;
-        for (const char c : attribute.text()) {
-            text += c == '{' ? "{{" : std::string(1, c); // a brace begins a placeholder
-            plain &= c >= ' ' && c <= '~';
-        }
-        if (plain)
-            return text;
-    }
+    if (kind == Attribute_Kind::text && ends_with_nul)
+        return text_or_bytes({attribute.bytes.begin(), attribute.bytes.end() - 1}, attribute.bytes);
     return {{"bytes", hexadecimal(attribute.bytes.data(), attribute.bytes.size())}};
 }
 
@@ -190,6 +193,23 @@ void set_feature(Function& function, const std::string& name, const Node& value)
         function.features[number] = read_feature(value);
 }
 
+Json list_vpd(const Function& function) {
+    Json values = Json::object();
+    for (const auto& [tag, bytes] : function.fru_vpd)
+        values[tag] = text_or_bytes({bytes.begin(), bytes.end()}, bytes);
+    return values;
+}
+
+void set_vpd(Function& function, const std::string& tag, const Node& value) {
+    const Bytes bytes = read_vpd_value(value);
+    for (auto& [known, entry] : function.fru_vpd)
+        if (known == tag) {
+            entry = bytes;
+            return;
+        }
+    value.fail("the function has no such entry");
+}
+
 template <auto parameters>
 Json list_parameters(const Function& function) {
     Json values = Json::object();
@@ -213,6 +233,7 @@ constexpr Piece PIECES[] = {
           set_attribute<&Function::port_attributes, port_attribute_identifiers>>("portAttributes"),
     table<list_statistics, set_statistic>("statistics"),
     table<list_features, set_feature>("features"),
+    table<list_vpd, set_vpd>("vpd"),
     table<list_parameters<&Function::driver_parameters>,
           set_parameter<&Function::driver_parameters>>("driverParameters"),
     table<list_parameters<&Function::global_driver_parameters>,

@@ -4,6 +4,7 @@
 #define VLN_SERVICES_PROVIDERS_H
 
 #include "services/configuration/provider.h"
+#include "services/firmware/provider.h"
 #include "services/profiles/provider.h"
 
 #endif // VLN_SERVICES_PROVIDERS_H

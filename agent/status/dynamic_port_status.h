@@ -22,6 +22,11 @@ struct Dynamic_Port_Status {
     std::vector<Dynamic_Port_Row> rows;
 };
 
+// Both states of the row's port as the library has them now, in one call or, from a library that
+// does not know that one, in two. Throws std::exception, and leaves the row, unless both can be
+// read.
+void read_states(Dynamic_Port_Row& row);
+
 } // namespace cimple
 
 #endif // VLN_AGENT_STATUS_DYNAMIC_PORT_STATUS_H

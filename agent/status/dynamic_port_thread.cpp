@@ -35,23 +35,6 @@ Attribute_Buffer fetch_states(AX_WWN wwn) {
     return fetchPortAttributes(wwn);
 }
 
-// Throws std::exception, and leaves the row, unless both states can be read.
-void read_states(Dynamic_Port_Row& row) {
-    AX_WWN wwn{};
-    if (!wwnOfName(row.name, wwn, VLN_DBG))
-        throw std::exception();
-    Attribute_Buffer buffer = fetch_states(wwn);
-    uint32 functional_state = 0;
-    uint32 physical_state = 0;
-    if (!getStatusNumber(buffer, AX_PA_FUNCTIONAL_PORT_STATE,
-                         "ERROR: AX_GetttributeValue for PortState", functional_state) ||
-        !getStatusNumber(buffer, AX_PA_PHYSICAL_PORT_STATE,
-                         "ERROR: AX_GetttributeValue for PhysicalPortState", physical_state))
-        throw std::exception();
-    row.functional_state = functional_state;
-    row.physical_state = physical_state;
-}
-
 // Takes a lock that a refresh may hold for long; false, and no lock, if the thread is stopped
 // first.
 bool lock_or_stop(const ProviderAgent& agent, Mutex& mutex) {
@@ -105,6 +88,22 @@ void run(ProviderAgent& agent, Port_Rows rows) {
 }
 
 } // namespace
+
+void read_states(Dynamic_Port_Row& row) {
+    AX_WWN wwn{};
+    if (!wwnOfName(row.name, wwn, VLN_DBG))
+        throw std::exception();
+    Attribute_Buffer buffer = fetch_states(wwn);
+    uint32 functional_state = 0;
+    uint32 physical_state = 0;
+    if (!getStatusNumber(buffer, AX_PA_FUNCTIONAL_PORT_STATE,
+                         "ERROR: AX_GetttributeValue for PortState", functional_state) ||
+        !getStatusNumber(buffer, AX_PA_PHYSICAL_PORT_STATE,
+                         "ERROR: AX_GetttributeValue for PhysicalPortState", physical_state))
+        throw std::exception();
+    row.functional_state = functional_state;
+    row.physical_state = physical_state;
+}
 
 void* DynamicDataFetch_Handler(void* argument) {
     VLN_LOG(VLN_DBG, "PERF: DynamicDataFetch_Handler Thread BEGIN");

@@ -15,6 +15,7 @@ namespace cimple {
 
 class Port;
 class ProviderAgent;
+class String;
 struct VLNMPCA_Card;
 struct VLNMPCA_FCPortStatistics;
 
@@ -38,6 +39,10 @@ void GetFCoEPortStats(ProviderAgent& agent);
 void UpdatePhyLinkDownReason(ProviderAgent& agent);
 void UpdateBoardTemp(ProviderAgent& agent);
 void UpdateDriverParameters(ProviderAgent& agent); // driver_parameter_maps.cpp
+
+// The state of the Ethernet port of that name as the library has it now, with m_DataMutex held.
+// What was polled before is forgotten. A failure is told in the log and leaves the port as it is.
+void readEthernetPortStatus(ProviderAgent& agent, const String& name);
 
 // The temperature of a card as one of its ports, of the name of 16 digits, tells it now. A failure
 // is told in the log and leaves the card as it is.

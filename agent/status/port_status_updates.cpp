@@ -124,6 +124,30 @@ void show_port_status(ProviderAgent& agent) {
                 change(ports, i, [&](VLNMPCA_EthernetPort& port) { show_status(data, port, row); });
 }
 
+// So that the next enumeration does not show an older state again.
+void replace_row(ProviderAgent& agent, const Dynamic_Port_Row& row) {
+    Auto_Mutex lock(agent.m_DynamicPortStatusMutex);
+    if (agent.m_pDynamicPortStatus)
+        for (Dynamic_Port_Row& known : agent.m_pDynamicPortStatus->rows)
+            if (std::strcmp(known.name, row.name) == 0)
+                known = row;
+}
+
+void read_port_status(ProviderAgent& agent, const String& name) {
+    Dynamic_Port_Row row{};
+    if (name.size() > Dynamic_Port_Row::NAME_LENGTH)
+        return;
+    std::memcpy(row.name, name.c_str(), name.size());
+    read_states(row);
+    row.scan_number = agent.m_pData->scanNumber;
+    replace_row(agent, row);
+    auto& ports = agent.m_VLNMPCA_EthernetPort_map;
+    for (uint32 i = 0; i < ports.size(); ++i)
+        if (ports[i]->DeviceID.value == name)
+            change(ports, i,
+                   [&](VLNMPCA_EthernetPort& port) { show_status(*agent.m_pData, port, row); });
+}
+
 // ---- Port controllers and cards ----
 
 void update_phy_link_down_reason(ProviderAgent& agent, uint32 controller,
@@ -170,6 +194,11 @@ void UpdateDynamicEthernetPortStatus(ProviderAgent& agent) {
     VLN_LOG(VLN_DBG, "Returning from m_DynamicPortThreadInitialized true condn");
     if (!run_guarded([&] { show_port_status(agent); }))
         VLN_LOG(VLN_ERR, "Error getting Nic Port status");
+}
+
+void readEthernetPortStatus(ProviderAgent& agent, const String& name) {
+    if (!run_guarded([&] { read_port_status(agent, name); }))
+        VLN_LOG(VLN_DBG, "Error occurred while retrieving NicPort status...");
 }
 
 void UpdatePhyLinkDownReason(ProviderAgent& agent) {

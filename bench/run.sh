@@ -134,6 +134,19 @@ read -r before after made <<<"$("$san" resident 4096)"
 printf 'resident memory with 4,096 units, every class enumerated once: %d KiB for %d instances, at most 49152; %d KiB of it since the module was loaded\n' \
     "$after" "$made" $((after - before))
 
+# Again the module alone: the object manager hands out the bytes one by one.
+bytes=$((8 << 20))
+count "--toggle-collect=vln_measured --compress-strings=no" "$build/bin/bench_stream" $bytes >"$work/all"
+own=$(awk '
+    /^ob=/ { ours = /vorlan_mpca_provider/ }
+    /^calls=/ { getline; next }
+    ours && /^[-+*0-9]/ { own += $2 }
+    END { printf "%.0f", own }' "$work/out")
+[ "$own" -gt 0 ] || { echo "bench: no instruction of the module was seen" >&2; exit 1; }
+echo
+awk -v own="$own" -v bytes=$bytes 'BEGIN {
+    printf "An image of 8 MiB as bytes: %.1f instructions of the module itself per byte, at most 60\n", own / bytes }'
+
 module="$build/lib/libvorlan_mpca_provider.so"
 strip -o "$work/stripped.so" "$module"
 echo

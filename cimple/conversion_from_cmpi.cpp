@@ -227,9 +227,40 @@ bool read_elements(const CMPIArray* array, Read read_element) {
     return true;
 }
 
+// Numbers on their way into an array, many at a time: an image of firmware has millions.
+class Number_Batch {
+public:
+    explicit Number_Batch(Array_Base& out) : _out(out), _width(out.traits()->size) {}
+
+    // Every member of the union starts at its first byte; what is behind it is overwritten by the
+    // next number.
+    void append(const CMPIValue& value) {
+        std::memcpy(_bytes + _used, &value, sizeof value);
+        _used += _width;
+        if (_used >= SIZE)
+            flush();
+    }
+    void flush() {
+        _out.append(_bytes, _used / _width);
+        _used = 0;
+    }
+
+private:
+    static constexpr uint32 SIZE = 1024;
+
+    Array_Base& _out;
+    const uint32 _width;
+    uint32 _used = 0;
+    char _bytes[SIZE + sizeof(CMPIValue)];
+};
+
 bool read_scalar_array(const CMPIArray* array, CMPIType element_type, uint32 type,
                        Array_Base& out) {
-    return read_elements(array, [&](const CMPIData& element) {
+    CMPICount size = 0;
+    if (cmpi::array_size(array, size))
+        out.reserve(size); // else the blocks before would stand beside the last, large one
+    Number_Batch numbers(out);
+    const bool complete = read_elements(array, [&](const CMPIData& element) {
         if (element.type != element_type) {
             CIMPLE_WARN("type mismatch");
             return false;
@@ -252,10 +283,13 @@ bool read_scalar_array(const CMPIArray* array, CMPIType element_type, uint32 typ
             const boolean flag = element.value.boolean != 0;
             out.append(&flag, 1);
         } else {
-            out.append(&element.value, 1); // every member starts at the union's first byte
+            numbers.append(element.value);
         }
         return true;
     });
+    if (complete)
+        numbers.flush();
+    return complete;
 }
 
 // Instances on their way into an array; freed unless taken.

@@ -36,7 +36,7 @@ std::string host_path(Host_File file) {
 
 std::string working_file(const std::string& name) {
     const std::string root = host_root();
-    return root.empty() ? name : root + "/" + name;
+    return root.empty() || name.starts_with('/') ? name : root + "/" + name;
 }
 
 } // namespace cimple

@@ -24,8 +24,8 @@ enum class Host_File {
 // The file's name below the root prefix. Nothing is created, neither the file nor its folder.
 std::string host_path(Host_File file);
 
-// A file in the folder that the object manager works in, which stays relative to it: the name as it
-// is, behind the root prefix where there is one.
+// A file that a client names, in the folder that the object manager works in: the name as it is. A
+// simulated host has a working folder of its own, for names without a folder's root.
 std::string working_file(const std::string& name);
 
 // The prefix of all of the above, without a slash at its end.

@@ -4,6 +4,7 @@
 #include "agent/text.h"
 #include "classes/CIM_LogicalPort.h"
 #include "classes/VLNMPCA_SoftwareIdentity.h"
+#include "foundation/host_paths.h"
 #include "services/firmware/port_switches.h"
 #include "services/method_call.h"
 
@@ -296,12 +297,13 @@ uint32 install_from_bytes(ProviderAgent& agent, const CIM_ManagedElement* target
     if (!name)
         return INSTALL_INVALID_OPTION;
     VLN_LOG(VLN_DBG, "filename is : %s", name->c_str());
-    Passing_File file(name->c_str());
+    const std::string path = working_file(name->c_str());
+    Passing_File file(path.c_str());
     if (!file.write(image)) {
         VLN_LOG(VLN_ERR, "Could not open file to copy the firmware from ByteStream");
         return INSTALL_CANNOT_OPEN;
     }
-    return install_file(*found.port, name->c_str());
+    return install_file(*found.port, path.c_str());
 }
 
 void update_firmware_on_flash(ProviderAgent& agent, const String& device_id, const HBA_WWN& name) {

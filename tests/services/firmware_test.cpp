@@ -1,4 +1,5 @@
 // The service that installs firmware, as a client calls it.
+#include "tests/operations/http_server.h"
 #include "tests/road/properties.h"
 
 #include <filesystem>
@@ -305,6 +306,58 @@ TEST_F(Installation, AnImageOfBytesIsAFileAsLongAsTheCall) {
             {"InstallOptionsValues", named}});
     EXPECT_EQ(shown("FWDownloadStatus"), "-");
     EXPECT_FALSE(is_there("stream.img"));
+}
+
+// ---- From an address ----
+
+// As the service tells it to consoles.
+bool is_curl_there(Road& road) {
+    return text_of(road.enumerate("VLNMPCA_SoftwareInstallationServiceCapabilities").at(0),
+                   "SupportedURISchemes") == "{3, 4, 5, 6, 8}";
+}
+
+TEST_F(Installation, AnImageIsFetchedFromAnAddressAndRemovedWhenItIsInstalled) {
+    if (sizeof(void*) == 4 && !is_curl_there(road))
+        GTEST_SKIP() << "the machine has no libcurl of 32 bits (Debian: libcurl4:i386)";
+    std::filesystem::create_directory(road.root() / "served");
+    write("served/web.img", VERSION);
+    const Http_Server server(road.root() / "served");
+    const std::string &plain = server.plain(), &secure = server.secure();
+    const struct {
+        std::string uri;
+        std::uint64_t value;
+        const char* line;
+        const char* left; // in the working folder
+    } rows[] = {
+        {plain + "/web.img", 0, "web.img removed successfully", nullptr},
+        {secure + "/web.img", 0, "web.img removed successfully", nullptr},
+        {plain + "/none.img", 40141, "Status: <141>:The file is no firmware image", "none.img"},
+        {plain + "/cut.vfw", 4107, "ERROR: CURL returned with Error :18", "cut.vfw"},
+        {"http://127.0.0.1:1/no.img", 4107, "ERROR: CURL returned with Error :7", "no.img"},
+        {"http://[/bad.img", 4107, "ERROR: CURL returned with Error :3", "bad.img"},
+        {"bare.img", 4107, "ERROR: vlncimDownloadFW: FW file not found", nullptr},
+    };
+    for (const auto& row : rows) {
+        expect(row.value, {row.line}, "InstallFromURI",
+               {{"Target", port}, {"URI", Value::text(row.uri)}});
+        EXPECT_TRUE(!row.left || is_there(row.left)) << row.uri;
+    }
+    EXPECT_FALSE(is_there("web.img"));
+    EXPECT_EQ(vlnsim_calls("AX_DownloadFirmware"), 2u);
+    EXPECT_EQ(text_of(firmware(), "FirmwareOnFlash"), VERSION);
+}
+
+TEST_F(Installation, WithoutLibcurlAnAddressCannotBeReached) {
+    if (is_curl_there(road))
+        GTEST_SKIP() << "there is a libcurl; the test services_without_libcurl hides it";
+    EXPECT_EQ(
+        road.count_in_log("libcurl is not present. only file type URIScheme will be supported"),
+        1u);
+    expect(4107,
+           {"ERROR: Could not load the curl library to download from internet",
+            "ERROR: vlncimDownloadFW: FW file not found"},
+           "InstallFromURI",
+           {{"Target", port}, {"URI", Value::text("http://127.0.0.1:1/new.img")}});
 }
 
 // ---- Switches of a port ----

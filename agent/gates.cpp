@@ -45,6 +45,16 @@ void request_stale_san_maps(ProviderAgent& agent) {
 }
 
 Operation_Prologue::Operation_Prologue(ProviderAgent& agent)
-    : _data_lock(data_mutex_behind_gates(agent)) {}
+    : _agent(agent), _data_lock(data_mutex_behind_gates(agent)) {}
+
+void Operation_Prologue::refreshAdapterMaps() {
+    struct Given_Up {
+        explicit Given_Up(Mutex& mutex) : mutex(mutex) { mutex.unlock(); }
+        ~Given_Up() { mutex.lock(); }
+        Mutex& mutex;
+    };
+    const Given_Up data(_agent.m_DataMutex);
+    _agent.refreshAdapterMaps();
+}
 
 } // namespace cimple

@@ -88,7 +88,13 @@ class Operation_Prologue {
 public:
     explicit Operation_Prologue(ProviderAgent& agent);
 
+    // Has the adapter maps built anew and waits for them, with m_DataMutex, which the refresh
+    // needs, given up meanwhile. What was read of the stores before is not to be trusted
+    // afterwards.
+    void refreshAdapterMaps();
+
 private:
+    ProviderAgent& _agent;
     Auto_Mutex _data_lock;
     No_Cancellation _in_the_library;
 };

@@ -60,6 +60,10 @@ public:
     // Every class operation calls this before it reads anything: decides whether a refresh is due
     // and starts it. Takes m_DataFetchMutex; answers 0 always and waits for no refresh.
     int BuildCimpleInfo();
+    // Asks for new adapter data, starts the refresh that brings them, and waits until their maps are
+    // ready; no longer than to the end of that refresh, or of one that was under way, whatever
+    // became of it. No lock is held.
+    void refreshAdapterMaps();
     // Whether this thread is the refresh: a request that its up-calls lead to. It finds the stores
     // as they are, since the refresh cannot go on before it is answered.
     static bool isRefreshThread() noexcept;
@@ -129,6 +133,8 @@ public:
     Mutex m_DataFetchMutex; // guards the refresh decision and the members around it
     // A start that failed leaves it set: the stores stay as they are.
     bool m_bDataFetchRunning = false;
+    // Whether a refresh thread is at work. Its end is told at the gate of the adapter maps.
+    std::atomic<bool> m_bRefreshAtWork = false;
     std::atomic<bool> m_bProcessEnds = false; // no refresh starts any more
     // How many refreshes were told to end before they were done. Those whom such a refresh would
     // have let through the gates start another.
@@ -166,6 +172,7 @@ private:
     void rebuildSANMaps();
     bool finishRefresh();
     void wakeWaiters();
+    void tellEnd();
 
     // The two map builders, on the refresh thread, under m_DataMutex. 0 or 32769.
     uint32 updateAdapterMaps(const Platform_Objects& platform);

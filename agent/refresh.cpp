@@ -87,10 +87,24 @@ int ProviderAgent::BuildCimpleInfo() {
     if (!m_bSANRefreshRequested && !m_bSANMapsAsked)
         m_bAdapterRefreshRequested = true;
     // After a start that fails the running flag stays up: the stores keep what they hold.
-    if (const int error = m_DataFetchThread.start(DataFetch_Handler, this))
+    m_bRefreshAtWork = true;
+    if (const int error = m_DataFetchThread.start(DataFetch_Handler, this)) {
+        m_bRefreshAtWork = false;
         VLN_LOG(VLN_ERR, "Error : DataFetch_Handler thread could not be started (%d)", error);
+    }
     VLN_LOG(VLN_DBG, "PERF: ---Created DataFetch_Handler thread -- BuildCimpleInfo END---");
     return 0;
+}
+
+// The refresh's own thread, in a request that an up-call leads to, would wait for itself.
+void ProviderAgent::refreshAdapterMaps() {
+    m_bAdapterRefreshRequested = true;
+    BuildCimpleInfo();
+    if (isRefreshThread())
+        return;
+    Auto_Mutex gate(m_AdapterMapsReadyMutex);
+    while (m_bRefreshAtWork && (m_bAdapterRefreshRequested || !m_bIsAdapterMapsReady))
+        m_AdapterMapsReadyCond.wait(m_AdapterMapsReadyMutex);
 }
 
 // ---- The thread ----
@@ -106,6 +120,7 @@ void* ProviderAgent::DataFetch_Handler(void* argument) {
             agent->runSANPass();
     } while (!agent->finishRefresh());
     agent->wakeWaiters();
+    agent->tellEnd();
     VLN_LOG(VLN_DBG, "PERF: DataFetch_Handler Thread END");
     return nullptr;
 }
@@ -240,6 +255,14 @@ void ProviderAgent::wakeWaiters() {
     wake(m_AdapterDataReadyMutex, m_AdapterDataReadyCond);
     wake(m_AdapterMapsReadyMutex, m_AdapterMapsReadyCond);
     wake(m_SANMapsReadyMutex, m_SANMapsReadyCond);
+}
+
+// The next refresh joins this thread before it lowers a flag, so nobody passes a gate by this who
+// should not.
+void ProviderAgent::tellEnd() {
+    Auto_Mutex gate(m_AdapterMapsReadyMutex);
+    m_bRefreshAtWork = false;
+    m_AdapterMapsReadyCond.broadcast();
 }
 
 } // namespace cimple

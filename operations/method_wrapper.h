@@ -20,6 +20,14 @@
 
 namespace cimple {
 
+// How the event log of an adapter's firmware is laid out, and what each module writes to it.
+struct VLN_EventLogSettings {
+    uint32 maxLogEntries = 0;
+    uint32 logEntrySize = 0;
+    uint32 logType = 0; // a bit for each AX_LOG_MODE_
+    std::vector<AX_EventLogModule> modules;
+};
+
 class VLN_MethodWrapper : public VLN_Identifiers {
 public:
     // Bytes of the name of the host's system with its end mark.
@@ -105,6 +113,36 @@ public:
                                       bool& fetched);
     // Sends a file to where the URI says; 0, or -1 after a line of the log.
     static int uploadFileUsingCurl(const char* uri, const char* file);
+
+    // ---- Dumps (dump.cpp) ----
+
+    // Where a dump of an adapter that works is taken from.
+    enum Snapshot_Mode : sint32 { SNAPSHOT_TESSEL = -1, SNAPSHOT_FLASH = 0, SNAPSHOT_RAM = 1 };
+    static AX_STATUS vlncimDumpDiagnostic(const HBA_WWN* name, Snapshot_Mode mode);
+    // Also of a port whose firmware has failed, by the name that GetDeadNICPorts gives it.
+    static AX_STATUS vlncimGetCoreDump(const HBA_WWN* name, const char* options);
+    // Fetches what an adapter keeps in its memory; with a null name, what all of the host keep.
+    static AX_STATUS vlncimRetrieveFATDump(const HBA_WWN* name);
+    static AX_STATUS GetDumpFileNames(const HBA_WWN* name, std::vector<std::string>* files);
+    static AX_STATUS vlncimDeleteDumpFiles(const HBA_WWN* name);
+    static AX_STATUS vlncimGetDumpDirectory(const HBA_WWN* name, std::string* directory);
+    static AX_STATUS vlncimSetDumpDirectory(const HBA_WWN* name, const char* directory);
+    // How many dump files are kept: 1 to 20, else 1 is answered.
+    static AX_STATUS vlncimGetRetentionCount(const HBA_WWN* name, uint32* count);
+    static AX_STATUS vlncimSetRetentionCount(const HBA_WWN* name, uint32 count);
+    // The ports whose firmware has failed.
+    static AX_STATUS GetDeadNICPorts(std::vector<AX_DeadNicPort>* ports);
+
+    // ---- What the firmware traces (event_log.cpp) ----
+
+    static AX_STATUS GetExtFATAdvancedData(const HBA_WWN* name, VLN_EventLogSettings* settings);
+    // modes: a bit for each AX_LOG_MODE_.
+    static AX_STATUS SetExtFATAdvancedData(const HBA_WWN* name, const char* module, uint32 modes,
+                                           const AX_EventLogMode& values);
+    // Of all modules, in the modes of those bits.
+    static AX_STATUS vlncimSetAdvancedDumpTraceLevel(const HBA_WWN* name, uint32 level,
+                                                     uint32 modes);
+    static AX_STATUS vlncimRestoreDefaultSettings(const HBA_WWN* name);
 
     // Logs a status of the library with its text for it, if it has one, at level 5.
     static void logStatus(AX_STATUS status);

@@ -3,6 +3,8 @@
 #include "foundation/logger.h"
 #include "services/configuration/instances.h"
 #include "services/driver_parameters/instances.h"
+#include "services/dump/down_ports.h"
+#include "services/dump/instances.h"
 #include "services/firmware/instances.h"
 #include "services/record_logs/instances.h"
 #include "services/wwn/instances.h"
@@ -18,6 +20,14 @@ constexpr Class_Group GROUPS[] = {
     {.place = NIC_CARDS,
      .create = StartSoftwareInstallationService,
      .failed = {VLN_CRIT, "StartSoftwareInstallationService failed"}},
+    {.place = NIC,
+     .create = retrieve_down_ports,
+     .failed = {VLN_ERR, "RetrieveDownNICPorts failed"}},
+    {.place = NIC,
+     .create = create_dump_service,
+     .clear = clear_dump_service,
+     .failed = {VLN_ERR, "MPCA Dump Feature is either Not Supported/Failed to create the feature"},
+     .thrown = {VLN_ERR, "Failed to create the MPCA Dump service"}},
     {.place = LOGS, .create = create_record_logs},
     {.place = FCOE,
      .create = start_wwn_service,

@@ -60,6 +60,11 @@ Function* Call::function(AX_WWN wwn) {
     return found;
 }
 
+Function* Call::function_or_dead_port(AX_WWN wwn) {
+    Function* dead = sim.find_dead_port(name_of(wwn));
+    return dead ? dead : function(wwn);
+}
+
 bool Call::too_small(std::uint64_t room, std::uint32_t& needed) const {
     if (forced_size) {
         if (*forced_size)

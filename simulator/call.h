@@ -42,6 +42,8 @@ public:
     bool null(const void* pointer, const char* name);
     // The function with that port WWN; null, with a violation, when there is none.
     Function* function(AX_WWN wwn);
+    // The same, or the dead port that the name stands for.
+    Function* function_or_dead_port(AX_WWN wwn);
 
     // Whether room for needed bytes or entries is missing, by itself or by the script; then needed
     // is what the caller is to be told.

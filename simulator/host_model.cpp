@@ -1,5 +1,7 @@
 #include "simulator/host_model.h"
 
+#include "simulator/identifiers.h"
+
 #include <cstring>
 
 namespace vlnsim {
@@ -36,6 +38,14 @@ std::uint32_t Attribute::number() const {
 
 std::string Attribute::text() const {
     return std::string(bytes.begin(), bytes.begin() + length);
+}
+
+std::uint64_t Function::mac_address() const {
+    std::uint8_t name[8] = {};
+    const auto found = adapter_attributes.find(adapter_ieee_address);
+    if (found != adapter_attributes.end() && found->second.length == 6)
+        std::memcpy(name + 2, found->second.bytes.data(), 6);
+    return get_name(name);
 }
 
 void put_name(std::uint64_t wwn, std::uint8_t* bytes) {

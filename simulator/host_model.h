@@ -78,6 +78,19 @@ struct iSCSI_Target {
 
 using Driver_Parameters = std::vector<AX_DriverParam>;
 
+using Trace_Settings = std::vector<AX_EventLogModule>;
+
+// What an adapter keeps of its firmware's dumps. Its functions have the same.
+struct Dumps {
+    std::string directory; // on the host
+    std::uint32_t retention = 0;
+    std::uint32_t stored = 0; // in the adapter's memory, not yet fetched
+    AX_STATUS core_dump = AX_STATUS_OK;
+    AX_EventLogConfig log{}; // its head
+    Trace_Settings modules;
+    Trace_Settings factory;
+};
+
 // A feature's answer: a value, or a status alone.
 struct Feature {
     std::uint32_t value = 0;
@@ -116,6 +129,7 @@ struct Function {
     std::uint32_t special_features = 0;
     std::uint16_t sub_adapter = 0;
     std::string model;
+    bool dead = false;
     bool v4_record = true;
     bool v3_record = true;
 
@@ -138,6 +152,7 @@ struct Function {
     Effect firmware_effect = Effect::reset;
     Effect port_effect = Effect::once;
     std::uint32_t resets = 0;
+    std::optional<Dumps> dumps;
 
     std::optional<std::string> hba_name; // the adapter's name in the HBA API, which then knows it
     std::uint32_t hba_ports = 1;
@@ -146,6 +161,8 @@ struct Function {
     bool mapping_by_unit = false; // all targets' first units first, or target by target
     std::vector<Target> targets;
     std::vector<iSCSI_Target> iscsi_targets;
+
+    std::uint64_t mac_address() const; // as a number
 };
 
 // What a library file of the host exports beside or without what it would by itself.
@@ -171,6 +188,7 @@ struct Host {
     AX_ServerAttributes server{};
     std::string address = "192.0.2.10"; // of the host's name; empty: cannot be resolved
     std::vector<Function> functions;
+    std::vector<Function> dead_ports; // whose firmware has failed: no instances of the library
     std::vector<Fault> faults;
 };
 

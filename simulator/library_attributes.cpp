@@ -147,7 +147,7 @@ AX_STATUS AX_GetHBAFeature(AX_WWN wwn, uint32_t identifier, uint32_t* value) {
         [&](Call& call) -> AX_STATUS {
             if (call.null(value, "value"))
                 return AX_STATUS_INVALID_ARGUMENT;
-            const Function* function = call.function(wwn);
+            const Function* function = call.function_or_dead_port(wwn);
             if (!function)
                 return AX_STATUS_ILLEGAL_WWN;
             const auto it = function->features.find(identifier);

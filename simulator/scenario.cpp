@@ -158,6 +158,10 @@ private:
     }
 
     void add(Function made, const Node& source) {
+        if (made.dead) {
+            _host.dead_ports.push_back(std::move(made));
+            return;
+        }
         for (const Function& other : _host.functions) {
             if (other.wwpn == made.wwpn)
                 source.fail("\"wwpn\" is that of another function; a placeholder such as {port} or "

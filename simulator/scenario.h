@@ -64,6 +64,8 @@ Driver_Parameters read_driver_parameters(const Node& values);
 void set_driver_parameter(std::optional<Driver_Parameters>& parameters, const std::string& name,
                           const Node& value);
 
+Dumps read_dumps(const Node& values);
+
 // The targets that an iSCSI function sees; its initiator and network records have been read.
 std::vector<iSCSI_Target> read_iscsi_targets(const Node& values, const Function& function);
 

@@ -64,6 +64,7 @@ void read_identity(const Node& values, Function& function) {
         function.fabric = fabric->wwn();
     function.instance = values.number32("instance", placeholder_number(values.scope(), "instance"));
     function.flags = values.number32("flags", 0);
+    function.dead = values.boolean("dead", false);
     function.sub_adapter = static_cast<std::uint16_t>(values.number("subAdapter", 0, 0xFFFF));
     function.model = values.text("model", "");
     if (function.model.size() > max_model)
@@ -162,6 +163,8 @@ void read_records(const Node& values, Function& function) {
         function.driver_parameters = read_driver_parameters(*node);
     if (const auto node = values.member("globalDriverParameters"))
         function.global_driver_parameters = read_driver_parameters(*node);
+    if (const auto node = values.member("dumps"))
+        function.dumps = read_dumps(*node);
     if (const auto node = values.member("pci")) {
         function.pci = read_pci(*node);
         if (!node->member("functionNumber"))
@@ -266,6 +269,8 @@ std::span<const std::string_view> function_keys() {
                                                 "profiles",
                                                 "driverParameters",
                                                 "globalDriverParameters",
+                                                "dumps",
+                                                "dead",
                                                 "adapterAttributes",
                                                 "portAttributes",
                                                 "statistics",

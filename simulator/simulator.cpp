@@ -80,6 +80,13 @@ Function* Simulator::find_function(std::uint64_t wwpn) {
     return nullptr;
 }
 
+Function* Simulator::find_dead_port(std::uint64_t address) {
+    for (Function& port : host.dead_ports)
+        if (port.mac_address() == address)
+            return &port;
+    return nullptr;
+}
+
 Function* Simulator::find_instance(std::uint32_t instance) {
     for (Function& function : host.functions)
         if (function.instance == instance)

@@ -58,6 +58,8 @@ struct Simulator {
     void add_violation(Entry entry, const std::string& what);
 
     Function* find_function(std::uint64_t wwpn);
+    // By its MAC address as a number.
+    Function* find_dead_port(std::uint64_t address);
     Function* find_instance(std::uint32_t instance);
     Function* find_hba_adapter(std::string_view name);
     std::vector<Function*> hba_adapters();

@@ -28,6 +28,10 @@ std::string hexadecimal(const void* data, std::size_t size) {
 template <class Record>
 concept Library_Record = std::is_class_v<Record> && std::is_trivially_copyable_v<Record>;
 
+Json to_json(const std::string& text) {
+    return text;
+}
+
 template <std::unsigned_integral Number>
 Json to_json(Number number) {
     return number;
@@ -47,6 +51,10 @@ Json to_json(const std::optional<Value>& value) {
 template <std::unsigned_integral Number>
 void from_json(const Node& node, Number& number) {
     number = static_cast<Number>(node.number(std::numeric_limits<Number>::max()));
+}
+
+void from_json(const Node& node, std::string& text) {
+    text = node.text();
 }
 
 template <Library_Record Record>
@@ -85,6 +93,24 @@ constexpr Piece whole(std::string_view name) {
                 return value;
             },
             [](Function& function, const Node& value) { from_json(value, function.*member); },
+            nullptr};
+}
+
+// The same of what an adapter keeps of dumps; a function that keeps nothing has nothing to change.
+template <auto member>
+constexpr Piece of_dumps(std::string_view name) {
+    return {name,
+            [](const Function& now, const Function& described) -> std::optional<Json> {
+                if (!now.dumps || !described.dumps ||
+                    (*now.dumps).*member == (*described.dumps).*member)
+                    return std::nullopt;
+                return to_json((*now.dumps).*member);
+            },
+            [](Function& function, const Node& value) {
+                if (!function.dumps)
+                    value.fail("the adapter keeps no dumps");
+                from_json(value, (*function.dumps).*member);
+            },
             nullptr};
 }
 
@@ -224,6 +250,22 @@ void set_parameter(Function& function, const std::string& name, const Node& valu
     set_driver_parameter(function.*parameters, name, value);
 }
 
+Json list_trace_settings(const Function& function) {
+    Json values = Json::object();
+    if (function.dumps)
+        for (const AX_EventLogModule& each : function.dumps->modules)
+            values[std::string(each.name, strnlen(each.name, sizeof each.name))] = to_json(each);
+    return values;
+}
+
+void set_trace_setting(Function& function, const std::string& name, const Node& value) {
+    if (function.dumps)
+        for (AX_EventLogModule& each : function.dumps->modules)
+            if (name == std::string_view(each.name, strnlen(each.name, sizeof each.name)))
+                return from_json(value, each);
+    value.fail("the firmware has no such module");
+}
+
 // All that calls can change. A topic that lets callers set something adds its row here.
 constexpr Piece PIECES[] = {
     table<list_attributes<&Function::adapter_attributes, adapter_attribute_identifiers>,
@@ -238,6 +280,10 @@ constexpr Piece PIECES[] = {
           set_parameter<&Function::driver_parameters>>("driverParameters"),
     table<list_parameters<&Function::global_driver_parameters>,
           set_parameter<&Function::global_driver_parameters>>("globalDriverParameters"),
+    of_dumps<&Dumps::directory>("dumpDirectory"),
+    of_dumps<&Dumps::retention>("dumpRetention"),
+    of_dumps<&Dumps::stored>("storedDumps"),
+    table<list_trace_settings, set_trace_setting>("traceSettings"),
     whole<&Function::beacon>("beacon"),
     whole<&Function::resets>("resets"),
     whole<&Function::initiator>("initiator"),

@@ -175,7 +175,11 @@ AX_API AX_STATUS AX_SetChannelMgmtPortInfo(AX_WWN wwn, const AX_ChannelMgmtPortI
 
 /* --------------------------------------------- dead ports, virtual functions, QoS */
 
-/* Assumed: the order of the fields. */
+/*
+ * A port whose firmware has failed. It is no instance of the library; as an argument its MAC address
+ * stands for it, in the last six bytes of a WWN, which begins with zeros. Assumed: that form, and the
+ * order of the fields.
+ */
 typedef struct AX_DeadNicPort {
     uint8_t mac[6];
     uint8_t reserved[2];

@@ -65,6 +65,12 @@ bool copyAddress(const addrinfo& found, VLN_IpInfo& address) {
 
 } // namespace
 
+HBA_WWN nameOfDeadPort(const AX_DeadNicPort& port) {
+    HBA_WWN name{};
+    std::memcpy(name.wwn + sizeof name.wwn - sizeof port.mac, port.mac, sizeof port.mac);
+    return name;
+}
+
 AX_WWN wwnOf(const HBA_WWN* name) {
     return name ? AX_WwnOf(name) : AX_WWN{};
 }

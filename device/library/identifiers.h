@@ -28,6 +28,10 @@ bool wwnOfName(const char* name, AX_WWN& wwn, int level);
 // level, for a text that is none.
 bool nameOfDeviceId(const char* deviceId, HBA_WWN& name, const char* caller, int level);
 
+// By what the library takes a port whose firmware has failed, which has no name of its own: its MAC
+// address as a number.
+HBA_WWN nameOfDeadPort(const AX_DeadNicPort& port);
+
 // A device identifier is 16 hexadecimal digits, with or without a double quote in front; the
 // colon form is "XX:XX:XX:XX:XX:XX:XX:XX". Mind the senses of the results.
 struct VLN_Identifiers {

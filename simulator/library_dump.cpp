@@ -35,12 +35,28 @@ AX_STATUS with_adapter(Call& call, AX_WWN wwn, Body body) {
     return function ? body(*function) : status;
 }
 
+bool same_adapter(const Function& one, const Function& other) {
+    return one.card == other.card && one.sub_adapter == other.sub_adapter;
+}
+
 // All functions of an adapter have what one of them was set to.
 template <class Set>
 void set_adapter(Host& host, const Function& of, Set set) {
     for (Function& each : host.functions)
-        if (each.card == of.card && each.sub_adapter == of.sub_adapter && each.dumps)
+        if (same_adapter(each, of) && each.dumps)
             set(*each.dumps);
+}
+
+// A dead port has what the others of its adapter were set to, if there are any.
+Function with_settings(const Host& host, Function port) {
+    for (const Function& each : host.functions)
+        if (port.dead && same_adapter(each, port) && each.dumps) {
+            const AX_STATUS core_dump = port.dumps ? port.dumps->core_dump : AX_STATUS_OK;
+            port.dumps = each.dumps;
+            port.dumps->core_dump = core_dump;
+            break;
+        }
+    return port;
 }
 
 // ---- Files ----
@@ -213,7 +229,8 @@ AX_STATUS AX_GenerateCoreDump(AX_WWN wwn, const char* options) {
             if (std::strlen(options) > max_options)
                 call.violation("options are too long");
             const Function* function = call.function_or_dead_port(wwn);
-            return function ? take_core_dump(call, *function, options) : AX_STATUS_ILLEGAL_WWN;
+            return function ? take_core_dump(call, with_settings(call.host, *function), options)
+                            : AX_STATUS_ILLEGAL_WWN;
         },
         wwn, options);
 }

@@ -99,7 +99,7 @@ using Wanted_Modes = std::vector<Wanted_Mode>;
 // The line of the first rule that the arguments break, or null. No library and no lock beside it.
 const char* read_wanted(const VLNMPCA_ExtFATDumpAdvancedData& model, Wanted_Modes& wanted) {
     const Array<String>& modes = model.Modes.value;
-    if (modes.size() < 1 || modes.size() > AX_LOG_MODES)
+    if (model.Modes.is_null() || modes.size() < 1 || modes.size() > AX_LOG_MODES)
         return "Invalid Modes passed, supported modes are ram and uart";
     for (const String& word : modes) {
         const auto mode = log_mode_number(word.c_str());

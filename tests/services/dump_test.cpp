@@ -426,6 +426,7 @@ TEST_F(Dump, AfterADumpThatWantsARebootTheMapsAreNew) {
     sudden_ends::wait_until_held();
     vlnsim_clear_faults();
     client.join();
+    road.wait_for_refreshes(2); // whose end counts for the age of the data
     EXPECT_EQ(core_dump_status(TESSEL_PORT), "40247");
     vlnsim_advance(sudden_ends::STALE);
     EXPECT_EQ(core_dump_status(TESSEL_PORT), "40247") << "the enumeration that starts the refresh";

@@ -429,7 +429,7 @@ TEST_F(Dump, AfterADumpThatWantsARebootTheMapsAreNew) {
     road.wait_for_refreshes(2); // whose end counts for the age of the data
     EXPECT_EQ(core_dump_status(TESSEL_PORT), "40247");
     vlnsim_advance(sudden_ends::STALE);
-    EXPECT_EQ(core_dump_status(TESSEL_PORT), "40247") << "the enumeration that starts the refresh";
+    core_dump_status(TESSEL_PORT); // starts the refresh, and may see it already
     road.wait_for_refreshes(3);
     EXPECT_EQ(core_dump_status(TESSEL_PORT), "-") << "it lives as long as the maps";
 }

@@ -46,6 +46,7 @@ Lets a CIM object manager show and change the converged network adapters of
 a host: cards, ports, endpoints, targets, sessions and logical units, in
 namespace root/vorlan. Installing it registers its classes with the object
 manager that is there; removing it takes them back.")
+set(CPACK_DEBIAN_PROVIDER_PACKAGE_SUGGESTS libcurl4) # firmware from an address
 set(CPACK_DEBIAN_PROVIDER_PACKAGE_CONTROL_EXTRA
     "${CMAKE_CURRENT_SOURCE_DIR}/debian/postinst;${CMAKE_CURRENT_SOURCE_DIR}/debian/prerm;${CMAKE_CURRENT_SOURCE_DIR}/debian/postrm")
 

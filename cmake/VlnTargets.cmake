@@ -56,9 +56,6 @@ function(vln_test name)
     if(VLN_SANITIZE STREQUAL "thread")
         set_tests_properties(${name} PROPERTIES ENVIRONMENT
             "TSAN_OPTIONS=suppressions=${CMAKE_SOURCE_DIR}/tests/tsan.supp:halt_on_error=1")
-    elseif(VLN_SANITIZE MATCHES "address")
-        set_tests_properties(${name} PROPERTIES ENVIRONMENT
-            "LSAN_OPTIONS=suppressions=${CMAKE_SOURCE_DIR}/tests/lsan.supp:print_suppressions=0")
     endif()
 endfunction()
 

@@ -60,8 +60,8 @@ public:
     // Every class operation calls this before it reads anything: decides whether a refresh is due
     // and starts it. Takes m_DataFetchMutex; answers 0 always and waits for no refresh.
     int BuildCimpleInfo();
-    // Asks for new adapter data, starts the refresh that brings them, and waits until their maps are
-    // ready; no longer than to the end of that refresh, or of one that was under way, whatever
+    // Asks for new adapter data, starts the refresh that brings them, and waits until their maps
+    // are ready; no longer than to the end of that refresh, or of one that was under way, whatever
     // became of it. No lock is held.
     void refreshAdapterMaps();
     // Whether this thread is the refresh: a request that its up-calls lead to. It finds the stores

@@ -176,9 +176,9 @@ AX_API AX_STATUS AX_SetChannelMgmtPortInfo(AX_WWN wwn, const AX_ChannelMgmtPortI
 /* --------------------------------------------- dead ports, virtual functions, QoS */
 
 /*
- * A port whose firmware has failed. It is no instance of the library; as an argument its MAC address
- * stands for it, in the last six bytes of a WWN, which begins with zeros. Assumed: that form, and the
- * order of the fields.
+ * A port whose firmware has failed. It is no instance of the library; as an argument its MAC
+ * address stands for it, in the last six bytes of a WWN, which begins with zeros. Assumed: that
+ * form, and the order of the fields.
  */
 typedef struct AX_DeadNicPort {
     uint8_t mac[6];

@@ -74,6 +74,15 @@ bool Call::too_small(std::uint64_t room, std::uint32_t& needed) const {
     return room < needed;
 }
 
+bool Call::list_too_small(std::uint32_t& count, std::size_t entries) {
+    out("room", count);
+    auto needed = static_cast<std::uint32_t>(entries);
+    const bool missing = too_small(count, needed);
+    count = needed;
+    out("count", count);
+    return missing;
+}
+
 std::uint64_t Call::take_faults() {
     ++sim.calls[static_cast<unsigned>(_entry)];
     const std::string_view name = entry_name(_entry);

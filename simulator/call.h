@@ -48,6 +48,9 @@ public:
     // Whether room for needed bytes or entries is missing, by itself or by the script; then needed
     // is what the caller is to be told.
     bool too_small(std::uint64_t room, std::uint32_t& needed) const;
+    // The same for a list with the count at its head, which tells the room on the way in and what
+    // there is on the way out.
+    bool list_too_small(std::uint32_t& count, std::size_t entries);
 
     template <class Value>
     void out(const char* name, const Value& value) {

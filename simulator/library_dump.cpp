@@ -167,14 +167,9 @@ AX_STATUS AX_ListDeadNicPorts(AX_DeadNicPortList* list) {
             if (port.special_features & AX_FEATURE_NIC_FUNCTION)
                 ports.push_back(&port);
         const std::uint32_t room = list->count;
-        auto needed = static_cast<std::uint32_t>(ports.size());
-        call.out("room", room);
-        const bool too_small = call.too_small(room, needed);
-        list->count = needed;
-        call.out("count", needed);
-        if (too_small)
+        if (call.list_too_small(list->count, ports.size()))
             return AX_STATUS_MORE_DATA;
-        for (std::uint32_t i = 0; i < needed; ++i) {
+        for (std::uint32_t i = 0; i < list->count; ++i) {
             AX_DeadNicPort& entry = list->entry[i];
             std::memset(&entry, 0, sizeof entry);
             std::uint8_t name[8];
@@ -184,7 +179,7 @@ AX_STATUS AX_ListDeadNicPorts(AX_DeadNicPortList* list) {
             copy_text(ports[i]->adapter_attributes.at(adapter_serial_number).text(),
                       entry.serialNumber, sizeof entry.serialNumber);
         }
-        soil(list->entry, needed * sizeof *list->entry, room * sizeof *list->entry);
+        soil(list->entry, list->count * sizeof *list->entry, room * sizeof *list->entry);
         return AX_STATUS_OK;
     });
 }
@@ -334,15 +329,10 @@ AX_STATUS AX_GetDumpFileNames(AX_WWN wwn, AX_DumpFileList* list) {
             return with_adapter(call, wwn, [&](const Function& function) -> AX_STATUS {
                 const std::vector<std::string> names = files_of(function);
                 const std::uint32_t room = list->count;
-                auto needed = static_cast<std::uint32_t>(names.size());
-                call.out("room", room);
-                const bool too_small = call.too_small(room, needed);
-                list->count = needed;
-                call.out("count", needed);
-                if (too_small)
+                if (call.list_too_small(list->count, names.size()))
                     return AX_STATUS_LIST_TOO_SMALL;
                 soil(list->name, 0, room * sizeof *list->name);
-                for (std::uint32_t i = 0; i < needed; ++i)
+                for (std::uint32_t i = 0; i < list->count; ++i)
                     copy_text(names[i], list->name[i], sizeof list->name[i]);
                 return AX_STATUS_OK;
             });
@@ -376,18 +366,14 @@ AX_STATUS AX_Get_DX_EventLogConfigDataAll(AX_WWN wwn, AX_EventLogConfig* config)
             return with_adapter(call, wwn, [&](const Function& function) -> AX_STATUS {
                 const Trace_Settings& modules = function.dumps->modules;
                 const std::uint32_t room = config->capacity;
-                auto needed = static_cast<std::uint32_t>(modules.size());
-                call.out("room", room);
-                const bool too_small = call.too_small(room, needed);
-                config->moduleCount = needed;
-                call.out("count", needed);
-                if (too_small)
+                config->moduleCount = room;
+                if (call.list_too_small(config->moduleCount, modules.size()))
                     return AX_STATUS_MORE_DATA;
                 config->maxLogEntries = function.dumps->log.maxLogEntries;
                 config->logEntrySize = function.dumps->log.logEntrySize;
                 config->logType = function.dumps->log.logType;
                 std::copy(modules.begin(), modules.end(), config->module);
-                soil(config->module, needed * sizeof *config->module,
+                soil(config->module, modules.size() * sizeof *config->module,
                      room * sizeof *config->module);
                 return AX_STATUS_OK;
             });

@@ -220,12 +220,7 @@ AX_STATUS AX_ListProfiles(AX_WWN wwn, AX_ProfileList* list) {
             if (!function->profiles)
                 return AX_STATUS_NOT_SUPPORTED;
             const auto& profiles = function->profiles->list;
-            auto needed = static_cast<std::uint32_t>(profiles.size());
-            call.out("room", list->count);
-            const bool too_small = call.too_small(list->count, needed);
-            list->count = needed;
-            call.out("count", list->count);
-            if (too_small)
+            if (call.list_too_small(list->count, profiles.size()))
                 return AX_STATUS_MORE_DATA;
             list->activeProfileId = function->profiles->active;
             list->configuredProfileId = function->profiles->active;

@@ -45,16 +45,11 @@ template <class List, class Item>
 AX_STATUS answer_list(Call& call, const std::vector<Item>& items, List* list) {
     constexpr std::size_t entry_size = sizeof list->entry[0];
     const std::uint32_t room = list->count;
-    auto needed = static_cast<std::uint32_t>(items.size());
-    call.out("room", room);
-    const bool too_small = call.too_small(room, needed);
-    list->count = needed;
-    call.out("count", needed);
-    if (too_small)
+    if (call.list_too_small(list->count, items.size()))
         return AX_STATUS_MORE_DATA;
     for (std::size_t i = 0; i < items.size(); ++i)
         list->entry[i] = items[i].entry;
-    soil(list->entry, needed * entry_size, room * entry_size);
+    soil(list->entry, items.size() * entry_size, room * entry_size);
     return AX_STATUS_OK;
 }
 

@@ -7,7 +7,13 @@
 #include <gtest/gtest.h>
 #include <nlohmann/json.hpp>
 
+#include <filesystem>
+
 namespace {
+
+// Documented sessions write files and clear them away: never in the folder that somebody stands in.
+[[maybe_unused]] const bool IN_OWN_FOLDER = (std::filesystem::create_directories(TEST_FOLDER),
+                                             std::filesystem::current_path(TEST_FOLDER), true);
 
 const std::string A = "Test_Good.Name=\"a\"";
 

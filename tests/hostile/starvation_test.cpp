@@ -1,10 +1,11 @@
 // Want of memory at any one allocation of the product: the process lives, nothing is lost, and what
 // was refused is there again after the next fresh start.
+#include "tests/hostile/changes.h"
 #include "tests/hostile/starving.h"
-#include "tests/road/road.h"
 
 #include <dlfcn.h>
 #include <pthread.h>
+#include <set>
 #include <thread>
 
 using road::Road;
@@ -68,6 +69,35 @@ TEST(Starvation, AnyOneAllocationMayFail) {
         ASSERT_EQ(road.manager().live_object_count(), 0u);
         ASSERT_EQ(road.manager().fault_count(), 0u) << host::to_string(road.manager().faults()[0]);
         ASSERT_EQ(one_life(road), healthy) << "the next life is not whole";
+    }
+}
+
+// A change answers, whatever it finds no memory for, and a method says so; the next agent makes it.
+TEST(Starvation, AnyOneAllocationOfAChangeMayFail) {
+    constexpr unsigned long SAMPLES = 40;
+    for (const hostile::Change& row : hostile::read_changes()) {
+        SCOPED_TRACE(row.what);
+        Road road({.scenario = row.scenario});
+        const hostile::Prepared_Change change(road, row);
+        auto* const starve_hook = find_hook<decltype(starve)>("starve");
+        const auto make_afresh = [&](unsigned long number) {
+            EXPECT_TRUE(road.manager().cleanup(true).ok());
+            vlnsim_restart();
+            road.enumerate("VLNMPCA_StorageVolume"); // waits for the SAN pass
+            starve_hook(number);
+            return change.make();
+        };
+        const std::string healthy = make_afresh(0);
+        const unsigned long allocations = starve_hook(0);
+        std::set<std::string> answers;
+        for (unsigned long number = 1; number <= allocations; number += allocations / SAMPLES + 1) {
+            answers.insert(make_afresh(number));
+            starve_hook(0);
+            ASSERT_EQ(road.manager().fault_count(), 0u)
+                << host::to_string(road.manager().faults()[0]);
+        }
+        EXPECT_TRUE(change.is_modify() || answers.contains("CMPI_RC_OK 32774"));
+        EXPECT_EQ(make_afresh(0), healthy);
     }
 }
 

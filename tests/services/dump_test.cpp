@@ -414,6 +414,14 @@ TEST_F(Dump, WhatIsDownIsShownAndNotTakenForAChip) {
     EXPECT_EQ(road.count_in_log("Creating dump service for DownEthernetPort "), 1u);
 }
 
+TEST(Dump_Host, PortsThatHaveFailedCannotBeAskedFor) {
+    Road road({.scenario = "dead-port.json", .log = true});
+    vlnsim_fault("AX_ListDeadNicPorts", 1, VLNSIM_STATUS, 190);
+    EXPECT_EQ(road.enumerate("VLNMPCA_DumpService").size(), 1u);
+    EXPECT_EQ(road.count_in_log("RetrieveDownNICPorts failed"), 1u);
+    EXPECT_TRUE(road.enumerate("VLNMPCA_DownEthernetPort").empty());
+}
+
 // ---- Beside others ----
 
 // The maps are built anew while the method waits: it has given up what the refresh needs.

@@ -358,6 +358,8 @@ TEST_F(Installation, WithoutLibcurlAnAddressCannotBeReached) {
             "ERROR: vlncimDownloadFW: FW file not found"},
            "InstallFromURI",
            {{"Target", port}, {"URI", Value::text("http://127.0.0.1:1/new.img")}});
+    expect(5, {"ERROR: vlncimDownloadFW: Can't stat FW file "}, "InstallFromURI",
+           {{"Target", port}, {"URI", uri("new.img/of/no/folder")}});
 }
 
 // ---- Switches of a port ----

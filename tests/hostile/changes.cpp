@@ -1,0 +1,86 @@
+#include "tests/hostile/changes.h"
+
+#include "tools/mpcactl/assignment.h"
+
+#include <fstream>
+#include <sstream>
+
+namespace hostile {
+
+namespace {
+
+host::Instance first_instance(road::Road& road, const std::string& class_name) {
+    std::vector<host::Instance> all = road.enumerate(class_name);
+    return all.empty() ? throw std::runtime_error("no " + class_name) : std::move(all.front());
+}
+
+// With what stands for <CLASS> and for <>.
+std::string filled_in(road::Road& road, const std::string& text) {
+    const std::size_t begin = text.find('<'), end = text.find('>');
+    if (begin == std::string::npos || end == std::string::npos)
+        return text;
+    const std::string name = text.substr(begin + 1, end - begin - 1);
+    return text.substr(0, begin) +
+           (name.empty() ? road.root().string()
+                         : host::path_to_text(first_instance(road, name).path, "")) +
+           text.substr(end + 1);
+}
+
+} // namespace
+
+std::vector<Change> read_changes() {
+    std::vector<Change> changes;
+    std::ifstream file(VLN_CHANGES);
+    for (std::string line; std::getline(file, line);) {
+        std::istringstream fields(line);
+        Change change;
+        std::getline(fields, change.scenario, '\t');
+        std::getline(fields, change.what, '\t');
+        for (std::string value; std::getline(fields, value, '\t');)
+            change.values.push_back(value);
+        changes.push_back(std::move(change));
+    }
+    return changes;
+}
+
+Prepared_Change::Prepared_Change(road::Road& road, const Change& change) : _road(road) {
+    constexpr std::size_t SMALL = 1000; // bytes
+    char error[256] = "";
+    EXPECT_EQ(vlnsim_write_firmware((road.root() / "new.img").c_str(), "VMC-2210", "10.4.255.3",
+                                    SMALL, error, sizeof error),
+              0)
+        << error;
+    const std::size_t dot = change.what.find('.');
+    _instance = first_instance(road, change.what.substr(0, dot));
+    const host::ClassRepository& classes = road.manager().classes();
+    const host::Class* known = classes.find(_instance.path.class_name);
+    std::vector<std::string> values;
+    for (const std::string& value : change.values)
+        values.push_back(filled_in(road, value));
+    if (dot == std::string::npos) {
+        _values = mpcactl::read_properties(classes, *known, values, "root/vorlan");
+        return;
+    }
+    _method = change.what.substr(dot + 1);
+    const host::Method* method = known->find_method(_method);
+    if (!method)
+        throw std::runtime_error("no method " + change.what);
+    _values = mpcactl::read_inputs(classes, *method, values, "root/vorlan");
+}
+
+std::string Prepared_Change::make() const {
+    if (!is_modify()) {
+        const auto reply = _road.manager().invoke(_instance.path, _method, _values);
+        return host::rc_name(reply.status.rc) +
+               (reply.ok() ? " " + std::to_string(reply.value.value.as_unsigned()) : "");
+    }
+    host::Instance changed = _instance;
+    std::vector<std::string> names;
+    for (const host::Named_Value& value : _values) {
+        host::set(changed.properties, value.name, value.value);
+        names.push_back(value.name);
+    }
+    return host::rc_name(_road.manager().modify(changed, names).rc);
+}
+
+} // namespace hostile

@@ -1,0 +1,42 @@
+// The calls that change something, for tests that let each event of them fail in turn. A service
+// joins by a line of changes.tsv for each method and each modify.
+#ifndef TESTS_HOSTILE_CHANGES_H
+#define TESTS_HOSTILE_CHANGES_H
+
+#include "tests/road/road.h"
+
+namespace hostile {
+
+struct Change {
+    std::string scenario; // a file of the scenarios
+    // "CLASS.METHOD", called on the first instance of the class, or "CLASS", whose first instance
+    // is modified.
+    std::string what;
+    // As mpcactl takes them, where <CLASS> stands for the path of the first instance of a class,
+    // and <> for the folder of the host's root, in which the image new.img lies.
+    std::vector<std::string> values;
+};
+
+// All lines of changes.tsv: scenario, what and values between tabs.
+std::vector<Change> read_changes();
+
+// A change on the road's host, with its values read and its image written, so that it can be made
+// again and again.
+class Prepared_Change {
+public:
+    Prepared_Change(road::Road& road, const Change& change);
+
+    // As "OK 0" or "CMPI_RC_ERR_FAILED": the status, and what a method returned.
+    std::string make() const;
+    bool is_modify() const { return _method.empty(); }
+
+private:
+    road::Road& _road;
+    std::string _method;
+    host::Instance _instance;
+    host::Named_Values _values;
+};
+
+} // namespace hostile
+
+#endif // TESTS_HOSTILE_CHANGES_H

@@ -269,9 +269,11 @@ void ProviderAgent::destroyDeviceModel() {
     clearRecords();
 }
 
-// What outlives every refresh ends here.
 void ProviderAgent::clearRecords() {
     VLN_LOG(VLN_DBG, "Clearing the ConcreteJob objects related to CDM");
+    m_VLNMPCA_OwningJobElement_map.clear();
+    m_VLNMPCA_AffectedJobElement_map.clear();
+    m_VLNMPCA_ConcreteJob_map.clear();
     VLN_LOG(VLN_DBG, "Clearing all the record logs");
     m_VLNMPCA_DiagnosticServiceRecord_map.clear();
     m_VLNMPCA_DiagnosticCompletionRecord_map.clear();

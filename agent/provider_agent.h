@@ -74,6 +74,8 @@ public:
     // The caller holds the group's ready mutex and, on the refresh thread, m_DataMutex.
     void clearAdapterMaps();
     void clearSANMaps();
+    // Jobs and diagnostic records, which go with the tests and with the agent. m_DataMutex is held.
+    void clearRecords();
 
     // ---- Members ----
 
@@ -155,7 +157,6 @@ private:
     void stopDynamicThread();
     void stopDataFetch();
     void destroyDeviceModel();
-    void clearRecords();
     static ProviderAgent* instanceLocked();
     static ProviderAgent* holder(const Class_Loads& loads);
     static void destroyLocked();

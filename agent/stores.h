@@ -27,7 +27,7 @@ enum class Store_Group : uint8 {
     ISCSI,
     SAN_FCOE,
     SAN_ISCSI,
-    KEPT,    // by its owner alone: its members outlive a refresh
+    KEPT,    // by its owner alone, in its own step of the pass
     REBUILT, // by the routine that fills it
 };
 

@@ -2,6 +2,7 @@
 
 #include "foundation/logger.h"
 #include "services/configuration/instances.h"
+#include "services/diagnostics/instances.h"
 #include "services/driver_parameters/instances.h"
 #include "services/dump/down_ports.h"
 #include "services/dump/instances.h"
@@ -35,6 +36,11 @@ constexpr Class_Group GROUPS[] = {
     {.place = FCOE, .create = create_driver_parameter_service},
     {.place = FC_PORT, .create = create_driver_parameters},
     {.place = FC_PORTS, .create = join_driver_parameters},
+    {.place = CLOSING,
+     .create = createDiagnosticClasses,
+     .clear = clear_diagnostic_classes,
+     .before = {VLN_DBG, "Create the Diagnostic classes"},
+     .thrown = {VLN_DBG, "Dignostic Test creation failed"}},
 };
 
 } // namespace

@@ -1,8 +1,9 @@
-// What the methods of all services share: the frame that an exception does not leave, and the ports
-// that a client may mean.
+// What the methods and the modifications of all services share: the frames that an exception does
+// not leave, and the ports that a client may mean.
 #ifndef VLN_SERVICES_METHOD_CALL_H
 #define VLN_SERVICES_METHOD_CALL_H
 
+#include "agent/gates.h"
 #include "agent/provider_agent.h"
 #include "agent/store_search.h"
 #include "cimple/guard.h"
@@ -31,6 +32,26 @@ sint32 answer_method(Property<uint32>& return_value, Body body) {
         VLN_LOG(VLN_ERR, "A method ended for want of memory");
     return_value.set(value);
     return INVOKE_METHOD_OK;
+}
+
+// Runs modify(agent) behind the prologue, which answers the status of modify_instance.
+template <class Modify>
+sint32 answer_modify(Modify modify) {
+    ProviderAgent* agent = ProviderAgent::current();
+    if (!agent)
+        return MODIFY_INSTANCE_FAILED;
+    sint32 status = MODIFY_INSTANCE_FAILED;
+    const bool complete = run_guarded([&] {
+        const Operation_Prologue prologue(*agent);
+        status = modify(*agent);
+    });
+    return complete ? status : MODIFY_INSTANCE_FAILED;
+}
+
+// The status of a modify_instance that ends with a line of the log.
+inline sint32 refuse_modify(sint32 status, const char* line) {
+    VLN_LOG(VLN_ERR, "%s", line);
+    return status;
 }
 
 // The port of a store that has the identifier, or null.

@@ -4,6 +4,8 @@
 #define VLN_SERVICES_PROVIDERS_H
 
 #include "services/configuration/provider.h"
+#include "services/diagnostics/log_provider.h"
+#include "services/diagnostics/settings_provider.h"
 #include "services/dump/provider.h"
 #include "services/dump/settings_provider.h"
 #include "services/firmware/provider.h"

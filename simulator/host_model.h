@@ -91,6 +91,40 @@ struct Dumps {
     Trace_Settings factory;
 };
 
+// How the diagnostic tests of a function go. Times are in milliseconds; 0 and 1 are no and yes.
+struct Diagnostics {
+    std::uint32_t pending_time = 500;
+    std::uint32_t cycle_time = 50;
+    std::uint32_t endless = 0;
+    std::uint32_t busy = 0; // with somebody else's test
+    std::uint32_t plug = 0; // for the external loopback
+    std::uint32_t result = 0;
+    std::uint32_t fails_at = 0; // the cycle that shows the errors; 0: the last
+    std::uint32_t error_cycles = 0;
+    std::uint32_t transmit_errors = 0;
+    std::uint32_t receive_errors = 0;
+    AX_STATUS running_status = AX_STATUS_DIAG_IN_PROGRESS;
+    std::uint32_t end_state = AX_DIAG_COMPLETE;
+    AX_STATUS cancel_status = AX_STATUS_OK;
+    std::uint32_t cancel_time = 500;
+    std::array<std::uint32_t, 4> pair_state{}; // of the cable, as AX_CableResults
+    std::array<std::uint32_t, 4> pair_length{};
+};
+
+// A diagnostic test under way, or one that has ended and may be asked for.
+struct Test {
+    enum class Kind : std::uint8_t { cycles, cable };
+    Kind kind = Kind::cycles;
+    std::uint32_t cycles = 0;
+    bool halts = false; // with the first error
+    std::uint64_t wwpn = 0;
+    std::uint32_t card = 0;
+    std::uint16_t sub_adapter = 0;
+    Diagnostics model{};
+    std::uint64_t start = 0; // microseconds
+    std::optional<std::uint64_t> cancelled{};
+};
+
 // A feature's answer: a value, or a status alone.
 struct Feature {
     std::uint32_t value = 0;
@@ -153,6 +187,7 @@ struct Function {
     Effect port_effect = Effect::once;
     std::uint32_t resets = 0;
     std::optional<Dumps> dumps;
+    std::optional<Diagnostics> diagnostics;
 
     std::optional<std::string> hba_name; // the adapter's name in the HBA API, which then knows it
     std::uint32_t hba_ports = 1;

@@ -66,6 +66,11 @@ void set_driver_parameter(std::optional<Driver_Parameters>& parameters, const st
 
 Dumps read_dumps(const Node& values);
 
+Diagnostics read_diagnostics(const Node& values);
+// One of its numbers; a name that none has is an error at value.
+void set_diagnostic(Diagnostics& diagnostics, const std::string& name, const Node& value);
+std::vector<std::pair<std::string_view, std::uint32_t>> list_diagnostics(Diagnostics diagnostics);
+
 // The targets that an iSCSI function sees; its initiator and network records have been read.
 std::vector<iSCSI_Target> read_iscsi_targets(const Node& values, const Function& function);
 

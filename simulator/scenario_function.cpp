@@ -165,6 +165,8 @@ void read_records(const Node& values, Function& function) {
         function.global_driver_parameters = read_driver_parameters(*node);
     if (const auto node = values.member("dumps"))
         function.dumps = read_dumps(*node);
+    if (const auto node = values.member("diagnostics"))
+        function.diagnostics = read_diagnostics(*node);
     if (const auto node = values.member("pci")) {
         function.pci = read_pci(*node);
         if (!node->member("functionNumber"))
@@ -270,6 +272,7 @@ std::span<const std::string_view> function_keys() {
                                                 "driverParameters",
                                                 "globalDriverParameters",
                                                 "dumps",
+                                                "diagnostics",
                                                 "dead",
                                                 "adapterAttributes",
                                                 "portAttributes",

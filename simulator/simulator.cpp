@@ -43,6 +43,7 @@ void Simulator::replace_host(Host fresh, std::string text, std::string name) {
     initialised = false;
     hba_loaded = false;
     handles.clear();
+    tests.clear();
     forget_faults();
     faults = host.faults;
     violations.clear();

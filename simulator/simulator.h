@@ -33,6 +33,8 @@ struct Simulator {
     bool hba_loaded = false;                      // HBA_LoadLibrary
     std::map<std::uint32_t, std::string> handles; // open HBA API handles: the adapter's name
     std::uint32_t next_handle = 1;
+    std::map<std::uint32_t, Test> tests; // by their handles
+    std::uint32_t next_test = 1;
 
     std::array<unsigned long, entry_count> calls{};
     std::map<std::string, unsigned long> lookups;

@@ -266,6 +266,20 @@ void set_trace_setting(Function& function, const std::string& name, const Node& 
     value.fail("the firmware has no such module");
 }
 
+Json list_diagnostic_values(const Function& function) {
+    Json values = Json::object();
+    if (function.diagnostics)
+        for (const auto& [name, value] : list_diagnostics(*function.diagnostics))
+            values[std::string(name)] = value;
+    return values;
+}
+
+void set_diagnostic_value(Function& function, const std::string& name, const Node& value) {
+    if (!function.diagnostics)
+        value.fail("the function has no diagnostics");
+    set_diagnostic(*function.diagnostics, name, value);
+}
+
 // All that calls can change. A topic that lets callers set something adds its row here.
 constexpr Piece PIECES[] = {
     table<list_attributes<&Function::adapter_attributes, adapter_attribute_identifiers>,
@@ -284,6 +298,7 @@ constexpr Piece PIECES[] = {
     of_dumps<&Dumps::retention>("dumpRetention"),
     of_dumps<&Dumps::stored>("storedDumps"),
     table<list_trace_settings, set_trace_setting>("traceSettings"),
+    table<list_diagnostic_values, set_diagnostic_value>("diagnostics"),
     whole<&Function::beacon>("beacon"),
     whole<&Function::resets>("resets"),
     whole<&Function::initiator>("initiator"),

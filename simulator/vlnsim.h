@@ -53,7 +53,7 @@ VLNSIM_API void vlnsim_reset(void);
  * 16 hexadecimal digits; table is "adapterAttributes", "portAttributes", "statistics" or
  * "features"; name as in a scenario, by name or number; value is a JSON text, null to make the
  * value missing. The table may also be "driverParameters" or "globalDriverParameters", for the
- * current value of the parameter of that name. Returns 0, or 1 with a text in error. */
+ * current value of the parameter of that name, or "diagnostics". Returns 0, or 1 with a text in error. */
 VLNSIM_API int vlnsim_set_value(const char* wwn, const char* table, const char* name,
                                 const char* value, char* error, size_t size);
 

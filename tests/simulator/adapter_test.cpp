@@ -110,6 +110,46 @@ TEST_F(Simulated, WhatIsSetIsReadBack) {
     EXPECT_EQ("1Gb", attribute_text(port, AX_PA_CONFIGURED_PORT_SPEED));
 }
 
+// One at a time on an adapter, on the simulator's clock, and with arguments that a test can have.
+TEST_F(Simulated, DiagnosticTestsTakeTheirTimeAndRefuseWhatIsWrong) {
+    start_text(R"({"cards": [{"type": "nic", "wwpn": "100002450000000{port}", "ports": 2,
+                              "functions": [{}], "diagnostics": {"pendingTime": 1000}}]})");
+    vlnsim_use_virtual_clock(0);
+    std::uint32_t handle = 0, second = 0;
+    const auto loopback = [&](std::uint32_t* out, std::uint32_t type = 2, std::uint32_t cycles = 20,
+                              std::uint32_t halt = 0, std::uint32_t reserved = 0,
+                              const char* pattern = nullptr) {
+        return LOCAL(AX_DiagLoopBackTestV3)(wwn_of(out == &second), type, cycles, halt, out,
+                                            reserved, pattern);
+    };
+    EXPECT_EQ(4u, loopback(nullptr));
+    EXPECT_EQ(4u, loopback(&handle, 1));
+    EXPECT_EQ(4u, loopback(&handle, 2, 4001));
+    EXPECT_EQ(4u, loopback(&handle, 2, 20, 2));
+    EXPECT_EQ(4u, loopback(&handle, 2, 20, 0, 1));
+    EXPECT_EQ(4u, loopback(&handle, 2, 20, 0, 0, "123456789"));
+    EXPECT_EQ(4u, loopback(&handle, 2, 20, 0, 0, "0x12"));
+    AX_DiagResults results{};
+    EXPECT_EQ(4u, LOCAL(AX_DiagGetResults)(wwn_of(0), 99, &results));
+    EXPECT_EQ(4u, LOCAL(AX_DiagCancelDiagnostic)(wwn_of(0), 0));
+    EXPECT_EQ(9u, vlnsim_violations());
+
+    ASSERT_EQ(0u, loopback(&handle));
+    ASSERT_EQ(0u, loopback(&second));
+    EXPECT_EQ(4u, LOCAL(AX_DiagGetResults)(wwn_of(1), handle, &results)) << "of another port";
+    const struct {
+        std::uint32_t handle, status, state, cycles, result;
+    } looks[] = {{handle, 0, 2, 0, 0}, {handle, 60, 1, 10, 0}, {handle, 0, 6, 20, 0}};
+    for (const auto& look : looks) {
+        EXPECT_EQ(look.status, LOCAL(AX_DiagGetResults)(wwn_of(0), handle, &results));
+        EXPECT_EQ(look.state, results.state);
+        EXPECT_EQ(look.cycles, results.cyclesComplete);
+        vlnsim_advance(look.status ? 500000 : 1500000);
+    }
+    EXPECT_EQ(0u, LOCAL(AX_DiagGetResults)(wwn_of(1), second, &results));
+    EXPECT_EQ(13u, results.resultCode) << "another test ran";
+}
+
 std::string file_text(const char* path) {
     std::ostringstream text;
     text << std::ifstream(path).rdbuf();

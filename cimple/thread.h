@@ -145,6 +145,9 @@ class Time {
 public:
     static uint64 now();            // microseconds since the epoch, 0 if the clock fails
     static void sleep(uint64 usec); // a signal ends it early
+    // The same, and ended early as a pause is. A clock that a test moves is moved by it, as by
+    // every sleep.
+    static void sleep(uint64 usec, const bool& stop);
     // A sleep of a thread that another one may want to join: it ends early once `stop` is raised
     // and wake called, in this order. A flag that is up already ends it at once.
     static void pause(uint64 usec, const bool& stop);

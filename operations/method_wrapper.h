@@ -144,6 +144,23 @@ public:
                                                      uint32 modes);
     static AX_STATUS vlncimRestoreDefaultSettings(const HBA_WWN* name);
 
+    // ---- Diagnostic tests (diagnostics.cpp) ----
+    //
+    // A test runs in the background of the library, under the handle that its start gives.
+
+    static AX_STATUS StartLoopBackTest(const HBA_WWN* name, uint32 type, uint32 cycles,
+                                       bool haltOnError, const char* pattern, uint32* handle);
+    static AX_STATUS StartEchoTest(const HBA_WWN* name, const HBA_WWN* target, uint32 cycles,
+                                   bool haltOnError, const char* pattern, uint32* handle);
+    // cable: where the library may write to, kept by the caller to the end of the test.
+    static AX_STATUS StartCableTest(const HBA_WWN* name, AX_CableResults* cable, uint32* handle);
+    // AX_STATUS_DIAG_IN_PROGRESS, with results, for a test that runs. Asked once a second, and so
+    // without lines of its own.
+    static AX_STATUS GetTestResults(const HBA_WWN* name, uint32 handle, AX_DiagResults* results);
+    static AX_STATUS CancelDiagnostic(const HBA_WWN* name, uint32 handle);
+    // AX_BEACON_OFF or AX_BEACON_ON.
+    static AX_STATUS SetBeacon(const HBA_WWN* name, uint32 state);
+
     // Logs a status of the library with its text for it, if it has one, at level 5.
     static void logStatus(AX_STATUS status);
 };

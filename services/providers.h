@@ -6,6 +6,7 @@
 #include "services/configuration/provider.h"
 #include "services/diagnostics/log_provider.h"
 #include "services/diagnostics/settings_provider.h"
+#include "services/diagnostics/test_provider.h"
 #include "services/dump/provider.h"
 #include "services/dump/settings_provider.h"
 #include "services/firmware/provider.h"

@@ -197,7 +197,7 @@ struct Scenario {
 constexpr Scenario SCENARIOS[] = {
     {"TwoPorts", "two-port-cna.json"}, {"Blade", "blade-16-functions.json"},
     {"FCoE", "fcoe-pair.json"},        {"ISCSI", "iscsi-sessions.json"},
-    {"SmallSAN", SMALL_SAN},
+    {"SmallSAN", SMALL_SAN},           {"Diagnostics", "diagnostics.json"},
 };
 
 class Oracle : public testing::TestWithParam<Scenario> {};

@@ -1,12 +1,8 @@
 #include "services/diagnostics/log_provider.h"
 
-#include "classes/CIM_DiagnosticRecord.h"
-#include "classes/CIM_LogManagesRecord.h"
-#include "classes/CIM_RecordAppliesToElement.h"
 #include "services/diagnostics/catalogue.h"
+#include "services/diagnostics/records.h"
 #include "services/method_call.h"
-
-#include <initializer_list>
 
 namespace cimple {
 
@@ -18,34 +14,13 @@ constexpr uint16 HELP_AS_TEXT = 1; // Format and RequestedDelivery
 
 // ---- Logs ----
 
-// The record that the member of a store is, or that it joins with something.
-const CIM_DiagnosticRecord* record_of(const Instance* member) {
-    if (const auto* managed = cast<CIM_LogManagesRecord>(member))
-        return cast<CIM_DiagnosticRecord>(managed->Record);
-    if (const auto* applied = cast<CIM_RecordAppliesToElement>(member))
-        return cast<CIM_DiagnosticRecord>(applied->Antecedent);
-    return cast<CIM_DiagnosticRecord>(member);
-}
-
-void clear_records_of(ProviderAgent& agent, const String& test) {
-    for (Instance_Map_Base* store : std::initializer_list<Instance_Map_Base*>{
-             &agent.m_VLNMPCA_LogManagesRecord_map, &agent.m_VLNMPCA_RecordAppliesToElement_map,
-             &agent.m_VLNMPCA_DiagnosticCompletionRecord_map,
-             &agent.m_VLNMPCA_DiagnosticServiceRecord_map})
-        for (uint32 i = store->size(); i-- > 0;) {
-            const auto* record = record_of(store->at(i));
-            if (record && record->ServiceName.value == test)
-                store->remove(i);
-        }
-}
-
 uint32 clear_log(ProviderAgent& agent, const VLNMPCA_DiagnosticsLog* self) {
     const auto* log = agent.m_VLNMPCA_DiagnosticsLog_map.lookup(self);
     if (!log)
         return METHOD_UNKNOWN_INSTANCE;
     VLN_LOG(VLN_DBG, "vlncimNIC CDM Clear log");
     if (find_diagnostic_test(log->InstanceID.value))
-        clear_records_of(agent, log->InstanceID.value);
+        delete_records(agent, log->InstanceID.value);
     return METHOD_DONE;
 }
 

@@ -213,6 +213,47 @@ TEST_P(Oracle, TheModelTellsOneStory) {
     }
 }
 
+// ---- After runs of diagnostic tests ----
+
+// Of the diagnostics model, also what only a run makes.
+constexpr const char* DIAGNOSTIC_ASSOCIATIONS[] = {
+    "VLNMPCA_AffectedJobElement",
+    "VLNMPCA_AvailableDiagnosticService",
+    "VLNMPCA_DiagElementCapabilities",
+    "VLNMPCA_DiagElementSoftwareIdentity",
+    "VLNMPCA_DiagHostedService",
+    "VLNMPCA_ElementSettingData",
+    "VLNMPCA_HostedService",
+    "VLNMPCA_LogManagesRecord",
+    "VLNMPCA_OwningJobElement",
+    "VLNMPCA_RecordAppliesToElement",
+    "VLNMPCA_ServiceAffectsElement",
+    "VLNMPCA_ServiceAvailableToElement",
+    "VLNMPCA_ServiceConformsToProfile",
+    "VLNMPCA_UseOfLog",
+};
+
+void run_every_test(Road& road) {
+    for (const host::Instance& link : road.enumerate("VLNMPCA_AvailableDiagnosticService")) {
+        const host::ObjectPath* test = link.property("ServiceProvided")->as_reference();
+        const auto reply = road.manager().invoke(
+            *test, "RunDiagnosticService", {{"ManagedElement", *link.property("UserOfService")}});
+        EXPECT_TRUE(reply.ok()) << text(*test);
+    }
+}
+
+TEST(Oracle_After, DiagnosticRunsTheModelTellsOneStory) {
+    Road road({.scenario = "diagnostics.json"});
+    run_every_test(road);
+    const Model model(road);
+    check_instances(road, model);
+    const auto census = road.census();
+    for (const char* association : DIAGNOSTIC_ASSOCIATIONS)
+        EXPECT_TRUE(census.contains(association)) << association;
+    for (const host::ObjectPath& source : model.everything())
+        check_source(road, model, source);
+}
+
 // Elements that conform to a profile, by any association of that kind.
 std::set<std::string> conforming_to(Road& road, const host::ObjectPath& profile) {
     std::set<std::string> elements;

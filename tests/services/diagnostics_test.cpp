@@ -1,6 +1,8 @@
 // The catalogue of diagnostic tests as a client sees it: settings, help and logs.
 #include "tests/road/properties.h"
 
+#include <sstream>
+
 using host::Named_Values;
 using host::Value;
 using road::expect_properties;
@@ -18,26 +20,52 @@ constexpr const char* DMA_LOOPBACK = "VLNMPCA: NIC DMA LoopBackTest";
 constexpr const char* ECHO = "VLNMPCA: FCOE EchoTest";
 constexpr const char* CABLE = "VLNMPCA: PHY TDRTest";
 
-// One NIC and one FCoE function; the NIC's port has a copper PHY with cable diagnostics.
-const std::string COPPER = R"({"include": ")" VLN_SCENARIOS R"(/parts/cna.json", "cards":
-    [{"use": "cna", "functions": [{"use": "nic", "features": {"CableDiagnostics": 1}},
-                                  {"use": "fcoe"}]}]})";
-
-Value loops(std::initializer_list<const char*> values) {
-    Value::Array elements;
-    for (const char* value : values)
-        elements.push_back(Value::text(value));
-    return Value::array(CMPI_string, std::move(elements));
-}
-
-Value number(std::uint32_t value) {
-    return Value::unsigned_number(CMPI_uint32, value);
+// "NAME=VALUE NAME=VALUE": true or false, a number, the elements of LoopControlParameter, or a
+// text.
+Named_Values values_of(const std::string& text) {
+    Named_Values values;
+    std::istringstream words(text);
+    for (std::string word; words >> word;) {
+        const std::string name = word.substr(0, word.find('='));
+        const std::string value = word.substr(name.size() + 1);
+        if (name == "HaltOnError") {
+            values.push_back({name, Value::boolean(value == "true")});
+        } else if (name == "LoopControlParameter") {
+            Value::Array elements;
+            std::istringstream list(value);
+            for (std::string element; std::getline(list, element, ',');)
+                elements.push_back(Value::text(element));
+            values.push_back({name, Value::array(CMPI_string, std::move(elements))});
+        } else if (name == "LoopPattern" || name == "TargetDevice") {
+            values.push_back({name, Value::text(value)});
+        } else {
+            values.push_back({name, Value::unsigned_number(CMPI_uint32, std::stoul(value))});
+        }
+    }
+    return values;
 }
 
 class Diagnostics : public testing::Test {
 protected:
     host::Instance setting(const char* test) {
         return find(road, "VLNMPCA_DiagnosticSettingData", "InstanceID", test);
+    }
+    // With the values set in the instance as well.
+    host::Status modify(host::Instance& instance, const char* values) {
+        std::vector<std::string> names;
+        for (const host::Named_Value& each : values_of(values)) {
+            host::set(instance.properties, each.name, each.value);
+            names.push_back(each.name);
+        }
+        return road.manager().modify(instance, names);
+    }
+    // On the first Ethernet port.
+    void run(const char* test) {
+        const Value port = Value::reference(road.enumerate("VLNMPCA_EthernetPort").at(0).path);
+        const auto reply =
+            road.manager().invoke(find(road, "VLNMPCA_DiagnosticTest", "Name", test).path,
+                                  "RunDiagnosticService", {{"ManagedElement", port}});
+        EXPECT_TRUE(reply.ok() && reply.value.value.as_unsigned() == 0) << test;
     }
     // What the call logs.
     template <class Call>
@@ -47,18 +75,18 @@ protected:
         return road.log_text().substr(before);
     }
 
-    Road road{{.scenario = COPPER, .log = true}};
+    Road road{{.scenario = "diagnostics.json", .log = true}};
 };
 
 // ---- The catalogue ----
 
-// The names of the port classes that the test can be run on.
+// The classes of the ports that the test can be run on, the two of each once.
 std::string ports_of(Road& road, const host::Instance& test) {
     std::string names;
-    for (const auto& port : walk(road, test, "VLNMPCA_AvailableDiagnosticService"))
-        names += " " + port.path.class_name.substr(8);
-    EXPECT_EQ(walk(road, test, "VLNMPCA_AvailableDiagnosticService"),
-              walk(road, test, "VLNMPCA_ServiceAffectsElement"));
+    const auto ports = walk(road, test, "VLNMPCA_AvailableDiagnosticService");
+    for (std::size_t i = 0; i < ports.size(); i += 2)
+        names += " " + ports[i].path.class_name.substr(8);
+    EXPECT_EQ(ports, walk(road, test, "VLNMPCA_ServiceAffectsElement"));
     return names;
 }
 
@@ -106,8 +134,8 @@ TEST_F(Diagnostics, EachTestTellsItsPortsAndItsSettings) {
         EXPECT_EQ(values, row.values);
     }
     EXPECT_EQ(text_of(road.enumerate("VLNMPCA_DiagnosticIdentity").at(0), "VersionString"),
-              "1.2.1");
-    EXPECT_EQ(road.count_in_log("Number of EthernetPort 1 FCoE port 1"), 1u);
+              "1.4.1");
+    EXPECT_EQ(road.count_in_log("Number of EthernetPort 2 FCoE port 2"), 1u);
     EXPECT_EQ(road.count_in_log("Total no of Diagnostic tests available: 7"), 1u);
 }
 
@@ -128,90 +156,63 @@ TEST_F(Diagnostics, ATestIsOfferedWhereItCanBeRun) {
 
 struct Change {
     const char* test;
-    Named_Values values;
+    const char* values;
     const char* line = nullptr; // of the refusal
 };
 
 constexpr const char* LONG_LOOPS = "Error: loopControlParameter exceeds 4 characters";
 constexpr const char* BAD_LOOPS = "Error: Invalid LoopControlData, Valid range 1-4000. ";
+constexpr const char* LONG_PATTERN = "Error: loop pattern exceeds 8 characters";
 constexpr const char* BAD_PATTERN = "Error: Invalid 'Pattern' used. Use hexadecimal characters. ";
 constexpr const char* BAD_BEACON = "Invalid BeaconSetState, Valid values are 2 or 3";
 constexpr const char* NOTHING = "Error: Invalid Input Parameter";
 
+// With what is right beside what is wrong: nothing is written then.
+constexpr Change CHANGES[] = {
+    {MAC_LOOPBACK, "LoopControlParameter=4000"},
+    {MAC_LOOPBACK, "LoopControlParameter=4001", BAD_LOOPS},
+    {MAC_LOOPBACK, "LoopControlParameter=0", BAD_LOOPS},
+    {MAC_LOOPBACK, "LoopControlParameter=12345", LONG_LOOPS},
+    {MAC_LOOPBACK, "LoopControlParameter=1x", BAD_LOOPS},
+    {MAC_LOOPBACK, "LoopControlParameter=,", BAD_LOOPS},
+    {MAC_LOOPBACK, "LoopControlParameter=1,2", BAD_LOOPS},
+    {PHY_LOOPBACK, "LoopControlParameter="}, // no element
+    {MAC_LOOPBACK, "LoopPattern=abcDEF09"},
+    {MAC_LOOPBACK, "LoopPattern=123456789", LONG_PATTERN},
+    {MAC_LOOPBACK, "LoopPattern=0x1a", BAD_PATTERN},
+    {EXTERNAL_LOOPBACK, "LoopPattern="},
+    {DMA_LOOPBACK, "HaltOnError=false LoopPattern=ab LoopControlParameter=4001", BAD_LOOPS},
+    {MAC_LOOPBACK, "BeaconSetState=2", NOTHING},
+    {MAC_LOOPBACK, "HaltOnError=false"},
+    {BEACON, "BeaconSetState=2"},
+    {BEACON, "BeaconSetState=1 HaltOnError=false", BAD_BEACON},
+    {BEACON, "BeaconSetState=4", BAD_BEACON},
+    {BEACON, "LoopPattern=ab", NOTHING},
+    {CABLE, "HaltOnError=false"},
+    {CABLE, "LoopPattern=ab RetentionCount=3", NOTHING},
+    {ECHO, "TargetDevice=502564C03B200001 LoopPattern=c0ffee LoopControlParameter=25"},
+    {ECHO, "TargetDevice=502564C03B2000012", "Error: TargetDevice exceeds 16 characters"},
+    {ECHO, "LoopPattern=123456789", "Error: Buffer pattern exceeds 8 characters"},
+    {ECHO, "LoopPattern=tea", BAD_PATTERN},
+    {ECHO, "LoopControlParameter=5000 HaltOnError=false", BAD_LOOPS},
+    {ECHO, "MaxLoopsSupported=9", NOTHING},
+};
+
 TEST_F(Diagnostics, SettingsChangeAllTogetherOrNotAtAll) {
-    const Value off = Value::boolean(false);
-    const Value good = Value::text("abcDEF09");
-    const Change changes[] = {
-        {MAC_LOOPBACK, {{"LoopControlParameter", loops({"4000"})}}},
-        {MAC_LOOPBACK, {{"LoopControlParameter", loops({"4001"})}}, BAD_LOOPS},
-        {MAC_LOOPBACK, {{"LoopControlParameter", loops({"0"})}}, BAD_LOOPS},
-        {MAC_LOOPBACK, {{"LoopControlParameter", loops({"12345"})}}, LONG_LOOPS},
-        {MAC_LOOPBACK, {{"LoopControlParameter", loops({"1x"})}}, BAD_LOOPS},
-        {MAC_LOOPBACK, {{"LoopControlParameter", loops({""})}}, BAD_LOOPS},
-        {MAC_LOOPBACK, {{"LoopControlParameter", loops({"1", "2"})}}, BAD_LOOPS},
-        {PHY_LOOPBACK, {{"LoopControlParameter", loops({})}}},
-        {MAC_LOOPBACK, {{"LoopPattern", good}}},
-        {MAC_LOOPBACK,
-         {{"LoopPattern", Value::text("123456789")}},
-         "Error: loop pattern exceeds 8 characters"},
-        {MAC_LOOPBACK, {{"LoopPattern", Value::text("0x1a")}}, BAD_PATTERN},
-        {EXTERNAL_LOOPBACK, {{"LoopPattern", Value::text("")}}},
-        // What is right beside what is wrong is not written.
-        {DMA_LOOPBACK,
-         {{"HaltOnError", off}, {"LoopPattern", good}, {"LoopControlParameter", loops({"4001"})}},
-         BAD_LOOPS},
-        {MAC_LOOPBACK, {{"BeaconSetState", number(2)}}, NOTHING},
-        {MAC_LOOPBACK, {{"HaltOnError", off}, {"TargetDevice", Value::text("ignored")}}},
-        {BEACON, {{"BeaconSetState", number(2)}}},
-        {BEACON, {{"BeaconSetState", number(1)}, {"HaltOnError", off}}, BAD_BEACON},
-        {BEACON, {{"BeaconSetState", number(4)}}, BAD_BEACON},
-        {BEACON, {{"LoopPattern", good}}, NOTHING},
-        {CABLE, {{"HaltOnError", off}}},
-        {CABLE, {{"LoopPattern", good}, {"RetentionCount", number(3)}}, NOTHING},
-        {ECHO,
-         {{"TargetDevice", Value::text("502564C03B200001")},
-          {"LoopPattern", Value::text("c0ffee")},
-          {"LoopControlParameter", loops({"25"})}}},
-        {ECHO,
-         {{"TargetDevice", Value::text("502564C03B2000012")}},
-         "Error: TargetDevice exceeds 16 characters"},
-        {ECHO,
-         {{"LoopPattern", Value::text("123456789")}},
-         "Error: Buffer pattern exceeds 8 characters"},
-        {ECHO, {{"LoopPattern", Value::text("tea")}}, BAD_PATTERN},
-        {ECHO, {{"LoopControlParameter", loops({"5000"})}}, BAD_LOOPS},
-        {ECHO, {{"MaxLoopsSupported", number(9)}}, NOTHING},
-    };
-    for (const Change& change : changes) {
+    for (const Change& change : CHANGES) {
+        SCOPED_TRACE(change.test + std::string(" ") + change.values);
         const host::Instance before = setting(change.test);
         host::Instance changed = before;
-        std::vector<std::string> names;
-        std::string trace = change.test;
-        for (const host::Named_Value& each : change.values) {
-            host::set(changed.properties, each.name, each.value);
-            names.push_back(each.name);
-            trace += " " + each.name + "=" + text_of(changed, each.name);
-        }
-        SCOPED_TRACE(trace);
         host::Status status;
-        const std::string log = logged([&] { status = road.manager().modify(changed, names); });
+        const std::string log = logged([&] { status = modify(changed, change.values); });
         EXPECT_EQ(status.rc, change.line ? CMPI_RC_ERR_FAILED : CMPI_RC_OK);
-        if (change.line) {
-            EXPECT_NE(log.find(change.line), std::string::npos) << log;
-            EXPECT_EQ(setting(change.test), before);
-        } else {
-            host::set(changed.properties, "TargetDevice",
-                      *(change.test == ECHO ? changed : before).property("TargetDevice"));
-            EXPECT_EQ(setting(change.test), changed);
-        }
+        EXPECT_EQ(setting(change.test), change.line ? before : changed);
+        EXPECT_NE(log.find(change.line ? change.line : ""), std::string::npos) << log;
     }
-}
-
-TEST_F(Diagnostics, AnUnknownSettingIsNotFound) {
     host::Instance unknown = setting(BEACON);
     host::set(unknown.path.keys, "InstanceID", Value::text("DumpDiagnostic"));
     host::set(unknown.properties, "InstanceID", Value::text("DumpDiagnostic"));
-    EXPECT_EQ(road.manager().modify(unknown).rc, CMPI_RC_ERR_NOT_FOUND);
+    EXPECT_EQ(modify(unknown, "HaltOnError=true").rc, CMPI_RC_ERR_NOT_FOUND);
     EXPECT_EQ(road.count_in_log("Invalid instance of DiagnosticSetting Data"), 1u);
 }
 
@@ -263,6 +264,49 @@ TEST_F(Diagnostics, HelpIsGivenAsText) {
         }
         EXPECT_NE(told.find(row.told), std::string::npos) << told;
     }
+}
+
+TEST_F(Diagnostics, AClearedLogLosesTheRecordsOfItsTestAlone) {
+    for (const char* test : {BEACON, MAC_LOOPBACK, BEACON})
+        run(test);
+    const auto clear = [&](const char* test) {
+        auto path = road.enumerate("VLNMPCA_DiagnosticsLog").at(0).path;
+        host::set(path.keys, "InstanceID", Value::text(test));
+        return road.manager().invoke(path, "ClearLog", {}).value.value.as_unsigned();
+    };
+    const auto left = [&] {
+        std::string counts;
+        for (const char* name :
+             {"VLNMPCA_LogManagesRecord", "VLNMPCA_RecordAppliesToElement",
+              "VLNMPCA_DiagnosticServiceRecord", "VLNMPCA_DiagnosticCompletionRecord"})
+            counts += std::to_string(road.enumerate(name).size());
+        return counts + " " + std::to_string(road.enumerate("VLNMPCA_ConcreteJob").size());
+    };
+    EXPECT_EQ(clear("none"), 33068u);
+    EXPECT_EQ(clear(CABLE), 0u);
+    EXPECT_EQ(left(), "3333 3");
+    EXPECT_EQ(clear(BEACON), 0u);
+    EXPECT_EQ(left(), "1111 3");
+    EXPECT_EQ(text_of(road.enumerate("VLNMPCA_DiagnosticServiceRecord").at(0), "ServiceName"),
+              MAC_LOOPBACK);
+    EXPECT_EQ(road.count_in_log("vlncimNIC CDM Clear log"), 2u);
+}
+
+// What a console has changed, and what runs have left, goes with the next look at the hardware.
+TEST_F(Diagnostics, ARefreshBeginsAnew) {
+    host::Instance changed = setting(MAC_LOOPBACK);
+    EXPECT_TRUE(modify(changed, "LoopPattern=0").ok());
+    run(BEACON);
+    EXPECT_EQ(road.enumerate("VLNMPCA_ConcreteJob").size(), 1u);
+    road.wait_for_refreshes(1);
+    vlnsim_advance(11ull * 60 * 1000000);
+    road.enumerate("VLNMPCA_Card"); // asks for the refresh
+    road.wait_for_refreshes(2);
+    EXPECT_EQ(text_of(setting(MAC_LOOPBACK), "LoopPattern"), "1a2b3c4d");
+    for (const char* name : {"VLNMPCA_ConcreteJob", "VLNMPCA_OwningJobElement",
+                             "VLNMPCA_DiagnosticServiceRecord", "VLNMPCA_RecordAppliesToElement"})
+        EXPECT_TRUE(road.enumerate(name).empty()) << name;
+    EXPECT_EQ(road.count_in_log("Clearing the ConcreteJob objects related to CDM"), 2u);
 }
 
 } // namespace

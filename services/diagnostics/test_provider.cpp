@@ -89,7 +89,9 @@ uint32 run_test(const Test_Run& run, CIM_ConcreteJob*& job) {
         if (const uint32 refused = check_cable(run))
             return refused;
     Run_Result result = runner.run(run);
-    job = shared_job(result.job);
+    // What is made of it for the client takes the broker, which goes with the class.
+    if (!load_flag(run.stop))
+        job = shared_job(result.job);
     return result.status == AX_STATUS_OK
                ? METHOD_DONE
                : refuse(METHOD_LIBRARY_STATUS + result.status, runner.failure);

@@ -44,6 +44,7 @@ void Simulator::replace_host(Host fresh, std::string text, std::string name) {
     hba_loaded = false;
     handles.clear();
     tests.clear();
+    next_test = 1;
     forget_faults();
     faults = host.faults;
     violations.clear();

@@ -43,6 +43,7 @@ int Log_Capture::count(sint32 level, const std::string& text) const {
 
 std::atomic<bool> Fake_Library::present{true};
 std::atomic<int> Fake_Library::scans{0};
+uint32 Fake_Library::kept_dumps = 0;
 
 namespace {
 
@@ -53,6 +54,11 @@ AX_STATUS init_library() {
 AX_STATUS list_instances(uint32_t* count, uint32_t*) {
     ++Fake_Library::scans;
     *count = 0;
+    return AX_STATUS_OK;
+}
+
+AX_STATUS keep_dumps(AX_WWN, uint32_t count) {
+    Fake_Library::kept_dumps = count;
     return AX_STATUS_OK;
 }
 
@@ -70,6 +76,8 @@ void* find_symbol(void* handle, const char* name) {
         return reinterpret_cast<void*>(&init_library);
     if (std::strcmp(name, "AX_GetAllLocalHBAInstances") == 0)
         return reinterpret_cast<void*>(&list_instances);
+    if (std::strcmp(name, "LAX_SetDumpRetentionCount") == 0)
+        return reinterpret_cast<void*>(&keep_dumps);
     return nullptr;
 }
 

@@ -43,6 +43,7 @@ private:
 struct Fake_Library {
     static std::atomic<bool> present;
     static std::atomic<int> scans; // AX_GetAllLocalHBAInstances asked
+    static uint32 kept_dumps;      // what AX_SetDumpRetentionCount was told last
 };
 
 class Agent_Test : public ::testing::Test {

@@ -25,6 +25,7 @@ host::Value image_of(std::size_t size) {
     elements.reserve(size + 1024);
     for (char c = 0; file.get(c);)
         elements.push_back(host::Value::unsigned_number(CMPI_uint8, static_cast<unsigned char>(c)));
+    std::remove(FILE_NAME);
     return host::Value::array(CMPI_uint8, std::move(elements));
 }
 

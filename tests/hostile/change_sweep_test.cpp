@@ -53,7 +53,6 @@ void sweep(Road& road, const Change& row) {
     std::string answer;
     const std::vector<std::string> functions = functions_called(change, answer);
     EXPECT_TRUE(answer == "CMPI_RC_OK" || answer == "CMPI_RC_OK 0") << answer;
-    EXPECT_FALSE(functions.empty());
     begin_again(road);
     std::map<std::string, unsigned> calls;
     for (const std::string& function : functions) {

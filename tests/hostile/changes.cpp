@@ -2,6 +2,7 @@
 
 #include "tools/mpcactl/assignment.h"
 
+#include <algorithm>
 #include <fstream>
 #include <sstream>
 
@@ -9,9 +10,13 @@ namespace hostile {
 
 namespace {
 
-host::Instance first_instance(road::Road& road, const std::string& class_name) {
-    std::vector<host::Instance> all = road.enumerate(class_name);
-    return all.empty() ? throw std::runtime_error("no " + class_name) : std::move(all.front());
+// The instance that CLASS or CLASS#NUMBER names.
+host::Instance find_instance(road::Road& road, const std::string& text) {
+    const std::size_t mark = std::min(text.find('#'), text.size());
+    const std::size_t number = mark < text.size() ? std::stoul(text.substr(mark + 1)) : 1;
+    std::vector<host::Instance> all = road.enumerate(text.substr(0, mark));
+    return number > all.size() ? throw std::runtime_error("no " + text)
+                               : std::move(all[number - 1]);
 }
 
 // With what stands for <CLASS> and for <>.
@@ -22,7 +27,7 @@ std::string filled_in(road::Road& road, const std::string& text) {
     const std::string name = text.substr(begin + 1, end - begin - 1);
     return text.substr(0, begin) +
            (name.empty() ? road.root().string()
-                         : host::path_to_text(first_instance(road, name).path, "")) +
+                         : host::path_to_text(find_instance(road, name).path, "")) +
            text.substr(end + 1);
 }
 
@@ -51,7 +56,7 @@ Prepared_Change::Prepared_Change(road::Road& road, const Change& change) : _road
               0)
         << error;
     const std::size_t dot = change.what.find('.');
-    _instance = first_instance(road, change.what.substr(0, dot));
+    _instance = find_instance(road, change.what.substr(0, dot));
     const host::ClassRepository& classes = road.manager().classes();
     const host::Class* known = classes.find(_instance.path.class_name);
     std::vector<std::string> values;

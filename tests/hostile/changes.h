@@ -10,7 +10,7 @@ namespace hostile {
 struct Change {
     std::string scenario; // a file of the scenarios
     // "CLASS.METHOD", called on the first instance of the class, or "CLASS", whose first instance
-    // is modified.
+    // is modified. "CLASS#2" stands for the second instance, here and below.
     std::string what;
     // As mpcactl takes them, where <CLASS> stands for the path of the first instance of a class,
     // and <> for the folder of the host's root, in which the image new.img lies.

@@ -37,6 +37,8 @@ uint32 Adapter_Map_Builder::run() {
         VLN_LOG(VLN_ERR, "iSCSI discovery failed");
         return END_PASS;
     }
+    if (const uint32 status = makeGroups(Group_Place::ALL_PORTS))
+        return status;
     updateSoftwareIdentities();
     if (const uint32 status = makeGroups(Group_Place::CLOSING))
         return status;

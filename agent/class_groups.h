@@ -31,6 +31,7 @@ enum class Group_Place : uint8 {
     ISCSI,       // before the first iSCSI port
     ISCSI_PORT,  // once for each iSCSI port
     ISCSI_PORTS, // after the last one
+    ALL_PORTS,   // after the last port of any kind
     CLOSING,     // at the end
 };
 

@@ -36,7 +36,7 @@ constexpr Class_Group GROUPS[] = {
     {.place = FCOE, .create = create_driver_parameter_service},
     {.place = FC_PORT, .create = create_driver_parameters},
     {.place = FC_PORTS, .create = join_driver_parameters},
-    {.place = CLOSING,
+    {.place = ALL_PORTS,
      .create = createDiagnosticClasses,
      .clear = clear_diagnostic_classes,
      .before = {VLN_DBG, "Create the Diagnostic classes"},

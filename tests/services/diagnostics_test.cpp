@@ -135,6 +135,8 @@ TEST_F(Diagnostics, EachTestTellsItsPortsAndItsSettings) {
     }
     EXPECT_EQ(text_of(road.enumerate("VLNMPCA_DiagnosticIdentity").at(0), "VersionString"),
               "1.4.1");
+    const std::string log = road.log_text();
+    EXPECT_LT(log.find("Create the Diagnostic classes"), log.find("Updating FRU information"));
     EXPECT_EQ(road.count_in_log("Number of EthernetPort 2 FCoE port 2"), 1u);
     EXPECT_EQ(road.count_in_log("Total no of Diagnostic tests available: 7"), 1u);
 }
@@ -199,6 +201,9 @@ constexpr Change CHANGES[] = {
 };
 
 TEST_F(Diagnostics, SettingsChangeAllTogetherOrNotAtAll) {
+    // A console may send all that it got.
+    for (const host::Instance& each : road.enumerate("VLNMPCA_DiagnosticSettingData"))
+        EXPECT_TRUE(road.manager().modify(each).ok()) << text_of(each, "InstanceID");
     for (const Change& change : CHANGES) {
         SCOPED_TRACE(change.test + std::string(" ") + change.values);
         const host::Instance before = setting(change.test);

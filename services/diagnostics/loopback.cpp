@@ -142,7 +142,9 @@ void judge(Test_Report& report) {
 }
 
 uint16 percent(uint32 done, uint32 asked) {
-    return asked == 0 ? 0 : static_cast<uint16>(uint64{std::min(done, asked)} * 100 / asked);
+    if (asked == 0)
+        return 0;
+    return static_cast<uint16>(uint64{std::min(done, asked)} * 100 / asked);
 }
 
 } // namespace

@@ -58,7 +58,6 @@ const char* check_pattern(const String& pattern, Diagnostic_Runner runner) {
 
 // One number at most, to go with the one LoopControl. None stands for no cycles.
 const char* check_loops(const Array<String>& loops) {
-    constexpr char INVALID[] = "Error: Invalid LoopControlData, Valid range 1-4000. \n";
     if (loops.size() == 0)
         return nullptr;
     const String& text = loops[0];
@@ -69,7 +68,7 @@ const char* check_loops(const Array<String>& loops) {
     const auto read = std::from_chars(text.c_str(), end, count);
     const bool valid = read.ec == std::errc() && read.ptr == end && count >= 1 &&
                        count <= MAX_TEST_LOOPS && loops.size() == 1;
-    return valid ? nullptr : INVALID;
+    return valid ? nullptr : "Error: Invalid LoopControlData, Valid range 1-4000. \n";
 }
 
 const char* check_beacon(uint32 state) {

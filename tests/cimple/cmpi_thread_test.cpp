@@ -145,6 +145,7 @@ TEST(Time_Test, APauseEndsByItselfOrByAWake) {
     Time::wake();
     sleeper.join();
     Time::pause(3600ull * 1000000, stop);
+    Time::sleep(3600ull * 1000000, stop);
 }
 
 // ---- Up-calls ----

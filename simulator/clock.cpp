@@ -19,7 +19,9 @@ struct Clock {
     std::mutex mutex; // guards the rest
     std::condition_variable moved;
     bool is_virtual = false;
-    std::uint64_t now = 0;     // of a virtual clock
+    std::uint64_t now = 0; // of a virtual clock
+    bool skips_sleeps = false;
+    std::uint64_t skipped = 0; // by which the host's time is ahead of the system's
     unsigned long changes = 0; // from one clock to another
     std::multiset<std::uint64_t> pause_ends;
 };
@@ -41,11 +43,22 @@ bool advance(std::uint64_t usec) {
     return clock.is_virtual;
 }
 
+// Whether a sleep of usec is over without one.
+bool skip(std::uint64_t usec) {
+    Clock& clock = the_clock();
+    std::lock_guard lock(clock.mutex);
+    if (clock.skips_sleeps)
+        clock.skipped += usec;
+    return clock.skips_sleeps;
+}
+
 void change_clock(bool is_virtual, std::uint64_t start_usec) {
     Clock& clock = the_clock();
     std::lock_guard lock(clock.mutex);
     clock.is_virtual = is_virtual;
     clock.now = start_usec;
+    clock.skips_sleeps = false;
+    clock.skipped = 0;
     ++clock.changes;
     clock.moved.notify_all();
 }
@@ -60,26 +73,31 @@ void vlnsim_use_system_clock(void) {
     change_clock(false, 0);
 }
 
+void vlnsim_skip_sleeps(void) {
+    change_clock(false, 0);
+    Clock& clock = the_clock();
+    std::lock_guard lock(clock.mutex);
+    clock.skips_sleeps = true;
+}
+
 void vlnsim_advance(uint64_t usec) {
     advance(usec);
 }
 
 uint64_t vlnsim_now(void) {
-    {
-        Clock& clock = the_clock();
-        std::lock_guard lock(clock.mutex);
-        if (clock.is_virtual)
-            return clock.now;
-    }
+    Clock& clock = the_clock();
+    std::lock_guard lock(clock.mutex);
+    if (clock.is_virtual)
+        return clock.now;
     timespec now{};
     if (clock_gettime(CLOCK_REALTIME, &now) != 0)
         return 0;
     return static_cast<std::uint64_t>(now.tv_sec) * usec_per_second +
-           static_cast<std::uint64_t>(now.tv_nsec) / 1000;
+           static_cast<std::uint64_t>(now.tv_nsec) / 1000 + clock.skipped;
 }
 
 void vlnsim_sleep(uint64_t usec) {
-    if (advance(usec))
+    if (advance(usec) || skip(usec))
         return;
     timespec left{};
     left.tv_sec = static_cast<time_t>(usec / usec_per_second);

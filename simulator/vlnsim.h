@@ -117,6 +117,9 @@ VLNSIM_API const char* vlnsim_host_root(void);
  * epoch. */
 VLNSIM_API void vlnsim_use_virtual_clock(uint64_t start_usec);
 VLNSIM_API void vlnsim_use_system_clock(void);
+/* The system's clock, but a sleep returns at once and the clock is ahead by so much from then on:
+ * for people, who would wait otherwise. */
+VLNSIM_API void vlnsim_skip_sleeps(void);
 VLNSIM_API void vlnsim_advance(uint64_t usec); /* no effect on the system's clock */
 VLNSIM_API uint64_t vlnsim_now(void);
 VLNSIM_API void

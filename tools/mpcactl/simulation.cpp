@@ -69,6 +69,7 @@ Simulation::Simulation(const Session_Settings& settings) {
     if (!_library)
         throw Usage_Error(std::string("the simulator cannot be loaded: ") + dlerror());
     char error[4096] = "";
+    function<decltype(vlnsim_skip_sleeps)>("vlnsim_skip_sleeps")();
     if (function<decltype(vlnsim_load_scenario)>("vlnsim_load_scenario")(path.c_str(), error,
                                                                          sizeof error) != 0)
         throw Usage_Error(error);

@@ -48,6 +48,14 @@ std::uint64_t Function::mac_address() const {
     return get_name(name);
 }
 
+bool Function::shares_port(const Function& other) const {
+    const auto port = [](const Function& function) {
+        const auto found = function.adapter_attributes.find(adapter_port_number);
+        return found == function.adapter_attributes.end() ? 0 : found->second.number();
+    };
+    return card == other.card && port(*this) == port(other);
+}
+
 void put_name(std::uint64_t wwn, std::uint8_t* bytes) {
     for (int i = 7; i >= 0; --i, wwn >>= 8)
         bytes[i] = static_cast<std::uint8_t>(wwn);

@@ -188,6 +188,8 @@ struct Function {
     std::uint32_t resets = 0;
     std::optional<Dumps> dumps;
     std::optional<Diagnostics> diagnostics;
+    std::optional<AX_CEE_Params> bridging;
+    bool bridging_switch = false; // the switch provides settings for those that are willing
 
     std::optional<std::string> hba_name; // the adapter's name in the HBA API, which then knows it
     std::uint32_t hba_ports = 1;
@@ -198,6 +200,7 @@ struct Function {
     std::vector<iSCSI_Target> iscsi_targets;
 
     std::uint64_t mac_address() const; // as a number
+    bool shares_port(const Function& other) const; // the physical one
 };
 
 // What a library file of the host exports beside or without what it would by itself.

@@ -62,6 +62,7 @@ enum : std::uint16_t {
     port_ipv4_address = 812,
     port_subnet_mask = 813,
     port_current_mac = 817,
+    port_pfc_throttle = 823,
     feature_tessel = 201,
     port_first = 768 // adapter attributes have smaller numbers
 };

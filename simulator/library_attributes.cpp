@@ -42,7 +42,12 @@ AX_STATUS answer_attributes(Call& call, AX_WWN wwn, void* buffer, uint32_t* size
     return answer_values(call, tagged(function->*map), buffer, *size, size);
 }
 
+// The throttle is written as 0 or 1 and read as these.
+enum : std::uint32_t { throttle_off = 1, throttle_on = 2 };
+
 void set_attribute(Function& function, std::uint16_t identifier, Attribute attribute) {
+    if (identifier == port_pfc_throttle && attribute.length == sizeof(std::uint32_t))
+        attribute = Attribute::of_number(attribute.number() ? throttle_on : throttle_off);
     auto& map = identifier < port_first ? function.adapter_attributes : function.port_attributes;
     map[identifier] = std::move(attribute);
 }

@@ -18,14 +18,6 @@ void each_of_asic(Host& host, const Function& asic, Visit visit) {
             visit(function);
 }
 
-bool on_one_port(const Function& a, const Function& b) {
-    const auto port = [](const Function& function) {
-        const auto found = function.adapter_attributes.find(adapter_port_number);
-        return found == function.adapter_attributes.end() ? 0 : found->second.number();
-    };
-    return a.card == b.card && port(a) == port(b);
-}
-
 std::uint32_t number_of(const Attribute_Map& map, std::uint16_t identifier) {
     const auto found = map.find(identifier);
     return found == map.end() ? 0 : found->second.number();
@@ -185,14 +177,14 @@ AX_STATUS AX_SetPortEnabled(AX_WWN wwn, uint32_t enabled, uint32_t* dynamic) {
             if (!asked)
                 return AX_STATUS_ILLEGAL_WWN;
             for (const Function& function : call.host.functions)
-                if (!enabled && on_one_port(function, *asked) &&
+                if (!enabled && function.shares_port(*asked) &&
                     number_of(function.adapter_attributes, AX_HA_BOOT_CODE_ENABLED) != 0)
                     return boot_code_enabled;
             const bool waits = asked->port_effect == Effect::reset;
             for (Function& function : call.host.functions) {
                 const std::uint32_t physical =
                     number_of(function.port_attributes, port_physical_state);
-                if (!on_one_port(function, *asked))
+                if (!function.shares_port(*asked))
                     continue;
                 if (waits)
                     set_state(function, enabled ? state_down_until_reset : state_up_until_reset,

@@ -70,6 +70,7 @@ Diagnostics read_diagnostics(const Node& values);
 // One of its numbers; a name that none has is an error at value.
 void set_diagnostic(Diagnostics& diagnostics, const std::string& name, const Node& value);
 std::vector<std::pair<std::string_view, std::uint32_t>> list_diagnostics(Diagnostics diagnostics);
+void read_bridging(const Node& values, Function& function);
 
 // The targets that an iSCSI function sees; its initiator and network records have been read.
 std::vector<iSCSI_Target> read_iscsi_targets(const Node& values, const Function& function);

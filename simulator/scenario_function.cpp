@@ -167,6 +167,8 @@ void read_records(const Node& values, Function& function) {
         function.dumps = read_dumps(*node);
     if (const auto node = values.member("diagnostics"))
         function.diagnostics = read_diagnostics(*node);
+    if (const auto node = values.member("bridging"))
+        read_bridging(*node, function);
     if (const auto node = values.member("pci")) {
         function.pci = read_pci(*node);
         if (!node->member("functionNumber"))
@@ -273,6 +275,7 @@ std::span<const std::string_view> function_keys() {
                                                 "globalDriverParameters",
                                                 "dumps",
                                                 "diagnostics",
+                                                "bridging",
                                                 "dead",
                                                 "adapterAttributes",
                                                 "portAttributes",

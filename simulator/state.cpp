@@ -299,6 +299,7 @@ constexpr Piece PIECES[] = {
     of_dumps<&Dumps::stored>("storedDumps"),
     table<list_trace_settings, set_trace_setting>("traceSettings"),
     table<list_diagnostic_values, set_diagnostic_value>("diagnostics"),
+    whole<&Function::bridging>("bridging"),
     whole<&Function::beacon>("beacon"),
     whole<&Function::resets>("resets"),
     whole<&Function::initiator>("initiator"),

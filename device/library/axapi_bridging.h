@@ -10,6 +10,8 @@ AX_BEGIN_DECLS
 
 enum {
     AX_PRIORITY_GROUPS = 8,
+    AX_PRIORITY_GROUP_IDS = 16,
+    AX_UNLIMITED_GROUP = 15, /* its traffic has no bandwidth limit */
     AX_APPLICATION_SLOTS = 15,
     AX_UNCHANGED = -1 /* a word of a set call that stays as it is */
 };
@@ -65,7 +67,7 @@ typedef struct AX_PGPriorityBitmaps {
     uint32_t group[AX_PRIORITY_GROUPS];
 } AX_PGPriorityBitmaps;
 
-/* As AX_PGPriorityBitmaps, with group 15, whose traffic has no bandwidth limit. */
+/* As AX_PGPriorityBitmaps, with AX_UNLIMITED_GROUP. */
 typedef struct AX_PGPriorityBitmapsExt {
     uint32_t group[AX_PRIORITY_GROUPS];
     uint32_t groupFifteen;
@@ -85,15 +87,17 @@ typedef struct AX_CEE_State {
     uint32_t advertise;
 } AX_CEE_State;
 
-/* Priority groups, flow control and applications of a port, configured or in force. */
+/*
+ * Priority groups, flow control and applications of a port, configured or in force. The groups from
+ * 8 to 14 are nobody's: a priority in one is the switch's error.
+ */
 typedef struct AX_CEE_Settings {
     AX_CEE_State pg;
     AX_CEE_State pfc;
     AX_CEE_State fcoe;
     AX_CEE_State iscsi;
     uint32_t pfcBitmap;
-    uint32_t groupBitmap[AX_PRIORITY_GROUPS];
-    uint32_t groupFifteenBitmap;
+    uint32_t groupBitmap[AX_PRIORITY_GROUP_IDS];
     uint32_t bandwidth[AX_PRIORITY_GROUPS];
     AX_ApplicationTable application;
 } AX_CEE_Settings;
@@ -107,10 +111,18 @@ typedef struct AX_CEE_Params {
     uint32_t maxSupportedPG;
     AX_CEE_Settings configured;
     AX_CEE_Settings active;
-    uint8_t reserved[1520 - 11 * 4 - 2 * 392];
+    uint8_t reserved[1520 - 11 * 4 - 2 * 420];
 } AX_CEE_Params;
-AX_CHECK_SIZE(AX_CEE_Settings, 392);
+AX_CHECK_SIZE(AX_CEE_Settings, 420);
+AX_CHECK_OFFSET(AX_CEE_Settings, pfcBitmap, 80);
+AX_CHECK_OFFSET(AX_CEE_Settings, groupBitmap, 84);
+AX_CHECK_OFFSET(AX_CEE_Settings, bandwidth, 148);
+AX_CHECK_OFFSET(AX_CEE_Settings, application, 180);
 AX_CHECK_SIZE(AX_CEE_Params, 1520);
+AX_CHECK_OFFSET(AX_CEE_Params, lldp, 16);
+AX_CHECK_OFFSET(AX_CEE_Params, maxSupportedPG, 40);
+AX_CHECK_OFFSET(AX_CEE_Params, configured, 44);
+AX_CHECK_OFFSET(AX_CEE_Params, active, 464);
 
 AX_API AX_STATUS AX_CNA_GetCEE_Params(AX_WWN wwn, AX_CEE_Params* params);
 AX_API AX_STATUS AX_CNA_GetPGPriorityBitmaps(AX_WWN wwn, AX_PGPriorityBitmaps* bitmaps);

@@ -14,6 +14,7 @@
 
 #include "cimple/types.h"
 #include "device/library/identifiers.h"
+#include "operations/bridging_rules.h"
 
 #include <string>
 #include <vector>
@@ -160,6 +161,20 @@ public:
     static AX_STATUS CancelDiagnostic(const HBA_WWN* name, uint32 handle);
     // AX_BEACON_OFF or AX_BEACON_ON.
     static AX_STATUS SetBeacon(const HBA_WWN* name, uint32 state);
+    // ---- Data centre bridging (bridging.cpp; the rules stand in bridging_rules.h) ----
+
+    static AX_STATUS vlncimGetCEEParams(const HBA_WWN* name, AX_CEE_Params* record);
+    // Sets one parameter. With validate off the groups do not follow an application to its new
+    // priority. 1, 2 or 4 when a rule is broken; 1 as well when the change was made and what the
+    // adapter had before could not be read.
+    static AX_STATUS vlncimSetCEEParams(const HBA_WWN* name, const char* parameter,
+                                        const char* value, bool validate);
+    // All groups at once, then flow control. When that fails the groups are as they were told.
+    static AX_STATUS vlncimSetCeePriority(const HBA_WWN* name, uint32 pfcBitmap,
+                                          const Priority_Groups& groups, bool validate);
+    static AX_STATUS vlncimSetPgBW(const HBA_WWN* name, const Group_Bandwidths& bandwidths);
+    // 1 on, 0 off.
+    static AX_STATUS SetPfcThrottle(const HBA_WWN* name, uint32 value);
 
     // Logs a status of the library with its text for it, if it has one, at level 5.
     static void logStatus(AX_STATUS status);

@@ -1,6 +1,7 @@
 #include "agent/class_groups.h"
 
 #include "foundation/logger.h"
+#include "services/bridging/instances.h"
 #include "services/configuration/instances.h"
 #include "services/diagnostics/instances.h"
 #include "services/driver_parameters/instances.h"
@@ -22,6 +23,10 @@ constexpr Class_Group GROUPS[] = {
      .create = StartSoftwareInstallationService,
      .failed = {VLN_CRIT, "StartSoftwareInstallationService failed"}},
     {.place = NIC,
+     .create = create_nic_bridging,
+     .clear = clear_bridging,
+     .before = {VLN_DBG, "calling CreateCeeClasses for NIC port"}},
+    {.place = NIC,
      .create = retrieve_down_ports,
      .failed = {VLN_ERR, "RetrieveDownNICPorts failed"}},
     {.place = NIC,
@@ -36,6 +41,12 @@ constexpr Class_Group GROUPS[] = {
     {.place = FCOE, .create = create_driver_parameter_service},
     {.place = FC_PORT, .create = create_driver_parameters},
     {.place = FC_PORTS, .create = join_driver_parameters},
+    {.place = FC_PORTS,
+     .create = create_fcoe_bridging,
+     .before = {VLN_DBG, "calling CreateCeeClasses for FCoE port"}},
+    {.place = ISCSI_PORTS,
+     .create = create_iscsi_bridging,
+     .before = {VLN_DBG, "calling CreateCeeClasses for iSCSI port"}},
     {.place = ALL_PORTS,
      .create = createDiagnosticClasses,
      .clear = clear_diagnostic_classes,

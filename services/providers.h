@@ -3,6 +3,7 @@
 #ifndef VLN_SERVICES_PROVIDERS_H
 #define VLN_SERVICES_PROVIDERS_H
 
+#include "services/bridging/provider.h"
 #include "services/configuration/provider.h"
 #include "services/diagnostics/log_provider.h"
 #include "services/diagnostics/settings_provider.h"

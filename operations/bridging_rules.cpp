@@ -36,6 +36,18 @@ Refusal first_broken(const Request& request, Refusal (*const (&rules)[N])(const 
     return {};
 }
 
+// Priorities under flow control: two on some ports, one on others, none on any.
+Refusal check_flow_control(uint32 bitmap, bool takes_two) {
+    const int priorities = std::popcount(bitmap);
+    if (priorities > 1 && !takes_two)
+        return refuse(AX_STATUS_INVALID_ARGUMENT,
+                      "ERROR: Only one PFC priority can be configured on this adapter.");
+    if (priorities > 2)
+        return refuse(AX_STATUS_INVALID_ARGUMENT,
+                      "ERROR: Only two PFC priorities can be configured on this adapter.");
+    return {};
+}
+
 // ---- Applications ----
 
 struct Application_Row {
@@ -151,14 +163,7 @@ Refusal flow_control_fits(const Parameter_Request& request) {
     const uint32 fcoe = request.port.fcoe ? configured(request, Application::FCOE) : 0;
     if ((request.value & fcoe) != fcoe)
         return refuse(AX_STATUS_ERROR, "ERROR: Fcoepriority is not enabled in new pfcpriority.");
-    const int bits = std::popcount(request.value);
-    if (bits > 1 && !request.port.bridging)
-        return refuse(AX_STATUS_INVALID_ARGUMENT,
-                      "ERROR: Only one PFC priority can be configured on this adapter.");
-    if (bits > 2)
-        return refuse(AX_STATUS_INVALID_ARGUMENT,
-                      "ERROR: Only two PFC priorities can be configured on this adapter.");
-    return {};
+    return check_flow_control(request.value, request.port.bridging);
 }
 
 Refusal transmit_is_on(const Parameter_Request& request) {
@@ -235,14 +240,7 @@ Refusal priorities_under_flow_control_are_few(const Priority_Request& request) {
         refusal.console = true;
         return refusal;
     }
-    const int bits = std::popcount(request.pfcBitmap);
-    if (bits > 1 && (!port.bridging || port.nicOnly))
-        return refuse(AX_STATUS_INVALID_ARGUMENT,
-                      "ERROR: Only one PFC priority can be configured on this adapter.");
-    if (bits > 2)
-        return refuse(AX_STATUS_INVALID_ARGUMENT,
-                      "ERROR: Only two PFC priorities can be configured on this adapter.");
-    return {};
+    return check_flow_control(request.pfcBitmap, port.bridging && !port.nicOnly);
 }
 
 Refusal priorities_are_known(const Priority_Request& request) {

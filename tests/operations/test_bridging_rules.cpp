@@ -253,8 +253,10 @@ void expect_sound_move(const Parameter_Request& request) {
         uint32 left = unlimited;
         for (const uint32 bitmap : write.bitmaps.group)
             left &= ~bitmap;
-        if (!one_group_each(write.bitmaps, left))
+        if (!one_group_each(write.bitmaps, left)) {
+            ASSERT_FALSE(move.swap) << "a single write";
             continue;
+        }
         groups = write.bitmaps;
         unlimited = left;
     }

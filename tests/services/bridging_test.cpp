@@ -79,6 +79,12 @@ Value word(const char* text) {
     return Value::text(text);
 }
 
+// One property is changed.
+Change set(const char* property, const Value& value, CMPIrc status, const char* line,
+           const services::Fault& fault = {}) {
+    return {{{property, value}}, status, line, fault};
+}
+
 constexpr CMPIrc OK = CMPI_RC_OK, FAILED = CMPI_RC_ERR_FAILED, NOT_FOUND = CMPI_RC_ERR_NOT_FOUND;
 
 // ---- What is shown ----
@@ -144,98 +150,84 @@ TEST(Bridging_Instances, APortThatCannotBeReadHasNoSettings) {
 // ---- Priorities of applications ----
 
 TEST_F(Bridging, EachRefusalOfAPriorityHasItsLine) {
-    const auto fcoe = [](std::uint32_t value) {
-        return host::Named_Values{{"FCoEPriority", number(value)}};
+    const auto fcoe = [](std::uint32_t value, CMPIrc status, const char* line,
+                         const services::Fault& fault = {}) {
+        return set("FCoEPriority", number(value), status, line, fault);
     };
     const char* const unknown = "ERROR: Unable to determine port type.";
     const char* const fcoe_failed =
         "VLN_MethodWrapper::vlncimSetCEEParams call for FCoEPriority failed";
-    expect(NIC, {{fcoe(5), NOT_FOUND, "ERROR: Cannot set DCB parameters on NIC adapters."},
-                 {fcoe(5), NOT_FOUND, fcoe_failed},
-                 {fcoe(5), NOT_FOUND, unknown, {"AX_GetHBAFeature", 190}}});
+    expect(NIC, {fcoe(5, NOT_FOUND, "ERROR: Cannot set DCB parameters on NIC adapters."),
+                 fcoe(5, NOT_FOUND, fcoe_failed),
+                 fcoe(5, NOT_FOUND, unknown, {"AX_GetHBAFeature", 190})});
     expect(CNA,
-           {{fcoe(8), NOT_FOUND, "\nERROR: FCoE priority valid range is 0 to 7\n"},
-            {{{"iSCSIPriority", number(4000000000)}},
-             NOT_FOUND,
-             "\nERROR: iSCSI priority valid range is 0 to 7\n"},
-            {{{"iSCSIPriority", number(8)}},
-             NOT_FOUND,
-             "VLN_MethodWrapper::vlncimSetCEEParams call for iSCSIPriority failed"},
-            {{{"RoCePriority", number(1)}},
-             NOT_FOUND,
-             "ERROR:- Setting RoCE Priority on NON ROCE Port not allowed"},
-            {fcoe(3), OK, "PriorityGroup and pfc are not modified."},
-            {fcoe(5),
-             NOT_FOUND,
-             "ERROR: SetCeeParam failed: Unable to get DCBX state",
-             {"AX_CNA_GetCEE_Params", 190}},
-            {fcoe(5), NOT_FOUND, fcoe_failed, {"AX_CNA_SetPGPriorityBitmaps", 190}},
-            {fcoe(5), NOT_FOUND, "Setting DCB Params failed with code 4", {"AX_CNA_GetTLV", 4}}});
+           {fcoe(8, NOT_FOUND, "\nERROR: FCoE priority valid range is 0 to 7\n"),
+            set("iSCSIPriority", number(4000000000), NOT_FOUND,
+                "\nERROR: iSCSI priority valid range is 0 to 7\n"),
+            set("iSCSIPriority", number(8), NOT_FOUND,
+                "VLN_MethodWrapper::vlncimSetCEEParams call for iSCSIPriority failed"),
+            set("RoCePriority", number(1), NOT_FOUND,
+                "ERROR:- Setting RoCE Priority on NON ROCE Port not allowed"),
+            fcoe(3, OK, "PriorityGroup and pfc are not modified."),
+            fcoe(5, NOT_FOUND, "ERROR: SetCeeParam failed: Unable to get DCBX state",
+                 {"AX_CNA_GetCEE_Params", 190}),
+            fcoe(5, NOT_FOUND, fcoe_failed, {"AX_CNA_SetPGPriorityBitmaps", 190}),
+            fcoe(5, NOT_FOUND, "Setting DCB Params failed with code 4", {"AX_CNA_GetTLV", 4})});
     expect(ONLY_ISCSI,
-           {{fcoe(5), NOT_FOUND, "ERROR:- Setting FCoE Priority on NON FCoE Port not allowed"}});
-    expect(ONLY_FCOE, {{{{"iSCSIPriority", number(5)}},
-                        NOT_FOUND,
-                        "ERROR:- Setting iSCSI Priority on NON iSCSI Port not allowed"}});
+           {fcoe(5, NOT_FOUND, "ERROR:- Setting FCoE Priority on NON FCoE Port not allowed")});
+    expect(ONLY_FCOE, {set("iSCSIPriority", number(5), NOT_FOUND,
+                           "ERROR:- Setting iSCSI Priority on NON iSCSI Port not allowed")});
     expect(MANY_GROUPS,
-           {{fcoe(5), NOT_FOUND, "ERROR: More than 2 priority groups have priorities."},
-            {fcoe(5), NOT_FOUND,
-             "Use 'Setceepriority' command to correct the priority group information."},
+           {fcoe(5, NOT_FOUND, "ERROR: More than 2 priority groups have priorities."),
+            fcoe(5, NOT_FOUND,
+                 "Use 'Setceepriority' command to correct the priority group information."),
             {{{"iSCSIPriority", number(5)}, {"ValidateRule", number(0)}},
              NOT_FOUND,
              "ERROR: More than 2 priority groups have priorities."},
             {{{"FCoEPriority", number(5)}, {"ValidateRule", number(0)}}, OK, "ValidateRule = 0"}});
     expect_properties(groups(MANY_GROUPS),
                       {{"FCoEPriority", "5"}, {"PriorityGroupTwo", "{3}"}, {"PFCPriority", "{3}"}});
-    expect(ROCE, {{{{"RoCePriority", number(2)}},
-                   NOT_FOUND,
-                   "vlncimSetCEEParams call for RoCePriority failed"},
-                  {{{"RoCePriority", number(1)}},
-                   OK,
-                   "Note: This setting will only be used when not provided by the switch."}});
+    expect(ROCE, {set("RoCePriority", number(2), NOT_FOUND,
+                      "vlncimSetCEEParams call for RoCePriority failed"),
+                  set("RoCePriority", number(1), OK,
+                      "Note: This setting will only be used when not provided by the switch.")});
     EXPECT_EQ(text_of(groups(ROCE), "RoCePriority"), "1");
 }
 
 // Two groups change places where both priorities have one.
 TEST_F(Bridging, GroupsFollowAPriority) {
-    expect(CNA, {{{{"FCoEPriority", number(5)}},
-                  OK,
-                  "New fcoepriority is assigned to priority group 1.\n",
-                  {},
-                  "AX_CNA_SetTLV"}});
+    expect(CNA, {set("FCoEPriority", number(5), OK,
+                     "New fcoepriority is assigned to priority group 1.\n")});
     expect_properties(groups(CNA, "Active"), {{"FCoEPriority", "5"},
                                               {"PFCPriority", "{5}"},
                                               {"PriorityGroupOne", "{0, 1, 2, 3, 4, 6, 7}"},
                                               {"PriorityGroupTwo", "{5}"}});
     // The groups stay where flow control alone follows.
-    expect(CNA, {{{{"iSCSIPriority", number(5)}}, OK, "DCB parameter successfully set."},
-                 {{{"FCoEPriority", number(3)}},
-                  OK,
-                  "ERROR: Failed to enable pfcpriority, required for new fcoepriority.\n",
-                  {"AX_CNA_SetPFC", 190}}});
+    expect(CNA, {set("iSCSIPriority", number(5), OK, "DCB parameter successfully set."),
+                 set("FCoEPriority", number(3), OK,
+                     "ERROR: Failed to enable pfcpriority, required for new fcoepriority.\n",
+                     {"AX_CNA_SetPFC", 190})});
     expect_properties(groups(CNA), {{"PFCPriority", "{5}"}, {"PriorityGroupTwo", "{3}"}});
     // What has no limit leaves its group; on the way there the adapter refuses a state.
-    expect(UNLIMITED,
-           {{{{"FCoEPriority", number(6)}},
-             OK,
-             "ERROR: Unable to modify priority group information required for new fcoepriority."}});
+    expect(
+        UNLIMITED,
+        {set("FCoEPriority", number(6), OK,
+             "ERROR: Unable to modify priority group information required for new fcoepriority.")});
     EXPECT_EQ(road.count_in_log("New fcoepriority is assigned to priority group 1."), 3u);
     expect_properties(groups(UNLIMITED), {{"PriorityGroupOne", "{0, 1, 2, 3, 4, 5, 7}"},
                                           {"PriorityGroupTwo", "{6}"},
                                           {"PriorityGroupFifteen", "{}"},
                                           {"FCoEPriority", "6"}});
     // For iSCSI alone nothing is under flow control.
-    expect(ONLY_ISCSI, {{{{"iSCSIPriority", number(3)}},
-                         OK,
-                         "Warning: Update priority group priorities, if necessary.\n"}});
+    expect(ONLY_ISCSI, {set("iSCSIPriority", number(3), OK,
+                            "Warning: Update priority group priorities, if necessary.\n")});
     expect_properties(groups(ONLY_ISCSI), {{"iSCSIPriority", "3"}, {"PFCPriority", "{3}"}});
 }
 
 // What was written stays, and the instances show it.
 TEST_F(Bridging, AChangeThatFailsPartWayIsReadBack) {
-    expect(CNA, {{{{"FCoEPriority", number(5)}},
-                  NOT_FOUND,
-                  "Setting DCB Params failed with code 190",
-                  {"AX_CNA_SetTLV", 190}}});
+    expect(CNA, {set("FCoEPriority", number(5), NOT_FOUND,
+                     "Setting DCB Params failed with code 190", {"AX_CNA_SetTLV", 190})});
     expect_properties(groups(CNA), {{"FCoEPriority", "3"}, {"PriorityGroupTwo", "{5}"}});
     expect(CNA, {{{{"FCoEPriority", number(6)}, {"PFCPriority", list({5, 6, 7})}},
                   NOT_FOUND,
@@ -254,54 +246,41 @@ TEST_F(Bridging, EachRefusalOfGroupsHasItsLine) {
     const Value all = list({0, 1, 2, 4, 5, 6, 7});
     const char* const failed = "VLNMPCA_PGData_Provider::vlncimSetCeePriority call failed";
     const Value::Array many(100'000, number(1));
-    expect(NIC, {{{{"PFCPriority", list({4})}},
-                  NOT_FOUND,
-                  "ERROR: Priority groups not supported on NIC adapters."}});
-    expect(ONLY_FCOE, {{{{"PFCPriority", list({3, 4})}},
-                        NOT_FOUND,
-                        "ERROR: Only one PFC priority can be configured on this adapter."}});
-    expect(ONLY_ISCSI, {{{{"PFCPriority", list({})}},
-                         NOT_FOUND,
-                         "ERROR: Invalid Priority. \niSCSI Priority and non-iSCSI Priorities "
-                         "cannot be assigned to the same priority group."}});
+    expect(NIC, {set("PFCPriority", list({4}), NOT_FOUND,
+                     "ERROR: Priority groups not supported on NIC adapters.")});
+    expect(ONLY_FCOE, {set("PFCPriority", list({3, 4}), NOT_FOUND,
+                           "ERROR: Only one PFC priority can be configured on this adapter.")});
+    expect(ONLY_ISCSI, {set("PFCPriority", list({}), NOT_FOUND,
+                            "ERROR: Invalid Priority. \niSCSI Priority and non-iSCSI Priorities "
+                            "cannot be assigned to the same priority group.")});
     expect(CNA,
-           {{{{"PFCPriority", list({5})}},
-             NOT_FOUND,
-             "ERROR: Unable to get PG settings.",
-             {"AX_CNA_GetCEE_Params", 190}},
+           {set("PFCPriority", list({5}), NOT_FOUND, "ERROR: Unable to get PG settings.",
+                {"AX_CNA_GetCEE_Params", 190}),
             {{{"PriorityGroupThree", list({5})},
               {"PriorityGroupFour", list({6})},
               {"PriorityGroupEight", list({7})}},
              NOT_FOUND,
              "ERROR: Only 4 priority groups can be configured on this adapter."},
-            {{{"PFCPriority", list({1, 2, 3})}}, NOT_FOUND, "Max two pfc priority are supported"},
-            {{{"PriorityGroupTwo", list({3, 300})}},
-             NOT_FOUND,
-             "ERROR: Invalid priority in priority group 1. Valid range is 0 to 7"},
+            set("PFCPriority", list({1, 2, 3}), NOT_FOUND, "Max two pfc priority are supported"),
+            set("PriorityGroupTwo", list({3, 300}), NOT_FOUND,
+                "ERROR: Invalid priority in priority group 1. Valid range is 0 to 7"),
             {{{"PriorityGroupFifteen", Value::array(CMPI_uint32, many)}},
              FAILED,
              "Invalid PriorityGroup, too many priorities are given"},
-            {{{"PriorityGroupTwo", list({3, 4})}},
-             NOT_FOUND,
-             "ERROR: Invalid Priority. \nFCoE Priority and non-FCoE Priorities cannot be "
-             "assigned to the same priority group."},
-            {{{"PFCPriority", list({3, 5})}},
-             NOT_FOUND,
-             "ERROR: A PGID's priorities must be PFC priority or non-PFC priorities"},
-            {{{"PriorityGroupThree", list({7})}},
-             NOT_FOUND,
-             "ERROR: Priority groups 0 and 2 have same priority"},
-            {{{"PriorityGroupFifteen", list({7})}},
-             NOT_FOUND,
-             "ERROR: Priority groups 0 and 15 have same priority"},
-            {{{"PriorityGroupOne", list({0, 1})}},
-             NOT_FOUND,
-             "ERROR: Unable to set priority group priorities."},
+            set("PriorityGroupTwo", list({3, 4}), NOT_FOUND,
+                "ERROR: Invalid Priority. \nFCoE Priority and non-FCoE Priorities cannot be "
+                "assigned to the same priority group."),
+            set("PFCPriority", list({3, 5}), NOT_FOUND,
+                "ERROR: A PGID's priorities must be PFC priority or non-PFC priorities"),
+            set("PriorityGroupThree", list({7}), NOT_FOUND,
+                "ERROR: Priority groups 0 and 2 have same priority"),
+            set("PriorityGroupFifteen", list({7}), NOT_FOUND,
+                "ERROR: Priority groups 0 and 15 have same priority"),
+            set("PriorityGroupOne", list({0, 1}), NOT_FOUND,
+                "ERROR: Unable to set priority group priorities."),
             {{{"PriorityGroupThree", list({7})}, {"ValidateRule", number(0)}}, NOT_FOUND, failed},
-            {{{"PFCPriority", list({})}},
-             NOT_FOUND,
-             "ERROR: Unable to set pfcpriority.",
-             {"AX_CNA_SetPFC", 190}},
+            set("PFCPriority", list({}), NOT_FOUND, "ERROR: Unable to set pfcpriority.",
+                {"AX_CNA_SetPFC", 190}),
             {{{"PriorityGroupOne", all}, {"PFCPriority", list({3})}},
              OK,
              "PriorityGroup and pfc are not modified."},
@@ -312,53 +291,48 @@ TEST_F(Bridging, EachRefusalOfGroupsHasItsLine) {
              "ValidateRule = 0"}});
     expect_properties(groups(CNA), {{"PriorityGroupTwo", "{3, 4}"}, {"PFCPriority", "{3}"}});
     testing::internal::CaptureStdout();
-    expect(CNA, {{{{"PFCPriority", list({8})}}, NOT_FOUND, failed}});
+    expect(CNA, {set("PFCPriority", list({8}), NOT_FOUND, failed)});
     EXPECT_EQ(testing::internal::GetCapturedStdout(),
               "\nERROR: Invalid PFC priority. Valid range is 0 to 7");
     EXPECT_EQ(road.count_in_log("ERROR: Invalid PFC priority."), 0u);
 }
 
 TEST_F(Bridging, BandwidthsAddUpAndFlowControlIsSwitched) {
-    const auto share = [](std::initializer_list<std::uint32_t> values) {
-        return host::Named_Values{{"PriorityBandwidth", list(values)}};
+    const auto share = [](std::initializer_list<std::uint32_t> values, CMPIrc status,
+                          const char* line, const services::Fault& fault = {}) {
+        return set("PriorityBandwidth", list(values), status, line, fault);
     };
     const char* const eight = "Invalid PriorityBandwidth data, Should be array of 8 elements";
     const char* const failed = "VLNMPCA_PGData_Provider::vlncimSetPgBW call failed";
     const auto equal = {13u, 13u, 13u, 13u, 12u, 12u, 12u, 12u};
-    expect(CNA, {{share({100}), FAILED, eight},
-                 {share({}), FAILED, eight},
-                 {share({0, 0, 0, 0, 0, 0, 0, 101}), FAILED,
-                  "Invalid PriorityBandwidth, Element Value Should be b/w 0 - 100"},
-                 {share({50, 49, 0, 0, 0, 0, 0, 0}), NOT_FOUND,
-                  "ERROR: Invalid bandwidth values. All bandwidths must add up to 100"},
-                 {share(equal), NOT_FOUND, failed, {"AX_GetHBAFeature", 190}},
-                 {share(equal),
-                  NOT_FOUND,
-                  "ERROR: Priority groups are not supported on the specified adapter.",
-                  {"AX_GetHBAFeature", 1}},
-                 {share(equal),
-                  NOT_FOUND,
-                  "ERROR: Setting of bandwidth failed",
-                  {"AX_CNA_GetPGPriorityBitmaps", 190}},
-                 {share(equal), NOT_FOUND, "", {"AX_CNA_SetPGBandwidth", 1}},
-                 {share(equal), OK, "Successfully set priority group bandwidths."},
-                 {{{"PFCEnabled", word("yes")}}, FAILED, "Invalid PFCEnabled"},
-                 {{{"PFCEnabled", word("No")}}, OK, "DCB parameter successfully set."}});
+    expect(CNA, {share({100}, FAILED, eight), share({}, FAILED, eight),
+                 share({0, 0, 0, 0, 0, 0, 0, 101}, FAILED,
+                       "Invalid PriorityBandwidth, Element Value Should be b/w 0 - 100"),
+                 share({50, 49, 0, 0, 0, 0, 0, 0}, NOT_FOUND,
+                       "ERROR: Invalid bandwidth values. All bandwidths must add up to 100"),
+                 share(equal, NOT_FOUND, failed, {"AX_GetHBAFeature", 190}),
+                 share(equal, NOT_FOUND,
+                       "ERROR: Priority groups are not supported on the specified adapter.",
+                       {"AX_GetHBAFeature", 1}),
+                 share(equal, NOT_FOUND, "ERROR: Setting of bandwidth failed",
+                       {"AX_CNA_GetPGPriorityBitmaps", 190}),
+                 share(equal, NOT_FOUND, "", {"AX_CNA_SetPGBandwidth", 1}),
+                 share(equal, OK, "Successfully set priority group bandwidths."),
+                 set("PFCEnabled", word("yes"), FAILED, "Invalid PFCEnabled"),
+                 set("PFCEnabled", word("No"), OK, "DCB parameter successfully set.")});
     expect_properties(
         groups(CNA, "Active"),
         {{"PriorityBandwidth", "{13, 13, 13, 13, 12, 12, 12, 12}"}, {"PFCEnabled", "No"}});
-    expect(ROCE, {{share(equal), NOT_FOUND,
-                   "ERROR: Priority groups are not supported on the specified adapter."}});
-    expect(ONLY_ISCSI, {{{{"PFCEnabled", word("No")}},
-                         NOT_FOUND,
-                         "ERROR: Cannot set PFC parameters on a NIC or iSCSI port."}});
+    expect(ROCE, {share(equal, NOT_FOUND,
+                        "ERROR: Priority groups are not supported on the specified adapter.")});
+    expect(ONLY_ISCSI, {set("PFCEnabled", word("No"), NOT_FOUND,
+                            "ERROR: Cannot set PFC parameters on a NIC or iSCSI port.")});
 }
 
 TEST_F(Bridging, OnlyWhatIsConfiguredIsModified) {
     expect_changes(road, groups(CNA, "Active"),
-                   {{{{"FCoEPriority", number(5)}},
-                     FAILED,
-                     "modify_instance is supported only on Configured instance"}});
+                   {set("FCoEPriority", number(5), FAILED,
+                        "modify_instance is supported only on Configured instance")});
     const auto rename = [](host::Instance instance) {
         host::set(instance.path.keys, "InstanceID", word("other"));
         host::set(instance.properties, "InstanceID", word("other"));
@@ -374,16 +348,14 @@ TEST_F(Bridging, OnlyWhatIsConfiguredIsModified) {
 
 TEST_F(Bridging, StatesAreSetInTheirOrder) {
     expect_changes(road, exchange(QUIET),
-                   {{{{"DCBXState", word("Enabled")}},
-                     FAILED,
-                     "ERROR: Cannot enable dcbxstate when transmit(txstate) is disabled."},
+                   {set("DCBXState", word("Enabled"), FAILED,
+                        "ERROR: Cannot enable dcbxstate when transmit(txstate) is disabled."),
                     {{{"DCBXState", word("Enabled")}, {"LLDPtxState", word("Enabled")}},
                      FAILED,
                      "VLN_MethodWrapper::vlncimSetCEEParams call for dcbxstate failed"},
-                    {{{"LLDPtxSysDesc", word("Disabled")}},
-                     FAILED,
-                     "ERROR: Cannot set transmit properties when transmit state is disabled."},
-                    {{{"LLDPtxPortDesc", word("disabled")}}, FAILED, "Invalid state"},
+                    set("LLDPtxSysDesc", word("Disabled"), FAILED,
+                        "ERROR: Cannot set transmit properties when transmit state is disabled."),
+                    set("LLDPtxPortDesc", word("disabled"), FAILED, "Invalid state"),
                     {{{"LLDPtxState", word("Ena")}, {"LLDPtxSysName", word("Dis, for now")}},
                      OK,
                      "DCB parameter successfully set."},
@@ -394,32 +366,28 @@ TEST_F(Bridging, StatesAreSetInTheirOrder) {
                                         {"LLDPtxSysDesc", "Enabled"},
                                         {"LLDPtxSysName", "Disabled"}});
     expect_changes(road, exchange(QUIET),
-                   {{{{"LLDPrxState", word("Disabled")}},
-                     FAILED,
-                     "ERROR: Cannot (disable or be disabled) rxstate when DCBX is enabled."},
-                    {{{"LLDPtxSysCap", word("Disabled")}},
-                     FAILED,
-                     "VLN_MethodWrapper::vlncimSetCEEParams call for txsyscap failed",
-                     {"AX_CNA_SetLldp", 190}}});
+                   {set("LLDPrxState", word("Disabled"), FAILED,
+                        "ERROR: Cannot (disable or be disabled) rxstate when DCBX is enabled."),
+                    set("LLDPtxSysCap", word("Disabled"), FAILED,
+                        "VLN_MethodWrapper::vlncimSetCEEParams call for txsyscap failed",
+                        {"AX_CNA_SetLldp", 190})});
 }
 
 TEST(Bridging_Throttle, IsSwitchedByTheFirstTwoLetters) {
     Road road({.scenario = "fcoe-pair.json", .log = true});
     const host::Instance throttle = road.enumerate("VLNMPCA_PFCThrottle").at(0);
-    const auto set = [](const char* text) {
-        return host::Named_Values{{"PFCThrottle", word(text)}};
+    const auto turn = [](const char* text, CMPIrc status, const char* line,
+                         const services::Fault& fault = {}) {
+        return set("PFCThrottle", word(text), status, line, fault);
     };
     expect_changes(road, throttle,
-                   {{set("Enable"), FAILED, "Invalid PFCThrottle"},
-                    {set("d"), FAILED, "Invalid PFCThrottle"},
-                    {set("disable"),
-                     NOT_FOUND,
-                     "VLN_MethodWrapper::SetPfcThrottle failed",
-                     {"AX_SetAdapterAttribute", 190}},
-                    {set("di"), OK, "Setting PFCThrottle to disable"}});
+                   {turn("Enable", FAILED, "Invalid PFCThrottle"),
+                    turn("d", FAILED, "Invalid PFCThrottle"),
+                    turn("disable", NOT_FOUND, "VLN_MethodWrapper::SetPfcThrottle failed",
+                         {"AX_SetAdapterAttribute", 190}),
+                    turn("di", OK, "Setting PFCThrottle to disable")});
     EXPECT_EQ(text_of(road.manager().get(throttle.path).value, "PFCThrottle"), "disabled");
-    expect_changes(road, throttle,
-                   {{{}, OK, ""}, {set("energy"), OK, "PFC throttle has been set"}});
+    expect_changes(road, throttle, {{{}, OK, ""}, turn("energy", OK, "PFC throttle has been set")});
     EXPECT_EQ(text_of(road.manager().get(throttle.path).value, "PFCThrottle"), "enabled");
 }
 

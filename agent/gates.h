@@ -93,6 +93,10 @@ public:
     // afterwards.
     void refreshAdapterMaps();
 
+    // Gives m_DataMutex up for the rest of the scope, for a call that may take minutes. The stores
+    // are out of reach from then on.
+    void letDataGo() { _data_lock.unlock(); }
+
 private:
     ProviderAgent& _agent;
     Auto_Mutex _data_lock;

@@ -16,10 +16,21 @@
 #include "device/library/identifiers.h"
 #include "operations/bridging_rules.h"
 
+#include <optional>
 #include <string>
 #include <vector>
 
 namespace cimple {
+
+// How an FCoE port looks for its forwarder, in the texts of a console. To set, what is empty or not
+// there stays as it is.
+struct VLN_FIPParams {
+    std::string primaryFabricName; // "XX:XX:XX:XX:XX:XX:XX:XX"
+    std::string primarySwitchName;
+    std::string vlanId; // decimal, or "Any"; to set, in any base that C knows
+    std::string fcMap;  // "0x0EFCXX"
+    std::optional<uint32> cinVlanId;
+};
 
 // How the event log of an adapter's firmware is laid out, and what each module writes to it.
 struct VLN_EventLogSettings {
@@ -175,6 +186,41 @@ public:
     static AX_STATUS vlncimSetPgBW(const HBA_WWN* name, const Group_Bandwidths& bandwidths);
     // 1 on, 0 off.
     static AX_STATUS SetPfcThrottle(const HBA_WWN* name, uint32 value);
+
+    // ---- FIP (fip.cpp) ----
+
+    // Both answer 2 for a card without FCoE.
+    static AX_STATUS vlnGetFIPParams(const HBA_WWN* name, VLN_FIPParams* params);
+    // 4 for a value that cannot be: nothing is written then. 1 when a write fails; of the two that
+    // it takes the first may stand by then.
+    static AX_STATUS vlnSetFIPParams(const HBA_WWN* name, const VLN_FIPParams& wanted);
+    // The forwarders that the port has found.
+    static AX_STATUS GetFcfList(const HBA_WWN* name, std::vector<AX_Fcf>* forwarders);
+
+    // ---- World Wide Names (wwn.cpp) ----
+
+    static AX_STATUS GetWWNCapability(const HBA_WWN* name, uint32* capability);
+    // type: AX_WWN_. activation: how the names stand, AX_WWN_ACTIVATION_; 0 if that is not told.
+    static AX_STATUS ReadWWN(const HBA_WWN* name, uint32 type, HBA_WWN* wwpn, HBA_WWN* wwnn,
+                             uint32* activation);
+    // 5 when one of them is no valid name.
+    static AX_STATUS ValidateNewWWNs(const HBA_WWN* wwpn, const HBA_WWN* wwnn);
+    // Where the host has one of the names already, of all that can be told from its virtual ports.
+    enum WWN_Duplicate : uint32 {
+        WWN_UNIQUE,
+        WWN_OF_VPORT_PORT,
+        WWN_OF_VPORT_NODE,
+        WWN_OF_TARGET_PORT,
+        WWN_OF_TARGET_NODE,
+    };
+    static WWN_Duplicate FindDuplicateWWN(const HBA_WWN* wwpn, const HBA_WWN* wwnn);
+    // These two ask again, once a second for five minutes, while the library is still at it; no
+    // longer than until stop is raised and Time::wake called. activation: what the change waits
+    // for.
+    static AX_STATUS ChangeWWN(const HBA_WWN* name, const HBA_WWN* wwpn, const HBA_WWN* wwnn,
+                               uint32 type, uint32* activation, const bool& stop);
+    static AX_STATUS RestoreWWN(const HBA_WWN* name, uint32 type, uint32* activation,
+                                const bool& stop);
 
     // Logs a status of the library with its text for it, if it has one, at level 5.
     static void logStatus(AX_STATUS status);

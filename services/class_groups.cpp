@@ -7,6 +7,7 @@
 #include "services/driver_parameters/instances.h"
 #include "services/dump/down_ports.h"
 #include "services/dump/instances.h"
+#include "services/fip/instances.h"
 #include "services/firmware/instances.h"
 #include "services/record_logs/instances.h"
 #include "services/wwn/instances.h"
@@ -41,6 +42,12 @@ constexpr Class_Group GROUPS[] = {
     {.place = FCOE, .create = create_driver_parameter_service},
     {.place = FC_PORT, .create = create_driver_parameters},
     {.place = FC_PORTS, .create = join_driver_parameters},
+    {.place = FC_PORTS,
+     .create = create_fip_classes,
+     .clear = clear_fip_classes,
+     .done = {VLN_INFO, "FCoE FIP classes are successfully created"},
+     .failed = {VLN_INFO, "Issue with FIP classes"},
+     .thrown = {VLN_INFO, "Issue with FIP classes"}},
     {.place = FC_PORTS,
      .create = create_fcoe_bridging,
      .before = {VLN_DBG, "calling CreateCeeClasses for FCoE port"}},

@@ -10,7 +10,9 @@
 #include "services/diagnostics/test_provider.h"
 #include "services/dump/provider.h"
 #include "services/dump/settings_provider.h"
+#include "services/fip/provider.h"
 #include "services/firmware/provider.h"
 #include "services/profiles/provider.h"
+#include "services/wwn/provider.h"
 
 #endif // VLN_SERVICES_PROVIDERS_H

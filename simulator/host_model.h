@@ -125,6 +125,28 @@ struct Test {
     std::optional<std::uint64_t> cancelled{};
 };
 
+// How an FCoE port finds its forwarder, and those that it has found.
+struct Fip {
+    AX_FCFConnectList connect{};
+    AX_FIPParams params{};
+    std::vector<AX_Fcf> forwarders;
+};
+
+struct Name_Pair {
+    std::uint64_t wwpn = 0;
+    std::uint64_t wwnn = 0;
+
+    friend bool operator==(const Name_Pair&, const Name_Pair&) = default;
+};
+
+// What a port's names can be. In force are those of its function; what it is configured to have is
+// the volatile set where there is one, else the other.
+struct Name_Management {
+    std::uint32_t capability = 0; // AX_WWN_ bits
+    Name_Pair factory;
+    std::uint32_t busy = 0; // calls that change names and are answered "in progress" yet
+};
+
 // A feature's answer: a value, or a status alone.
 struct Feature {
     std::uint32_t value = 0;
@@ -147,6 +169,7 @@ enum : AX_STATUS {
     firmware_damaged = 142,
     firmware_of_other_model = 143,
     boot_code_enabled = 221,
+    name_in_use = 94,
 };
 
 // How AX_SetPortEnabled tells it.
@@ -190,6 +213,11 @@ struct Function {
     std::optional<Diagnostics> diagnostics;
     std::optional<AX_CEE_Params> bridging;
     bool bridging_switch = false; // the switch provides settings for those that are willing
+    std::optional<Fip> fip;
+    std::optional<Name_Management> name_management;
+    Name_Pair non_volatile_names;
+    std::optional<Name_Pair> volatile_names;
+    std::vector<AX_VPort> virtual_ports;
 
     std::optional<std::string> hba_name; // the adapter's name in the HBA API, which then knows it
     std::uint32_t hba_ports = 1;
@@ -232,6 +260,9 @@ struct Host {
 
 // What the host's next start brings into force.
 void reboot(Host& host);
+
+// Brings the names into force that the function is configured to have.
+void activate_names(Function& function);
 
 // The eight bytes of a WWN, most significant first.
 void put_name(std::uint64_t wwn, std::uint8_t* bytes);

@@ -71,6 +71,11 @@ void settle_port(Function& function) {
         set_state(function, state_up, state_up);
 }
 
+bool names_wait_for_reboot(const Function& function) {
+    return function.name_management &&
+           (function.name_management->capability & AX_WWN_NEEDS_REBOOT) != 0;
+}
+
 AX_STATUS check_image(const Firmware_Image& image) {
     switch (image.state) {
     case Firmware_Image::State::unreadable:
@@ -96,6 +101,7 @@ void reboot(Host& host) {
     for (Function& function : host.functions) {
         start_firmware(function);
         settle_port(function);
+        activate_names(function);
     }
 }
 
@@ -161,6 +167,8 @@ AX_STATUS AX_ResetHBA(AX_WWN wwn) {
                 if (function.firmware_effect != Effect::reboot)
                     start_firmware(function);
                 settle_port(function);
+                if (!names_wait_for_reboot(function))
+                    activate_names(function);
             });
             return AX_STATUS_OK;
         },

@@ -169,6 +169,12 @@ void read_records(const Node& values, Function& function) {
         function.diagnostics = read_diagnostics(*node);
     if (const auto node = values.member("bridging"))
         read_bridging(*node, function);
+    if (const auto node = values.member("fip"))
+        function.fip = read_fip(*node);
+    if (const auto node = values.member("nameManagement"))
+        read_name_management(*node, function);
+    if (const auto node = values.member("virtualPorts"))
+        function.virtual_ports = read_virtual_ports(*node);
     if (const auto node = values.member("pci")) {
         function.pci = read_pci(*node);
         if (!node->member("functionNumber"))
@@ -276,6 +282,9 @@ std::span<const std::string_view> function_keys() {
                                                 "dumps",
                                                 "diagnostics",
                                                 "bridging",
+                                                "fip",
+                                                "nameManagement",
+                                                "virtualPorts",
                                                 "dead",
                                                 "adapterAttributes",
                                                 "portAttributes",

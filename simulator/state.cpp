@@ -96,20 +96,22 @@ constexpr Piece whole(std::string_view name) {
             nullptr};
 }
 
-// The same of what an adapter keeps of dumps; a function that keeps nothing has nothing to change.
-template <auto member>
-constexpr Piece of_dumps(std::string_view name) {
+// The same of a part that a function may lack; one without it has nothing to change.
+template <auto part, auto member>
+constexpr Piece of_part(std::string_view name) {
     return {name,
             [](const Function& now, const Function& described) -> std::optional<Json> {
-                if (!now.dumps || !described.dumps ||
-                    (*now.dumps).*member == (*described.dumps).*member)
+                if (!(now.*part) || !(described.*part))
                     return std::nullopt;
-                return to_json((*now.dumps).*member);
+                Json value = to_json((*(now.*part)).*member);
+                if (value == to_json((*(described.*part)).*member))
+                    return std::nullopt;
+                return value;
             },
             [](Function& function, const Node& value) {
-                if (!function.dumps)
-                    value.fail("the adapter keeps no dumps");
-                from_json(value, (*function.dumps).*member);
+                if (!(function.*part))
+                    value.fail("the function has no such part");
+                from_json(value, (*(function.*part)).*member);
             },
             nullptr};
 }
@@ -294,12 +296,18 @@ constexpr Piece PIECES[] = {
           set_parameter<&Function::driver_parameters>>("driverParameters"),
     table<list_parameters<&Function::global_driver_parameters>,
           set_parameter<&Function::global_driver_parameters>>("globalDriverParameters"),
-    of_dumps<&Dumps::directory>("dumpDirectory"),
-    of_dumps<&Dumps::retention>("dumpRetention"),
-    of_dumps<&Dumps::stored>("storedDumps"),
+    of_part<&Function::dumps, &Dumps::directory>("dumpDirectory"),
+    of_part<&Function::dumps, &Dumps::retention>("dumpRetention"),
+    of_part<&Function::dumps, &Dumps::stored>("storedDumps"),
     table<list_trace_settings, set_trace_setting>("traceSettings"),
     table<list_diagnostic_values, set_diagnostic_value>("diagnostics"),
     whole<&Function::bridging>("bridging"),
+    of_part<&Function::fip, &Fip::connect>("fcfConnectList"),
+    of_part<&Function::fip, &Fip::params>("fipParameters"),
+    whole<&Function::wwpn>("wwpn"),
+    whole<&Function::wwnn>("wwnn"),
+    whole<&Function::non_volatile_names>("nonVolatileNames"),
+    whole<&Function::volatile_names>("volatileNames"),
     whole<&Function::beacon>("beacon"),
     whole<&Function::resets>("resets"),
     whole<&Function::initiator>("initiator"),

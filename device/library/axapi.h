@@ -257,6 +257,34 @@ AX_API AX_STATUS AX_ResetHBA(AX_WWN wwn);
 
 /* ---------------------------------------------------------------------------- WWN */
 
+/* Bits of the capability word. */
+#define AX_WWN_CAN_CHANGE_NON_VOLATILE (1u << 2)
+#define AX_WWN_CAN_CHANGE_VOLATILE (1u << 3)
+#define AX_WWN_NEEDS_REBOOT (1u << 12)
+#define AX_WWN_NEEDS_RESET (1u << 13)
+#define AX_WWN_READ_ONLY (1u << 31)
+
+/* Which names; the last three can only be read. To restore, 0 means the factory default. */
+enum {
+    AX_WWN_VOLATILE = 0,
+    AX_WWN_NON_VOLATILE = 1,
+    AX_WWN_FACTORY_DEFAULT = 2,
+    AX_WWN_CURRENT = 3,
+    AX_WWN_CONFIGURED = 4
+};
+
+/* How names stand, or what a change waits for. */
+enum {
+    AX_WWN_ACTIVATION_NONE = 1, /* active as they are */
+    AX_WWN_ACTIVATION_VOLATILE = 3,
+    AX_WWN_ACTIVATION_NON_VOLATILE = 4,
+    AX_WWN_ACTIVATION_VOLATILE_REBOOT = 5,
+    AX_WWN_ACTIVATION_NON_VOLATILE_REBOOT = 6,
+    AX_WWN_ACTIVATION_VOLATILE_RESET = 7,
+    AX_WWN_ACTIVATION_NON_VOLATILE_RESET = 8,
+    AX_WWN_ACTIVATION_NO_NAMES = 9
+};
+
 AX_API AX_STATUS AX_GetWWNCapability(AX_WWN wwn, uint32_t* capability);
 AX_API AX_STATUS AX_ReadWWN(AX_WWN wwn, uint32_t type, AX_NAME* wwpn, AX_NAME* wwnn,
                             uint32_t* activation);

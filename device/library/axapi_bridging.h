@@ -142,6 +142,7 @@ AX_API AX_STATUS AX_CNA_SetTLV(AX_WWN wwn, const AX_ApplicationTable* table);
 typedef struct AX_FIPParams {
     uint32_t cinVlanID;
 } AX_FIPParams;
+AX_CHECK_SIZE(AX_FIPParams, 4);
 
 enum { AX_FCF_VLAN_VALID = 1u << 5 };
 
@@ -151,10 +152,14 @@ typedef struct AX_FCFConnectList {
     AX_NAME switchName;
     uint32_t flags; /* bit 5: vlanID holds; any VLAN otherwise */
     uint16_t vlanID;
-    uint8_t fcMap[3];
-    uint8_t reserved;
+    uint8_t fcMap[3]; /* most significant first */
+    uint8_t reserved[3];
 } AX_FCFConnectList;
+AX_CHECK_SIZE(AX_FCFConnectList, 28);
 AX_CHECK_OFFSET(AX_FCFConnectList, switchName, 8);
+AX_CHECK_OFFSET(AX_FCFConnectList, flags, 16);
+AX_CHECK_OFFSET(AX_FCFConnectList, vlanID, 20);
+AX_CHECK_OFFSET(AX_FCFConnectList, fcMap, 22);
 
 enum { AX_FCF_VLANS = 8 };
 
@@ -173,12 +178,18 @@ typedef struct AX_Fcf {
     uint16_t vlanID[AX_FCF_VLANS];
     uint32_t period; /* of advertisements, milliseconds */
 } AX_Fcf;
+AX_CHECK_SIZE(AX_Fcf, 64);
+AX_CHECK_OFFSET(AX_Fcf, fabricName, 16);
+AX_CHECK_OFFSET(AX_Fcf, mac, 32);
+AX_CHECK_OFFSET(AX_Fcf, vlanCount, 42);
+AX_CHECK_OFFSET(AX_Fcf, period, 60);
 
 typedef struct AX_FcfList {
     uint32_t count;
     uint32_t reserved;
     AX_Fcf entry[1];
 } AX_FcfList;
+AX_CHECK_OFFSET(AX_FcfList, entry, 8);
 
 AX_API AX_STATUS AX_CNA_FCOE_GetFIPParams(AX_WWN wwn, AX_FIPParams* params);
 AX_API AX_STATUS AX_CNA_FCOE_SetFIPParams(AX_WWN wwn, const AX_FIPParams* params);

@@ -55,7 +55,7 @@ bool Call::null(const void* pointer, const char* name) {
 
 Function* Call::function(AX_WWN wwn) {
     Function* found = sim.find_function(name_of(wwn));
-    if (!found)
+    if (!found && !sim.is_former_name(name_of(wwn)))
         violation("unknown WWN " + shown(wwn));
     return found;
 }

@@ -217,6 +217,7 @@ struct Function {
     std::optional<Name_Management> name_management;
     Name_Pair non_volatile_names;
     std::optional<Name_Pair> volatile_names;
+    std::vector<std::uint64_t> former_wwpns; // by which callers may still know it
     std::vector<AX_VPort> virtual_ports;
 
     std::optional<std::string> hba_name; // the adapter's name in the HBA API, which then knows it

@@ -63,6 +63,8 @@ void activate_names(Function& function) {
     if (!function.name_management)
         return;
     const Name_Pair names = configured_names(function);
+    if (names.wwpn != function.wwpn)
+        function.former_wwpns.push_back(function.wwpn);
     function.wwpn = names.wwpn;
     function.wwnn = names.wwnn;
 }

@@ -82,6 +82,13 @@ Function* Simulator::find_function(std::uint64_t wwpn) {
     return nullptr;
 }
 
+bool Simulator::is_former_name(std::uint64_t wwpn) const {
+    return std::any_of(host.functions.begin(), host.functions.end(), [&](const Function& each) {
+        return std::find(each.former_wwpns.begin(), each.former_wwpns.end(), wwpn) !=
+               each.former_wwpns.end();
+    });
+}
+
 Function* Simulator::find_dead_port(std::uint64_t address) {
     for (Function& port : host.dead_ports)
         if (port.mac_address() == address)

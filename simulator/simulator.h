@@ -60,6 +60,8 @@ struct Simulator {
     void add_violation(Entry entry, const std::string& what);
 
     Function* find_function(std::uint64_t wwpn);
+    // Whether a function had the name before its names changed.
+    bool is_former_name(std::uint64_t wwpn) const;
     // By its MAC address as a number.
     Function* find_dead_port(std::uint64_t address);
     Function* find_instance(std::uint32_t instance);

@@ -124,6 +124,7 @@ String name_text(const HBA_WWN& name) {
 sint32 WWN_Service_Provider::unload() {
     raise_flag(end_of_waits);
     Time::wake();
+    VLN_LOG(VLN_DBG, "%sunload(): ending the calls that wait", CLASS);
     {
         const Auto_Mutex no_call(*waiting_call);
         __atomic_store_n(&end_of_waits, false, __ATOMIC_RELAXED);

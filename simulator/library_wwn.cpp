@@ -72,6 +72,9 @@ void activate_names(Function& function) {
 namespace library {
 namespace {
 
+// The other type makes the non-volatile names those that are configured.
+constexpr std::uint32_t restore_factory_default = 0;
+
 // The body for a function with name management; the argument is not null.
 template <class Body>
 AX_STATUS with_names(Call& call, AX_WWN wwn, const void* argument, const char* name, Body body) {
@@ -211,13 +214,16 @@ AX_STATUS AX_RestoreWWN(AX_WWN wwn, uint32_t type, uint32_t* activation) {
                 if (type > AX_WWN_NON_VOLATILE)
                     return AX_STATUS{AX_STATUS_INVALID_ARGUMENT};
                 if (const AX_STATUS status =
-                        may_change(*function.name_management, AX_WWN_CAN_CHANGE_NON_VOLATILE))
+                        may_change(*function.name_management, type == restore_factory_default
+                                                                  ? AX_WWN_CAN_CHANGE_NON_VOLATILE
+                                                                  : AX_WWN_CAN_CHANGE_VOLATILE))
                     return status;
                 if (still_busy(*function.name_management))
                     return AX_STATUS{AX_STATUS_WWN_IN_PROGRESS};
-                function.volatile_names.reset();
-                if (type == 0) // the factory's
+                if (type == restore_factory_default)
                     function.non_volatile_names = function.name_management->factory;
+                else
+                    function.volatile_names.reset();
                 settle(function);
                 *activation = activation_of(function);
                 if (is_in_force(*activation))

@@ -201,7 +201,6 @@ TEST_F(Names, EachStatusOfTheLibraryHasItsLine) {
 
 // The five sets of names through a change, a reset or reboot, and back.
 TEST_F(Names, EachActivationWordHasItsLines) {
-    const char* const by = "WWNs restored successfully";
     const Row before[] = {
         {"ReadWWN", BY_RESET, 0, 0, "9", "Volatile WWNs DO NOT EXIST on this adapter"},
         {"ReadWWN", BY_RESET, 1, 0, "-", "Non-Volatile WWNs read successfully"},
@@ -215,11 +214,14 @@ TEST_F(Names, EachActivationWordHasItsLines) {
         {"ChangeWWN", BY_RESET, 0, 0, "7", VOLATILE_UNTIL},
         {"ReadWWN", BY_RESET, 4, 0, "7",
          "Configured WWNs: Volatile (Activation required: adapter restart)"},
+        {"RestoreWWN", BY_RESET, 0, 0, "7", "Reset the HBA to activate the new setting"},
         {"ReadWWN", BY_RESET, 3, 0, "4", "WWPN: 10:00:02:56:4c:00:00:01"},
         {"ReadWWN", BY_RESET, 4, 0, "7", "WWNN: 20:00:02:56:4c:00:0f:01"},
     };
     for (const Row& row : before)
         expect(row);
+    EXPECT_EQ(road.count_in_log("WWNs restored successfully"), 1u);
+    EXPECT_EQ(road.count_in_log(VOLATILE_UNTIL), 2u) << "of the change and of the restore";
     EXPECT_EQ(road.count_in_log("New WWNs written successfully"), 2u);
     EXPECT_EQ(road.count_in_log("ChangeWWN operation completed. Please restart the CIMOM"), 2u);
     const auto installer = road.enumerate("VLNMPCA_SoftwareInstallationService").at(0).path;
@@ -233,8 +235,8 @@ TEST_F(Names, EachActivationWordHasItsLines) {
     const Row after[] = {
         {"ReadWWN", NEW_PORT, 0, 0, "1", "Volatile WWNs are active"},
         {"ReadWWN", NEW_PORT, 3, 0, "3", "Current WWNs: Volatile"},
-        {"RestoreWWN", NEW_PORT, 0, 0, "8", "Please reset the HBA to activate the new setting"},
-        {"RestoreWWN", NEW_PORT, 1, 0, "8", by},
+        {"RestoreWWN", NEW_PORT, 0, 0, "1", "WWNs already active. No Restore needed"},
+        {"RestoreWWN", NEW_PORT, 1, 0, "8", "Please reset the HBA to activate the new setting"},
     };
     for (const Row& row : after)
         expect(row);
@@ -248,6 +250,7 @@ TEST_F(Names, AChangeMayWaitForAReboot) {
          "Configured WWNs: Non-Volatile (Activation required: warm reboot)"},
         {"RestoreWWN", BY_REBOOT, 1, 0, "6", reboot},
         {"ChangeWWN", BY_REBOOT, 0, 0, "5", VOLATILE_UNTIL},
+        {"RestoreWWN", BY_REBOOT, 0, 0, "5", reboot},
         {"ReadWWN", BY_REBOOT, 0, 0, "5",
          "Configured WWNs: Volatile (Activation required: warm reboot)"},
     };
@@ -312,14 +315,19 @@ TEST_F(Busy_Names, ARestoreHoldsUpNobody) {
 }
 
 TEST_F(Busy_Names, AnUnloadCutsTheWaitShort) {
-    for (const char* method : {"ChangeWWN", "RestoreWWN"}) {
+    const struct {
+        const char* method;
+        int type; // non-volatile names are written, the factory's restored
+    } rows[] = {{"ChangeWWN", 1}, {"RestoreWWN", 0}};
+    for (const auto& [method, type] : rows) {
         road.enumerate("VLNMPCA_FCWWNService");
         const std::string function = std::string("AX_") + method;
         const std::string line = "unload(): ending the calls that wait";
         const std::size_t unloads = road.count_in_log(line);
         sudden_ends::hold(function.c_str());
         const std::uint64_t start = vlnsim_now();
-        std::thread client([&] { call(method, inputs_of({method, ENDLESS, 1, 0, "-", ""})); });
+        const Named_Values inputs = inputs_of({method, ENDLESS, type, 0, "-", ""});
+        std::thread client([&] { EXPECT_TRUE(call(function.c_str() + 3, inputs).ok()); });
         sudden_ends::wait_until_held();
         std::thread letting_go([&] {
             while (road.count_in_log(line) == unloads)

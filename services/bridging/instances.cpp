@@ -156,6 +156,12 @@ void manages(Instance& association) {
     cast<CIM_ServiceAffectsElement>(&association)->ElementEffects.append(EFFECT_MANAGES);
 }
 
+// What the settings of a port hang on.
+struct Owners {
+    const VLNMPCA_CEEService* service;
+    const VLNMPCA_PortController* controller; // null for a port without a NIC function
+};
+
 // The functions of one kind, on their way into the stores.
 class Bridging_Builder {
 public:
@@ -167,14 +173,27 @@ public:
 
 private:
     AX_STATUS createPort(Adapter& adapter, const Port& port);
+    void createGroups(const Owners& owners, const String& instance_id, const String& device_id,
+                      const AX_CEE_Params& record, const AX_CEE_Settings& settings,
+                      uint16 is_current);
+    void createExchange(const Owners& owners, const String& device_id, const AX_CEE_Params& record);
     const VLNMPCA_CEEService* service();
-    void joinDriver(const VLNMPCA_CEEService* service);
+    Owners joinOwners(const String& physical_port);
     bool exchangeIsThere(const String& physical_port);
 
     ProviderAgent& _agent;
     const CIM_ComputerSystem& _system;
     const Function_Kind& _kind;
 };
+
+void join(const Owners& owners, Instance_Map_Base& of_service, Instance_Map_Base& of_controller,
+          const Instance* data, uint16 is_current) {
+    if (!data)
+        return;
+    associate(of_service, owners.service, data, {}, currency(is_current));
+    if (owners.controller)
+        associate(of_controller, owners.controller, data, {}, currency(is_current));
+}
 
 // What fails drops out alone; the status of the last such port is answered.
 AX_STATUS Bridging_Builder::run() {
@@ -204,14 +223,21 @@ const VLNMPCA_CEEService* Bridging_Builder::service() {
     return services.size() == 0 ? nullptr : services[0];
 }
 
-void Bridging_Builder::joinDriver(const VLNMPCA_CEEService* service) {
+// Controller and driver are the same for many a function.
+Owners Bridging_Builder::joinOwners(const String& physical_port) {
+    const Owners owners = {service(), find_port_controller(_agent, physical_port)};
+    if (owners.controller)
+        associate_once(_agent.m_VLNMPCA_CEEServiceAffectsElement_map, owners.controller,
+                       owners.service, {}, manages);
     const String kind(_kind.driver);
     const auto* driver = find_first(
         _agent.m_VLNMPCA_SoftwareIdentity_map, [&](const VLNMPCA_SoftwareIdentity& each) {
             return each.ClassificationDescriptions.value.find(kind) >= 0;
         });
     if (driver)
-        associate_once(_agent.m_VLNMPCA_CEEServiceAffectsDriver_map, driver, service, {}, manages);
+        associate_once(_agent.m_VLNMPCA_CEEServiceAffectsDriver_map, driver, owners.service, {},
+                       manages);
+    return owners;
 }
 
 // What is exchanged belongs to the link, which functions of all kinds share.
@@ -227,6 +253,25 @@ bool Bridging_Builder::exchangeIsThere(const String& physical_port) {
     return false;
 }
 
+void Bridging_Builder::createGroups(const Owners& owners, const String& instance_id,
+                                    const String& device_id, const AX_CEE_Params& record,
+                                    const AX_CEE_Settings& settings, uint16 is_current) {
+    auto data = data_instance<VLNMPCA_PGData>(instance_id, device_id);
+    fill(*data, record, settings);
+    join(owners, _agent.m_VLNMPCA_ElementPGData_map, _agent.m_VLNMPCA_PortControllerPGData_map,
+         insert_instance(_agent.m_VLNMPCA_PGData_map, std::move(data)), is_current);
+}
+
+void Bridging_Builder::createExchange(const Owners& owners, const String& device_id,
+                                      const AX_CEE_Params& record) {
+    auto data =
+        data_instance<VLNMPCA_DcbxLldpData>(format_text(EXCHANGE_ID, device_id.c_str()), device_id);
+    fill(*data, record);
+    join(owners, _agent.m_VLNMPCA_ElementDcbxLLdpData_map,
+         _agent.m_VLNMPCA_PortControllerDcbxLLdpData_map,
+         insert_instance(_agent.m_VLNMPCA_DcbxLldpData_map, std::move(data)), SETTING_IS);
+}
+
 // A port whose adapter has no bridging has no settings either, and that is no failure.
 AX_STATUS Bridging_Builder::createPort(Adapter& adapter, const Port& port) {
     const String id = text(port.getPortName());
@@ -236,37 +281,15 @@ AX_STATUS Bridging_Builder::createPort(Adapter& adapter, const Port& port) {
     AX_CEE_Params record{};
     if (const AX_STATUS status = VLN_MethodWrapper::vlncimGetCEEParams(&name, &record))
         return status == AX_STATUS_NOT_SUPPORTED ? AX_STATUS_OK : status;
-    const VLNMPCA_CEEService* cee = service();
-    const String physical = physical_port_name(*adapter.getAdapterAttributes());
-    const VLNMPCA_PortController* controller = find_port_controller(_agent, physical);
-    if (controller)
-        associate_once(_agent.m_VLNMPCA_CEEServiceAffectsElement_map, controller, cee, {}, manages);
-    joinDriver(cee);
-    const auto join = [&](Instance_Map_Base& of_service, Instance_Map_Base& of_controller,
-                          const Instance* data, uint16 is_current) {
-        if (!data)
-            return;
-        associate(of_service, cee, data, {}, currency(is_current));
-        if (controller)
-            associate(of_controller, controller, data, {}, currency(is_current));
-    };
-    const auto create_groups = [&](const String& instance_id, const AX_CEE_Settings& settings,
-                                   uint16 is_current) {
-        auto data = data_instance<VLNMPCA_PGData>(instance_id, id);
-        fill(*data, record, settings);
-        join(_agent.m_VLNMPCA_ElementPGData_map, _agent.m_VLNMPCA_PortControllerPGData_map,
-             insert_instance(_agent.m_VLNMPCA_PGData_map, std::move(data)), is_current);
-    };
-    create_groups(format_text(CONFIGURED_ID, id.c_str()), record.configured, SETTING_IS_NOT);
-    create_groups(format_text(ACTIVE_ID, id.c_str()), record.active, SETTING_IS);
-    if (exchangeIsThere(physical)) {
+    const String physical_port = physical_port_name(*adapter.getAdapterAttributes());
+    const Owners owners = joinOwners(physical_port);
+    createGroups(owners, format_text(CONFIGURED_ID, id.c_str()), id, record, record.configured,
+                 SETTING_IS_NOT);
+    createGroups(owners, format_text(ACTIVE_ID, id.c_str()), id, record, record.active, SETTING_IS);
+    if (exchangeIsThere(physical_port))
         VLN_LOG(VLN_DBG, "Concurrent mode and instance is already created");
-        return AX_STATUS_OK;
-    }
-    auto exchange = data_instance<VLNMPCA_DcbxLldpData>(format_text(EXCHANGE_ID, id.c_str()), id);
-    fill(*exchange, record);
-    join(_agent.m_VLNMPCA_ElementDcbxLLdpData_map, _agent.m_VLNMPCA_PortControllerDcbxLLdpData_map,
-         insert_instance(_agent.m_VLNMPCA_DcbxLldpData_map, std::move(exchange)), SETTING_IS);
+    else
+        createExchange(owners, id, record);
     return AX_STATUS_OK;
 }
 

@@ -17,11 +17,6 @@ constexpr uint32 VERSION_WITHOUT_PATTERNS = 1;
 constexpr uint32 DEFAULT_VERSION = 2;
 constexpr uint32 LINK_UP = 2; // AX_PA_PHYSICAL_PORT_STATE
 
-// Which names AX_ReadWWN tells, and when they come into force.
-constexpr uint32 CONFIGURED_NAMES = 4;
-constexpr uint32 VOLATILE_AFTER_REBOOT = 5;
-constexpr uint32 NON_VOLATILE_AFTER_REBOOT = 6;
-
 // Answers the status with which a runner refuses its port.
 AX_STATUS refuse(AX_STATUS status, const char* line) {
     VLN_LOG(VLN_ERR, "%s", line);
@@ -45,8 +40,10 @@ AX_STATUS check_type(const Test_Run& run) {
 AX_STATUS check_names(const Test_Run& run) {
     AX_NAME port{}, node{};
     uint32 activation = 0;
-    if (AX_ReadWWN(wwnOf(&run.name), CONFIGURED_NAMES, &port, &node, &activation) != AX_STATUS_OK ||
-        (activation != VOLATILE_AFTER_REBOOT && activation != NON_VOLATILE_AFTER_REBOOT))
+    if (AX_ReadWWN(wwnOf(&run.name), AX_WWN_CONFIGURED, &port, &node, &activation) !=
+            AX_STATUS_OK ||
+        (activation != AX_WWN_ACTIVATION_VOLATILE_REBOOT &&
+         activation != AX_WWN_ACTIVATION_NON_VOLATILE_REBOOT))
         return AX_STATUS_OK;
     VLN_LOG(VLN_ERR, "WARNING: WWN Management detected a new name change that requires a sytem "
                      "reboot.");

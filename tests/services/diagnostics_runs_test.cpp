@@ -33,10 +33,11 @@ const std::map<std::string, const char*> NAMES = {{"BEACON", BEACON},
                                                   {"FC", FC},
                                                   {"IDLE", "100002564C000101"}};
 
-// The second port has no light.
+// The second port has no light, and is to get another name.
 const std::string SCENARIO = R"({"include": ")" VLN_SCENARIOS R"(/parts/cna.json", "cards": [
     {"use": "cna", "adapterAttributes": {"DiagVersionNumber": 4},
-     "features": {"CableDiagnostics": 1}, "diagnostics": {}, "ports": [{}, {"beacon": 1}],
+     "features": {"CableDiagnostics": 1}, "diagnostics": {}, "ports": [{}, {"beacon": 1,
+     "nameManagement": {"can": ["volatile", "reboot"], "volatile": {"wwnn": "2000024500000001"}}}],
      "functions": [{"use": "nic"},
                    {"use": "fcoe", "targets": {"wwpn": "50:25:64:C{port}:00:00:00:00"}}]}]})";
 

@@ -117,7 +117,12 @@ std::string path_of(const std::string& uri) {
     return uri;
 }
 
-int run_fetch(Curl_Session& curl, const std::string& uri, std::FILE* file) {
+// libcurl asks about once a second, also while nothing comes. Anything but 0 ends the transfer.
+int is_to_stop(const void* stop, std::int64_t, std::int64_t, std::int64_t, std::int64_t) {
+    return load_flag(*static_cast<const bool*>(stop)) ? 1 : 0;
+}
+
+int run_fetch(Curl_Session& curl, const std::string& uri, std::FILE* file, const bool& stop) {
     char error[ERROR_TEXT_SIZE] = "";
     // Certificates are not verified: what protects an adapter is its own check of the image.
     const Curl_Option options[] = {
@@ -134,13 +139,19 @@ int run_fetch(Curl_Session& curl, const std::string& uri, std::FILE* file) {
     // An option that is not set may be the one that keeps the bytes off the standard output.
     if (const int failure = curl.set(options))
         return failure;
+    // A libcurl that is too old for these fetches as well.
+    curl.set({pointer_option("CURLOPT_XFERINFOFUNCTION", 20219,
+                             reinterpret_cast<const void*>(&is_to_stop)),
+              pointer_option("CURLOPT_XFERINFODATA", 10057, &stop),
+              {"CURLOPT_NOPROGRESS", 43, 0}});
     const int code = curl.perform();
     if (code != CURL_OK)
         VLN_LOG(VLN_DBG, "curl: %s", error);
     return code;
 }
 
-int fetch_into(const Curl_Library& library, const std::string& uri, std::FILE* file) {
+int fetch_into(const Curl_Library& library, const std::string& uri, std::FILE* file,
+               const bool& stop) {
     Curl_Functions functions;
     if (!library.bind(functions))
         return CURL_NOT_BUILT_IN;
@@ -151,7 +162,7 @@ int fetch_into(const Curl_Library& library, const std::string& uri, std::FILE* f
         VLN_LOG(VLN_ERR, "ERROR: Could not initialise the curl");
         return curl.initialised() != CURL_OK ? curl.initialised() : CURL_FAILED_INIT;
     }
-    const int code = run_fetch(curl, uri, file);
+    const int code = run_fetch(curl, uri, file, stop);
     if (code != CURL_OK)
         VLN_LOG(VLN_ERR, "download failed %d", code);
     return code != CURL_OK ? code : curl.initialised();
@@ -181,7 +192,8 @@ File_Handle open_for_fetch(const std::string& uri, std::string& local, int& code
     return file;
 }
 
-void fetch(const std::string& uri, std::string& local_path, int& code, bool& fetched) {
+void fetch(const std::string& uri, const bool& stop, std::string& local_path, int& code,
+           bool& fetched) {
     VLN_LOG(VLN_INFO, "File not found on local file system. Trying libcURL...");
     Curl_Library library(Curl_Library::FETCH);
     if (!library.is_open()) {
@@ -191,7 +203,7 @@ void fetch(const std::string& uri, std::string& local_path, int& code, bool& fet
     std::string local;
     File_Handle file = open_for_fetch(uri, local, code);
     if (file) {
-        code = fetch_into(library, uri, file.get());
+        code = fetch_into(library, uri, file.get(), stop);
         fetched = true;
         local_path = code == CURL_BAD_URL ? uri : local;
     }
@@ -290,8 +302,9 @@ int upload(const char* uri, const char* name) {
 
 } // namespace
 
-void VLN_MethodWrapper::downloadFileUsingCurl(const char* uri, std::string& local_path,
-                                              int& return_code, bool& fetched) {
+void VLN_MethodWrapper::downloadFileUsingCurl(const char* uri, const bool& stop,
+                                              std::string& local_path, int& return_code,
+                                              bool& fetched) {
     Operation_Frame frame("VLN_MethodWrapper::downloadFileUsingCurl");
     return_code = CURL_OK;
     fetched = false;
@@ -302,7 +315,7 @@ void VLN_MethodWrapper::downloadFileUsingCurl(const char* uri, std::string& loca
         if (exists(local_path))
             VLN_LOG(VLN_DBG, "File found in local file system.");
         else
-            fetch(uri, local_path, return_code, fetched);
+            fetch(uri, stop, local_path, return_code, fetched);
     });
     if (complete)
         return;

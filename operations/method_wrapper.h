@@ -120,9 +120,9 @@ public:
     // answered as a path. Anything else libcurl fetches into a file of the object manager's
     // working folder: fetched is true then, and the file is the caller's to remove. return_code is
     // 0 or libcurl's code; 0 is no promise that the file exists, since without libcurl the path
-    // comes back as it is.
-    static void downloadFileUsingCurl(const char* uri, std::string& local_path, int& return_code,
-                                      bool& fetched);
+    // comes back as it is. Within seconds of stop going up libcurl gives up.
+    static void downloadFileUsingCurl(const char* uri, const bool& stop, std::string& local_path,
+                                      int& return_code, bool& fetched);
     // Sends a file to where the URI says; 0, or -1 after a line of the log.
     static int uploadFileUsingCurl(const char* uri, const char* file);
 

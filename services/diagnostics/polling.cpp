@@ -100,10 +100,6 @@ AX_STATUS CancelTest(const Test_Run& run, uint32 handle) {
     return status;
 }
 
-// The tests that may be running. Its mutex is a leaf.
-constinit Process_Wide<Mutex> running_mutex;
-constinit Running_Test* running = nullptr;
-
 } // namespace
 
 bool poll_test(const Test_Run& run, Test_Report& report) {
@@ -156,29 +152,6 @@ const char* result_text(uint32 code) {
 void conclude(Test_Report& report, String text) {
     report.text = text;
     VLN_LOG(report.passed ? VLN_INFO : VLN_ERR, "%s", report.text.c_str());
-}
-
-Running_Test::Running_Test() {
-    const Auto_Mutex lock(*running_mutex);
-    m_next = running;
-    running = this;
-}
-
-Running_Test::~Running_Test() {
-    const Auto_Mutex lock(*running_mutex);
-    Running_Test** place = &running;
-    while (*place != this)
-        place = &(*place)->m_next;
-    *place = m_next;
-}
-
-void Running_Test::stop_all() {
-    {
-        const Auto_Mutex lock(*running_mutex);
-        for (Running_Test* each = running; each; each = each->m_next)
-            raise_flag(each->m_stop);
-    }
-    Time::wake();
 }
 
 } // namespace cimple

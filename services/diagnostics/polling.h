@@ -20,25 +20,6 @@ const char* result_text(uint32 code);
 // Gives the report its text, and logs it: of a test that passed at level 4, of another at level 3.
 void conclude(Test_Report& report, String text);
 
-// Stands for a method that may be running a test.
-class Running_Test {
-public:
-    Running_Test();
-    ~Running_Test();
-    Running_Test(const Running_Test&) = delete;
-    Running_Test& operator=(const Running_Test&) = delete;
-
-    // Has the tests that run now cancelled: whoever unloads their class does not wait for the rest
-    // of twenty minutes. Those that begin later are left alone.
-    static void stop_all();
-
-    const bool& stop() const { return m_stop; }
-
-private:
-    bool m_stop = false;
-    Running_Test* m_next;
-};
-
 } // namespace cimple
 
 #endif // VLN_SERVICES_DIAGNOSTICS_POLLING_H

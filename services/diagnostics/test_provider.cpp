@@ -8,6 +8,7 @@
 #include "services/diagnostics/runners.h"
 #include "services/diagnostics/test_support.h"
 #include "services/method_call.h"
+#include "services/waiting_call.h"
 
 namespace cimple {
 
@@ -134,7 +135,7 @@ uint32 run_service(ProviderAgent& agent, const VLNMPCA_DiagnosticTest* self,
 } // namespace
 
 sint32 Diagnostic_Test_Provider::unload() {
-    Running_Test::stop_all();
+    Waiting_Call::end_all(VLNMPCA_DiagnosticTest::static_meta_class);
     return Pattern_Provider<VLNMPCA_DiagnosticTest>::unload();
 }
 
@@ -143,10 +144,10 @@ sint32 Diagnostic_Test_Provider::RunDiagnosticService(const VLNMPCA_DiagnosticTe
                                                       CIM_DiagnosticSettingData**,
                                                       CIM_JobSettingData**, CIM_ConcreteJob** job,
                                                       Property<uint32>* return_value) {
-    const Running_Test running;
+    const Waiting_Call waiting(VLNMPCA_DiagnosticTest::static_meta_class);
     return answer_method(*return_value, [&](ProviderAgent& agent) {
         const Operation_Prologue prologue(agent);
-        return run_service(agent, self, *element, running.stop(), *job);
+        return run_service(agent, self, *element, waiting.stop(), *job);
     });
 }
 

@@ -142,9 +142,9 @@ struct Image_File {
     bool fetched = false;
 };
 
-uint32 find_image(const String& uri, Image_File& image) {
+uint32 find_image(const String& uri, const bool& stop, Image_File& image) {
     int error = 0;
-    VLN_MethodWrapper::downloadFileUsingCurl(uri.c_str(), image.name, error, image.fetched);
+    VLN_MethodWrapper::downloadFileUsingCurl(uri.c_str(), stop, image.name, error, image.fetched);
     if (error == 0)
         return look_at_file(image.name.c_str());
     VLN_LOG(VLN_ERR, "ERROR: CURL returned with Error :%d", error);
@@ -269,7 +269,7 @@ const String* asic_of(const Instance_Map<Port>& ports, const String& device_id) 
 } // namespace
 
 uint32 install_from_uri(ProviderAgent& agent, const CIM_ManagedElement* target, const String& uri,
-                        const Array<uint16>& options) {
+                        const Array<uint16>& options, const bool& stop) {
     const Target_Port found = find_target(
         agent, target, "VLNMPCA_SoftwareInstallationService_Provider invalid port passed");
     if (!found.port)
@@ -281,7 +281,7 @@ uint32 install_from_uri(ProviderAgent& agent, const CIM_ManagedElement* target, 
     if (const uint32 failure = check_uri_options(options))
         return failure;
     Image_File image;
-    if (const uint32 failure = find_image(uri, image))
+    if (const uint32 failure = find_image(uri, stop, image))
         return failure;
     return install_image(agent, *found.port, image, options);
 }

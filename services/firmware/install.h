@@ -7,8 +7,9 @@
 
 namespace cimple {
 
+// A fetch from another host is given up when stop goes up.
 uint32 install_from_uri(ProviderAgent& agent, const CIM_ManagedElement* target, const String& uri,
-                        const Array<uint16>& options);
+                        const Array<uint16>& options, const bool& stop);
 uint32 install_from_bytes(ProviderAgent& agent, const CIM_ManagedElement* target,
                           const Array<uint8>& image, const Array<uint16>& options,
                           const Array<String>& values);

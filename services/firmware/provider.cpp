@@ -5,6 +5,7 @@
 #include "services/firmware/install.h"
 #include "services/firmware/port_switches.h"
 #include "services/method_call.h"
+#include "services/waiting_call.h"
 
 namespace cimple {
 
@@ -28,12 +29,18 @@ sint32 answer_call(const Instance* self, Property<uint32>* return_value, Body bo
 
 } // namespace
 
+sint32 Installation_Service_Provider::unload() {
+    Waiting_Call::end_all(Service::static_meta_class);
+    return Pattern_Provider::unload();
+}
+
 sint32 Installation_Service_Provider::InstallFromURI(
     const Service* self, CIM_ConcreteJob**, Property<String>* uri, CIM_ManagedElement** target,
     Property<Array<uint16>>* options, Property<Array<String>>*, Property<uint32>* return_value) {
     VLN_LOG(VLN_DBG, "VLNMPCA_SoftwareInstallationService_Provider::InstallFromURI()");
+    const Waiting_Call waiting(Service::static_meta_class);
     return answer_call(self, return_value, [&](ProviderAgent& agent) {
-        return install_from_uri(agent, *target, uri->value, options->value);
+        return install_from_uri(agent, *target, uri->value, options->value, waiting.stop());
     });
 }
 

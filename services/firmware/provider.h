@@ -8,9 +8,12 @@
 namespace cimple {
 
 // Every method runs to its end in the call: there is no job, and Job stays null. Each holds
-// m_DataMutex through its calls into the library, a download's minutes included.
+// m_DataMutex through its calls into the library, a download's minutes included. An unload cuts a
+// fetch from another host short.
 struct Installation_Service_Provider : Pattern_Provider<VLNMPCA_SoftwareInstallationService> {
     using Service = VLNMPCA_SoftwareInstallationService;
+
+    sint32 unload();
 
     sint32 InstallFromURI(const Service* self, CIM_ConcreteJob** job, Property<String>* uri,
                           CIM_ManagedElement** target, Property<Array<uint16>>* options,

@@ -2,6 +2,7 @@
 
 #include "agent/text.h"
 #include "services/method_call.h"
+#include "services/waiting_call.h"
 
 #include <cstring>
 #include <span>
@@ -17,14 +18,6 @@ constexpr uint32 NAME_MISSING = 32969;
 constexpr char CLASS[] = "VLNMPCA_FCWWNService_Provider::";
 // Logs have been searched for it under this name from the start.
 constexpr char CAPABILITY_CLASS[] = "VLNHBA_FCHBAWWNService_Provider::";
-
-// ---- Calls that wait ----
-
-// Held through each call that may wait for minutes, so that an unload, which cuts the wait short,
-// leaves it the agent to its end: one of them has no lock of the agent's meanwhile.
-constinit Process_Wide<Mutex> waiting_call;
-// Up while an unload wants it over.
-constinit bool end_of_waits = false;
 
 uint32 library_result(AX_STATUS status) {
     return status == AX_STATUS_OK ? uint32{METHOD_DONE} : METHOD_LIBRARY_STATUS + status;
@@ -68,14 +61,6 @@ sint32 run(const VLNMPCA_FCWWNService* self, VLNMPCA_FCPort* const* target,
             return refused;
         return steps(call);
     });
-}
-
-// The same for a call that may wait.
-template <class Steps>
-sint32 run_waiting(const VLNMPCA_FCWWNService* self, VLNMPCA_FCPort* const* target,
-                   Property<uint32>* result, const char* method, Steps steps) {
-    const Auto_Mutex held(*waiting_call);
-    return run(self, target, result, method, steps);
 }
 
 // False, with a line, for a type that the method has no line for; else that line is logged.
@@ -122,13 +107,7 @@ String name_text(const HBA_WWN& name) {
 } // namespace
 
 sint32 WWN_Service_Provider::unload() {
-    raise_flag(end_of_waits);
-    Time::wake();
-    VLN_LOG(VLN_DBG, "%sunload(): ending the calls that wait", CLASS);
-    {
-        const Auto_Mutex no_call(*waiting_call);
-        __atomic_store_n(&end_of_waits, false, __ATOMIC_RELAXED);
-    }
+    Waiting_Call::end_all(Service::static_meta_class);
     return Pattern_Provider::unload();
 }
 
@@ -179,7 +158,8 @@ sint32 WWN_Service_Provider::ChangeWWN(const Service* self, Target_Port target,
                                        Result* result) {
     static constexpr const char* TYPES[] = {"Writing Volatile World Wide Name.",
                                             "Writing Non-Volatile World Wide Name."};
-    return run_waiting(self, target, result, "ChangeWWN", [&](const WWN_Call& call) -> uint32 {
+    const Waiting_Call waiting(Service::static_meta_class);
+    return run(self, target, result, "ChangeWWN", [&](const WWN_Call& call) -> uint32 {
         if (!check_type("ChangeWWN", *type, TYPES))
             return METHOD_INVALID_TARGET;
         HBA_WWN new_wwpn{}, new_wwnn{};
@@ -190,8 +170,8 @@ sint32 WWN_Service_Provider::ChangeWWN(const Service* self, Target_Port target,
             return DUPLICATE_FOUND;
         }
         uint32 word = 0;
-        if (const AX_STATUS status = VLN_MethodWrapper::ChangeWWN(&call.name, &new_wwpn, &new_wwnn,
-                                                                  type->value, &word, end_of_waits))
+        if (const AX_STATUS status = VLN_MethodWrapper::ChangeWWN(
+                &call.name, &new_wwpn, &new_wwnn, type->value, &word, waiting.stop()))
             return library_result(status);
         activation->set(static_cast<uint16>(word));
         call.agent.m_bAdapterRefreshRequested = true;
@@ -207,13 +187,14 @@ sint32 WWN_Service_Provider::RestoreWWN(const Service* self, Target_Port target,
     static constexpr const char* TYPES[] = {"Restoring Factory Default World Wide Name...",
                                             "Restoring Non-volatile World Wide Name..."};
     // The entry's line is that of a reading.
-    return run_waiting(self, target, result, "ReadWWN", [&](const WWN_Call& call) -> uint32 {
+    const Waiting_Call waiting(Service::static_meta_class);
+    return run(self, target, result, "ReadWWN", [&](const WWN_Call& call) -> uint32 {
         if (!check_type("RestoreWWN", *type, TYPES))
             return METHOD_INVALID_TARGET;
         call.prologue.letDataGo();
         uint32 word = 0;
         // A refusal is no failure to the client: it sees that nothing waits for it.
-        if (VLN_MethodWrapper::RestoreWWN(&call.name, type->value, &word, end_of_waits) !=
+        if (VLN_MethodWrapper::RestoreWWN(&call.name, type->value, &word, waiting.stop()) !=
             AX_STATUS_OK)
             return METHOD_DONE;
         activation->set(static_cast<uint16>(word));

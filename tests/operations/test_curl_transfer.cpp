@@ -45,9 +45,10 @@ struct Fetched {
     bool by_curl = false;
 };
 
-Fetched fetch(const std::string& uri) {
+Fetched fetch(const std::string& uri, bool stop = false) {
     Fetched result;
-    VLN_MethodWrapper::downloadFileUsingCurl(uri.c_str(), result.path, result.code, result.by_curl);
+    VLN_MethodWrapper::downloadFileUsingCurl(uri.c_str(), stop, result.path, result.code,
+                                             result.by_curl);
     return result;
 }
 
@@ -103,6 +104,13 @@ protected:
 };
 
 } // namespace
+
+TEST_F(Real_Transfer, AFetchEndsWhenItIsToldTo) {
+    constexpr int STOPPED = 42;
+    const Http_Server server(m_folder / "served");
+    EXPECT_EQ(fetch(server.plain() + "/slow.vfw", true).code, STOPPED);
+    EXPECT_TRUE(has_line(log_capture::take(), "3:download failed 42"));
+}
 
 // Nothing is fetched that lies on the disk, in whatever form it is named.
 TEST_F(Transfer, AFileOfTheDiskIsTakenAsItIs) {
@@ -326,7 +334,7 @@ TEST_F(Played_Transfer, EachUseHasItsNamesModeAndOptions) {
                      "/usr/lib64/libcurl.so.4 lazy", "libcurl.so lazy", "libcurl.so.4 lazy"}));
     EXPECT_EQ(std::exchange(played.options, {}),
               (Lines{"10002=https://host/image.vfw", "20011=*", "10001=*", "10010=*", "64=0",
-                     "81=0", "19=1", "20=120"}));
+                     "81=0", "19=1", "20=120", "20219=*", "10057=*", "43=0"}));
 
     write_file("log.txt", "12345");
     EXPECT_EQ(VLN_MethodWrapper::uploadFileUsingCurl("ftp://me:it@host/", "log.txt"), 0);

@@ -346,7 +346,7 @@ TEST(Diagnostic_Runs, AnUnloadCancelsTheTestThatRuns) {
         });
         sudden_ends::wait_until_held();
         std::thread unloading([&] { EXPECT_TRUE(runs.road.manager().cleanup(true).ok()); });
-        while (runs.road.count_in_log("VLNMPCA_DiagnosticTest_Provider::unload()") == 0)
+        while (runs.road.count_in_log("VLNMPCA_DiagnosticTest_Provider::unload(): ending") == 0)
             std::this_thread::yield();
         vlnsim_clear_faults();
         tester.join();

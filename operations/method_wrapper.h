@@ -84,11 +84,19 @@ public:
                                        AX_iSCSI_SessionList** sessions);
     static AX_STATUS GetiSCSILuns(const HBA_WWN* name, const char* target, AX_iSCSI_LunList** luns);
 
-    // ---- Port speed (phy.cpp) ----
+    // ---- Port speed and PHY (phy.cpp) ----
 
     // How the speed of the physical port is set. What the adapter does not tell is 0 or empty.
     static AX_STATUS GetPhyPortSpeedAttributesValues(const HBA_WWN* name,
                                                      AX_PhyPortSpeed* settings);
+    // speed: one that the port tells, "" where mode leaves it to the adapter. cableLength: metres,
+    // -1 for none.
+    static AX_STATUS SetPhyPortSpeed(const HBA_WWN* name, const char* speed, uint32 mode,
+                                     sint32 cableLength);
+    // The velocity of propagation in the cable, 1 to 100 percent of light's; 1 for another value.
+    static AX_STATUS SetCableNVP(const HBA_WWN* name, uint32 percent);
+    // Has the PHY advertise the rate of that number, 0 to 3; 0 stands for all. 1 for another one.
+    static AX_STATUS SetLineRateAdvertised(const HBA_WWN* name, uint32 rate);
 
     // ---- Firmware (firmware.cpp) ----
 

@@ -1,4 +1,4 @@
-// The speed settings of a physical port.
+// The speed settings of a physical port and of its PHY.
 #include "cimple/guard.h"
 #include "operations/method_wrapper.h"
 
@@ -10,6 +10,12 @@
 namespace cimple {
 
 namespace {
+
+constexpr uint32 FEATURE_CABLE_DIAGNOSTICS = 428;
+constexpr uint32 FEATURE_LINE_RATE = 429;
+constexpr uint32 MIN_NVP = 1; // percent
+constexpr uint32 MAX_NVP = 100;
+constexpr uint32 MAX_LINE_RATE = 3;
 
 struct Number_Row {
     uint16 identifier;
@@ -46,6 +52,18 @@ void readSettings(Attribute_Buffer& buffer, AX_PhyPortSpeed& settings) {
     }
 }
 
+// The status with which a setting ends whose feature the adapter lacks, or can't tell; else 0.
+AX_STATUS test_feature(const HBA_WWN* name, uint32 feature, const char* setting) {
+    uint32 value = 0;
+    AX_STATUS status = AX_GetHBAFeature(wwnOf(name), feature, &value);
+    if (status == AX_STATUS_OK && value == 0)
+        status = AX_STATUS_NOT_SUPPORTED;
+    if (status != AX_STATUS_OK)
+        VLN_OPERATION_FAILED(status, "%s setting is not supported, exited with the error code %d",
+                             setting, static_cast<int>(status));
+    return status;
+}
+
 } // namespace
 
 AX_STATUS VLN_MethodWrapper::GetPhyPortSpeedAttributesValues(const HBA_WWN* name,
@@ -68,6 +86,46 @@ AX_STATUS VLN_MethodWrapper::GetPhyPortSpeedAttributesValues(const HBA_WWN* name
         return status;
     VLN_LOG(VLN_ERR, "Unable to allocate the memory for the port attributes");
     return AX_STATUS_ERROR;
+}
+
+AX_STATUS VLN_MethodWrapper::SetPhyPortSpeed(const HBA_WWN* name, const char* speed, uint32 mode,
+                                             sint32 cableLength) {
+    Operation_Frame frame("VLN_MethodWrapper::SetPhyPortSpeed");
+    if (!frame.given(speed))
+        return frame.status();
+    const AX_STATUS status = AX_SetPhyPortSpeedSettings(wwnOf(name), speed, mode, cableLength);
+    if (status != AX_STATUS_OK)
+        VLN_OPERATION_FAILED(status, "SetPhyPortSpeed exited with the error code %d", status);
+    return status;
+}
+
+AX_STATUS VLN_MethodWrapper::SetCableNVP(const HBA_WWN* name, uint32 percent) {
+    Operation_Frame frame("VLN_MethodWrapper::SetCableNVP");
+    if (percent < MIN_NVP || percent > MAX_NVP) {
+        VLN_LOG(VLN_ERR, "Invalid CableNVP value, Vaild value b/n 1 - 100");
+        return AX_STATUS_ERROR;
+    }
+    if (const AX_STATUS status = test_feature(name, FEATURE_CABLE_DIAGNOSTICS, "SetCableNVP"))
+        return status;
+    const AX_STATUS status = AX_DiagSetNVP(wwnOf(name), percent);
+    if (status != AX_STATUS_OK)
+        VLN_OPERATION_FAILED(status, "SetCableNVP exited with the error code %d", status);
+    return status;
+}
+
+AX_STATUS VLN_MethodWrapper::SetLineRateAdvertised(const HBA_WWN* name, uint32 rate) {
+    Operation_Frame frame("VLN_MethodWrapper::SetLineRateAdvertised");
+    if (rate > MAX_LINE_RATE) {
+        VLN_LOG(VLN_ERR, "Invalid Line Rate Passed");
+        return AX_STATUS_ERROR;
+    }
+    if (const AX_STATUS status = test_feature(name, FEATURE_LINE_RATE, "LineRateAdvertised"))
+        return status;
+    const AX_STATUS status =
+        AX_SetAdapterAttribute(wwnOf(name), AX_PA_LINE_RATE_ADVERTISED, &rate, sizeof rate);
+    if (status != AX_STATUS_OK)
+        VLN_OPERATION_FAILED(status, "SetLineRateAdvertised exited with the error code %d", status);
+    return status;
 }
 
 } // namespace cimple

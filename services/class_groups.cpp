@@ -9,6 +9,7 @@
 #include "services/dump/instances.h"
 #include "services/fip/instances.h"
 #include "services/firmware/instances.h"
+#include "services/phy/instances.h"
 #include "services/record_logs/instances.h"
 #include "services/wwn/instances.h"
 
@@ -23,6 +24,12 @@ constexpr Class_Group GROUPS[] = {
     {.place = NIC_CARDS,
      .create = StartSoftwareInstallationService,
      .failed = {VLN_CRIT, "StartSoftwareInstallationService failed"}},
+    {.place = NIC_PORTS,
+     .create = create_phys,
+     .clear = clear_phys,
+     .done = {VLN_DBG, "10GBaseT feature classes created Successfully"},
+     .failed = {VLN_DBG, "10GBaseT feature is either Not Supported/Failed to Create the feature"},
+     .thrown = {VLN_ERR, "Exception in 10GBaseT class creation"}},
     {.place = NIC,
      .create = create_nic_bridging,
      .clear = clear_bridging,

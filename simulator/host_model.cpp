@@ -6,12 +6,31 @@
 
 namespace vlnsim {
 
+namespace {
+
+template <class Number>
+Attribute attribute_of(Number number) {
+    Bytes bytes(sizeof number);
+    std::memcpy(bytes.data(), &number, sizeof number);
+    return Attribute::of_bytes(std::move(bytes));
+}
+
+template <class Number>
+Number number_of(const Attribute& attribute) {
+    Number number = 0;
+    if (attribute.length >= sizeof number)
+        std::memcpy(&number, attribute.bytes.data(), sizeof number);
+    return number;
+}
+
+} // namespace
+
 Attribute Attribute::of_number(std::uint32_t number) {
-    Attribute attribute;
-    attribute.bytes.resize(sizeof number);
-    std::memcpy(attribute.bytes.data(), &number, sizeof number);
-    attribute.length = sizeof number;
-    return attribute;
+    return attribute_of(number);
+}
+
+Attribute Attribute::of_wide(std::uint64_t number) {
+    return attribute_of(number);
 }
 
 Attribute Attribute::of_text(const std::string& text) {
@@ -30,10 +49,11 @@ Attribute Attribute::of_bytes(Bytes bytes) {
 }
 
 std::uint32_t Attribute::number() const {
-    std::uint32_t number = 0;
-    if (length >= sizeof number)
-        std::memcpy(&number, bytes.data(), sizeof number);
-    return number;
+    return number_of<std::uint32_t>(*this);
+}
+
+std::uint64_t Attribute::wide() const {
+    return number_of<std::uint64_t>(*this);
 }
 
 std::string Attribute::text() const {

@@ -26,10 +26,12 @@ struct Attribute {
     std::uint16_t length = 0;
 
     static Attribute of_number(std::uint32_t number);
+    static Attribute of_wide(std::uint64_t number);
     static Attribute of_text(const std::string& text);
     static Attribute of_bytes(Bytes bytes);
 
     std::uint32_t number() const; // 0 for anything shorter
+    std::uint64_t wide() const;   // the same
     std::string text() const;
 };
 using Attribute_Map = std::map<std::uint16_t, Attribute>;

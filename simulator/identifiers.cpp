@@ -8,6 +8,7 @@ namespace vlnsim {
 namespace {
 
 constexpr auto number = Attribute_Kind::number;
+constexpr auto wide = Attribute_Kind::wide;
 constexpr auto text = Attribute_Kind::text;
 constexpr auto bytes = Attribute_Kind::bytes;
 
@@ -112,9 +113,28 @@ constexpr Identifier port_table[] = {
     {821, text, "VNICMinBandwidth"},
     {822, text, "VNICMaxBandwidth"},
     {823, number, "PFCThrottle"},
-    {825, text, "LineRateAdvertised"},
+    {824, number, "AutoNegStatus"},
+    {825, number, "LineRateAdvertised"},
+    {826, number, "OnLineEstimation"},
+    {827, number, "PhyTemp"},
+    {828, number, "Pair-A-SNR"},
+    {829, number, "Pair-B-SNR"},
+    {830, number, "Pair-C-SNR"},
+    {831, number, "Pair-D-SNR"},
+    {832, wide, "TimeSinceLink"},
+    {833, number, "PairA-AvgMSE"},
+    {834, number, "PairB-AvgMSE"},
+    {835, number, "PairC-AvgMSE"},
+    {836, number, "PairD-AvgMSE"},
+    {837, wide, "LDPCErrs"},
+    {838, wide, "PHYCRCErrs"},
+    {839, number, "CableNVP"},
+    {840, number, "AutoNegEnable"},
+    {841, number, "LinkPartnerAutoNeg"},
     {842, number, "PhysicalPortSpeed"},
     {843, text, "GatewayAddress"},
+    {845, text, "PHYConfigID"},
+    {846, text, "PHYFirmwareRev"},
     {847, number, "InterfaceType"},
     {848, text, "AutoNegSupportedSpeeds"},
     {849, text, "ForceSupportedSpeeds"},
@@ -157,6 +177,11 @@ constexpr Identifier statistic_table[] = {
     {1057, number, "ArbitrationTimeouts"},
     {1058, number, "LinkTransitions"},
     {1059, number, "Counter1059"},
+    {1060, number, "MDI_PLLEvents"},
+    {1061, number, "MDI_LinkUpTime"},
+    {1062, number, "EMI10GEvents"},
+    {1063, number, "PHYFrames"},
+    {1064, number, "MDI_CRC8Errors"},
 };
 
 constexpr Identifier feature_table[] = {

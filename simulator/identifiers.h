@@ -9,7 +9,7 @@
 
 namespace vlnsim {
 
-enum class Attribute_Kind { number, text, bytes };
+enum class Attribute_Kind { number, wide, text, bytes }; // wide: a number of 64 bits
 
 struct Identifier {
     std::uint16_t number;

@@ -2,6 +2,7 @@
 #include "simulator/attribute_buffer.h"
 #include "simulator/call.h"
 #include "simulator/identifiers.h"
+#include "simulator/physical_port.h"
 
 #include <cstring>
 
@@ -201,6 +202,8 @@ AX_STATUS AX_SetAdapterAttribute(AX_WWN wwn, uint32_t identifier, const void* va
             const auto* bytes = static_cast<const std::uint8_t*>(value);
             if (identifier > 0xFFFF || length >= 0xFFFF)
                 return AX_STATUS_INVALID_ARGUMENT;
+            if (identifier == AX_PA_LINE_RATE_ADVERTISED)
+                return set_line_rate(call.host, *function, Bytes(bytes, bytes + length));
             Attribute attribute = Attribute::of_bytes(Bytes(bytes, bytes + length));
             if (length != sizeof(std::uint32_t))
                 attribute.bytes.push_back(0); // whoever reads a text back may look for its end
@@ -226,28 +229,6 @@ AX_STATUS AX_GetDriverType(AX_WWN wwn, uint32_t* type) {
             return AX_STATUS_OK;
         },
         wwn);
-}
-
-AX_STATUS AX_SetPhyPortSpeedSettings(AX_WWN wwn, const char* speed, uint32_t mode,
-                                     int32_t cableLength) {
-    return answer<AX_STATUS>(
-        Entry::AX_SetPhyPortSpeedSettings,
-        [&](Call& call) -> AX_STATUS {
-            if (call.null(speed, "speed"))
-                return AX_STATUS_INVALID_ARGUMENT;
-            Function* function = call.function(wwn);
-            if (!function)
-                return AX_STATUS_ILLEGAL_WWN;
-            if (!function->port_attributes.count(AX_PA_PORT_SPEED_MODE))
-                return AX_STATUS_NOT_SUPPORTED;
-            set_attribute(*function, AX_PA_CONFIGURED_PORT_SPEED, Attribute::of_text(speed));
-            set_attribute(*function, AX_PA_PORT_SPEED_MODE, Attribute::of_number(mode));
-            if (cableLength >= 0)
-                set_attribute(*function, AX_PA_DAC_CABLE_LENGTH,
-                              Attribute::of_number(static_cast<std::uint32_t>(cableLength)));
-            return AX_STATUS_OK;
-        },
-        wwn, speed, mode, cableLength);
 }
 
 } // namespace vlnsim::library

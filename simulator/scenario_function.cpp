@@ -327,6 +327,8 @@ Attribute read_attribute(const Node& value, const Identifier* identifier) {
                                                                 : Attribute_Kind::text;
     if (kind == Attribute_Kind::number)
         return Attribute::of_number(value.number32());
+    if (kind == Attribute_Kind::wide)
+        return Attribute::of_wide(value.number());
     if (kind == Attribute_Kind::bytes)
         return Attribute::of_bytes(value.bytes());
     if (value.text().size() > max_attribute)

@@ -165,6 +165,8 @@ Json attribute_to_json(const Attribute& attribute, const Identifier* identifier)
                                                 : Attribute_Kind::bytes;
     if (kind == Attribute_Kind::number && attribute.bytes.size() == sizeof(std::uint32_t))
         return attribute.number();
+    if (kind == Attribute_Kind::wide && attribute.bytes.size() == sizeof(std::uint64_t))
+        return attribute.wide();
     if (kind == Attribute_Kind::text && ends_with_nul)
         return text_or_bytes({attribute.bytes.begin(), attribute.bytes.end() - 1}, attribute.bytes);
     return {{"bytes", hexadecimal(attribute.bytes.data(), attribute.bytes.size())}};

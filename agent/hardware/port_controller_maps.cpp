@@ -4,6 +4,7 @@
 #include "agent/associations.h"
 #include "agent/hardware/physical_port.h"
 #include "agent/hardware/port_name.h"
+#include "agent/hardware/port_speed.h"
 #include "agent/profiles/profile_maps.h"
 #include "agent/state_tables.h"
 #include "agent/text.h"
@@ -54,12 +55,7 @@ void read_port_speed(VLNMPCA_PortController& controller, const String& port_name
     if (!port_name_to_wwn(port_name, wwn) ||
         VLN_MethodWrapper::GetPhyPortSpeedAttributesValues(&wwn, &settings) != AX_STATUS_OK)
         return;
-    controller.InterfaceType.set(settings.interfaceType);
-    controller.AutoNegSupportedSpeeds.set(text(settings.autoNegSupportedSpeeds));
-    controller.ForceSupportedSpeeds.set(text(settings.forceSupportedSpeeds));
-    controller.ConfiguredPortSpeed.set(text(settings.configuredPortSpeed));
-    controller.PortSpeedMode.set(static_cast<uint16>(settings.portSpeedMode));
-    controller.DACCableLength.set(settings.dacCableLength);
+    set_port_speed(controller, settings);
 }
 
 } // namespace

@@ -1,6 +1,7 @@
 #include "services/diagnostics/test_provider.h"
 
 #include "agent/gates.h"
+#include "agent/hardware/port_identity.h"
 #include "agent/store_search.h"
 #include "agent/text.h"
 #include "classes/VLNMPCA_PHYPhysicalComponentData.h"
@@ -49,9 +50,12 @@ uint32 check_cable(const Test_Run& run) {
     if (ISDiagTestSupported(device_id, run.row.type) != 0)
         return refuse(INVALID_ARGUMENT,
                       "Invalid ManagedElement/Test not supported for this element");
+    const String* physical_port = port_identity(*run.port, IDENTITY_PHYSICAL_PORT);
     const auto* phy =
         find_first(run.agent.m_VLNMPCA_PHYPhysicalComponentData_map,
-                   [&](const auto& data) { return data.Description.value == device_id; });
+                   [&](const VLNMPCA_PHYPhysicalComponentData& data) {
+                       return physical_port && data.Description.value == *physical_port;
+                   });
     if (phy)
         VLN_LOG(VLN_INFO, "The Current CableNVP value : %u",
                 static_cast<unsigned>(phy->CableNVP.value));

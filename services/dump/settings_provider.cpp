@@ -1,35 +1,16 @@
 #include "services/dump/settings_provider.h"
 
-#include "agent/gates.h"
 #include "agent/hardware/port_name.h"
 #include "agent/text.h"
-#include "cimple/guard.h"
 #include "services/dump/instances.h"
 #include "services/dump/trace_levels.h"
+#include "services/method_call.h"
 
 #include <algorithm>
 
 namespace cimple {
 
 namespace {
-
-template <class Modify>
-sint32 run_modify(Modify modify) {
-    ProviderAgent* agent = ProviderAgent::current();
-    if (!agent)
-        return MODIFY_INSTANCE_FAILED;
-    sint32 status = MODIFY_INSTANCE_FAILED;
-    const bool complete = run_guarded([&] {
-        const Operation_Prologue prologue(*agent);
-        status = modify(*agent);
-    });
-    return complete ? status : MODIFY_INSTANCE_FAILED;
-}
-
-sint32 refuse(sint32 status, const char* line) {
-    VLN_LOG(VLN_ERR, "%s", line);
-    return status;
-}
 
 // The name by which the library knows the chip; false, with a line, for a chip without a port.
 bool find_adapter(const ProviderAgent& agent, const String& chip, HBA_WWN& name) {
@@ -46,7 +27,7 @@ sint32 set_retention_count(ProviderAgent& agent, const VLNMPCA_ExtFATDumpData& f
                            const HBA_WWN& name, uint32 count) {
     if (found.RetentionCount.value != count &&
         VLN_MethodWrapper::vlncimSetRetentionCount(&name, count) != AX_STATUS_OK)
-        return refuse(MODIFY_INSTANCE_NOT_FOUND, "Failed to set the Retention count");
+        return refuse_modify(MODIFY_INSTANCE_NOT_FOUND, "Failed to set the Retention count");
     change(agent.m_VLNMPCA_ExtFATDumpData_map, &found,
            [count](VLNMPCA_ExtFATDumpData& data) { data.RetentionCount.set(count); });
     return MODIFY_INSTANCE_OK;
@@ -55,11 +36,12 @@ sint32 set_retention_count(ProviderAgent& agent, const VLNMPCA_ExtFATDumpData& f
 sint32 modify_dump_data(ProviderAgent& agent, const VLNMPCA_ExtFATDumpData* model,
                         const VLNMPCA_ExtFATDumpData* instance) {
     if (!model || !instance)
-        return refuse(MODIFY_INSTANCE_FAILED,
-                      "VLNMPCA_ExtFATDumpData::modify_instance invalid parameter");
+        return refuse_modify(MODIFY_INSTANCE_FAILED,
+                             "VLNMPCA_ExtFATDumpData::modify_instance invalid parameter");
     const auto* found = agent.m_VLNMPCA_ExtFATDumpData_map.lookup(model);
     if (!found)
-        return refuse(MODIFY_INSTANCE_NOT_FOUND, "Invalid instance of VLNMPCA_ExtFATDumpData");
+        return refuse_modify(MODIFY_INSTANCE_NOT_FOUND,
+                             "Invalid instance of VLNMPCA_ExtFATDumpData");
     const String chip = chip_of_setting(agent.m_VLNMPCA_ElementExtFATDumpData_map, *found);
     HBA_WWN name{};
     if (!find_adapter(agent, chip, name))
@@ -72,14 +54,14 @@ sint32 modify_dump_data(ProviderAgent& agent, const VLNMPCA_ExtFATDumpData* mode
     if (!directory.is_null())
         VLN_LOG(VLN_DBG, "Input DumpDirectory %s", directory.value.c_str());
     if (count.is_null() && directory.is_null())
-        return refuse(MODIFY_INSTANCE_FAILED, "Error: No Modifiable parameter specified");
+        return refuse_modify(MODIFY_INSTANCE_FAILED, "Error: No Modifiable parameter specified");
     if (!count.is_null())
         if (const sint32 status = set_retention_count(agent, *found, name, count.value))
             return status;
     if (directory.is_null())
         return MODIFY_INSTANCE_OK;
-    return refuse(MODIFY_INSTANCE_UNSUPPORTED,
-                  "Setting DumpDirectory is not supported on this platform.");
+    return refuse_modify(MODIFY_INSTANCE_UNSUPPORTED,
+                         "Setting DumpDirectory is not supported on this platform.");
 }
 
 // ---- Traces ----
@@ -157,16 +139,16 @@ bool set_modes(const HBA_WWN& name, const AX_EventLogModule& module, const Wante
 
 sint32 modify_advanced_data(ProviderAgent& agent, const VLNMPCA_ExtFATDumpAdvancedData* model) {
     if (!model)
-        return refuse(MODIFY_INSTANCE_FAILED,
-                      "VLNMPCA_ExtFATDumpAdvancedData::modify_instance invalid parameter");
+        return refuse_modify(MODIFY_INSTANCE_FAILED,
+                             "VLNMPCA_ExtFATDumpAdvancedData::modify_instance invalid parameter");
     auto& store = agent.m_VLNMPCA_ExtFATDumpAdvancedData_map;
     const auto* found = store.lookup(model);
     if (!found)
-        return refuse(MODIFY_INSTANCE_NOT_FOUND,
-                      "Invalid instance of VLNMPCA_ExtFATDumpAdvancedData");
+        return refuse_modify(MODIFY_INSTANCE_NOT_FOUND,
+                             "Invalid instance of VLNMPCA_ExtFATDumpAdvancedData");
     Wanted_Modes wanted;
     if (const char* broken = read_wanted(*model, wanted))
-        return refuse(MODIFY_INSTANCE_FAILED, broken);
+        return refuse_modify(MODIFY_INSTANCE_FAILED, broken);
     const String chip = chip_of_setting(agent.m_VLNMPCA_ElementExtFATDumpAdvancedData_map, *found);
     HBA_WWN name{};
     if (!find_adapter(agent, chip, name))
@@ -192,13 +174,13 @@ sint32 modify_advanced_data(ProviderAgent& agent, const VLNMPCA_ExtFATDumpAdvanc
 
 sint32 Dump_Data_Provider::modify_instance(const VLNMPCA_ExtFATDumpData* model,
                                            const VLNMPCA_ExtFATDumpData* instance) {
-    return run_modify(
+    return answer_modify(
         [&](ProviderAgent& agent) { return modify_dump_data(agent, model, instance); });
 }
 
 sint32 Advanced_Dump_Data_Provider::modify_instance(const VLNMPCA_ExtFATDumpAdvancedData* model,
                                                     const VLNMPCA_ExtFATDumpAdvancedData*) {
-    return run_modify([&](ProviderAgent& agent) { return modify_advanced_data(agent, model); });
+    return answer_modify([&](ProviderAgent& agent) { return modify_advanced_data(agent, model); });
 }
 
 } // namespace cimple

@@ -17,7 +17,8 @@ namespace {
 
 // The two-port card with two units behind each FCoE and each iSCSI port.
 const std::string SCENARIO = R"({"include": ")" VLN_SCENARIOS R"(/parts/cna.json",
-    "cards": [{"use": "cna", "ports": 2, "functions": [{"use": "nic"},
+    "cards": [{"use": "cna", "features": {"Feature10GBaseT": 1, "Counters10GBaseT": 1},
+        "ports": 2, "functions": [{"use": "nic"},
         {"use": "iscsi", "iscsiTargets": {"name": "iqn.2010-04.com.example:t-{port}", "luns": 2,
             "sessions": {"targetPortal": "198.51.100.20{port}"}}},
         {"use": "fcoe", "targets": {"luns": 2, "wwpn": "50:25:64:C{port}:00:00:00:{target:02X}"}}]}]})";
@@ -247,7 +248,8 @@ TEST_F(Sweep, EachCallFailsWithEachStatus) {
         for (const std::uint64_t status : {1u, 7u, 190u, 255u}) {
             // A handle is no status: an adapter that can't be opened has none.
             Fault fault{function, call, VLNSIM_STATUS, function == "HBA_OpenAdapter" ? 0 : status};
-            fault.times = status == 7 ? 2 : 1;
+            // Nobody repeats a question for a feature: the next one is another port's.
+            fault.times = status == 7 && function != "AX_GetHBAFeature" ? 2 : 1;
             fault.line = line;
             expect_the_rest(fault, [&](const std::string& path) {
                 return depends(path, function, calls_of(function, call, fault.times));

@@ -1,6 +1,7 @@
 // The dump service and its settings, as a client calls them.
 #include "tests/hostile/sudden_ends.h"
 #include "tests/road/properties.h"
+#include "tests/services/changes.h"
 
 #include <fstream>
 
@@ -11,6 +12,8 @@ using road::expect_properties;
 using road::find;
 using road::Road;
 using road::text_of;
+using services::Change;
+using services::Fault;
 
 namespace {
 
@@ -34,11 +37,6 @@ Value numbers(std::initializer_list<std::uint32_t> values) {
         elements.push_back(Value::unsigned_number(CMPI_uint32, value));
     return Value::array(CMPI_uint32, std::move(elements));
 }
-
-struct Fault {
-    const char* function = nullptr;
-    std::uint64_t status = 0;
-};
 
 struct Row {
     const char* method;
@@ -302,30 +300,10 @@ TEST_F(Dump, TraceLevelsAreSetForAllModulesAndReadBack) {
     EXPECT_EQ(road.count_in_log("Failed to get the Retention Count"), 1u);
 }
 
-struct Change {
-    Named_Values values;
-    CMPIrc status;
-    const char* line;
-    Fault fault = {};
-};
-
 class Dump_Settings : public Dump {
 protected:
     void expect_changes(const host::Instance& instance, std::initializer_list<Change> changes) {
-        for (const Change& change : changes) {
-            host::Instance changed = instance;
-            std::vector<std::string> names;
-            for (const host::Named_Value& each : change.values) {
-                host::set(changed.properties, each.name, each.value);
-                names.push_back(each.name);
-            }
-            if (change.fault.function)
-                vlnsim_fault(change.fault.function, 1, VLNSIM_STATUS, change.fault.status);
-            const std::size_t before = road.log_text().size();
-            EXPECT_EQ(road.manager().modify(changed, names).rc, change.status) << change.line;
-            EXPECT_NE(road.log_text().find(change.line, before), std::string::npos) << change.line;
-            vlnsim_clear_faults();
-        }
+        services::expect_changes(road, instance, changes);
     }
 };
 

@@ -4,6 +4,8 @@
 //   bench_host refresh FACTOR                prints instances made, microseconds of each refresh
 //   bench_host latency FACTOR                prints median, 99 % and longest, in microseconds
 //   bench_host memory FACTOR                 prints bytes taken per instance
+//   bench_host virtual FUNCTIONS             one refresh of another host: 16 ports with so many
+//                                            virtual functions each; prints instances made
 //
 // FACTOR multiplies the cards. What callgrind is to count stands in functions of its own.
 #include "bench/bench_hooks.h"
@@ -36,6 +38,13 @@ std::string scenario(unsigned factor) {
     if (replaced != 2)
         fail("the scenario has another form than expected");
     return text;
+}
+
+std::string virtual_functions(unsigned count) {
+    return R"({"include": "parts/cna.json", "cards": [{"use": "cna", "count": 8, "ports": 2,
+        "functions": [{"use": "nic", "portAttributes": {"SRIOVState": 1},
+                       "virtualFunctions": {"count": )" +
+           std::to_string(count) + "}}]}]}";
 }
 
 bool refresh() {
@@ -86,6 +95,12 @@ void walk(host::Manager& manager, bool names) {
     std::printf("%zu %zu\n", sources.size(), vln_measured(manager, sources, names));
 }
 
+void refresh_once() {
+    if (!refresh())
+        fail("no refresh was due");
+    std::printf("%u\n", stored_instances(false));
+}
+
 void time_refreshes() {
     constexpr int REFRESHES = 20;
     if (!refresh())
@@ -131,9 +146,11 @@ void measure_memory(host::Manager& manager, std::size_t before) {
 int main(int argc, char** argv) {
     const std::string mode = argc > 1 ? argv[1] : "";
     if (argc != (mode == "walk" ? 4 : 3))
-        fail("usage: bench_host walk names|instances FACTOR, or refresh|latency|memory FACTOR");
+        fail("usage: bench_host walk names|instances FACTOR, or refresh|latency|memory FACTOR, or "
+             "virtual FUNCTIONS");
     mallopt(M_ARENA_MAX, 1); // all threads' memory in one count
-    simulate(scenario(static_cast<unsigned>(std::strtoul(argv[argc - 1], nullptr, 10))));
+    const auto number = static_cast<unsigned>(std::strtoul(argv[argc - 1], nullptr, 10));
+    simulate(mode == "virtual" ? virtual_functions(number) : scenario(number));
     host::Options options;
     options.strict = false;
     host::Manager manager(options);
@@ -151,6 +168,8 @@ int main(int argc, char** argv) {
         walk(manager, std::string(argv[2]) == "names");
     else if (mode == "refresh")
         time_refreshes();
+    else if (mode == "virtual")
+        refresh_once();
     else if (mode == "latency")
         measure_latency(manager);
     else

@@ -87,17 +87,20 @@ done
 
 # Of a refresh only the instructions of the module itself count, whoever called: what the C library does
 # for it differs between machines (its string functions, the state of the heap). How often a pass ran
-# is read from the same file.
-count "--toggle-collect=cimple::ProviderAgent::rebuildAdapterData()
-       --toggle-collect=cimple::ProviderAgent::rebuildAdapterMaps(*) --compress-strings=no" \
-    "$host" refresh 1 >"$work/all"
+# is read from the same file. "own passes", and what all libraries took in $work/all.
+refreshes() { # BENCH_HOST'S ARGUMENTS
+    count "--toggle-collect=cimple::ProviderAgent::rebuildAdapterData()
+           --toggle-collect=cimple::ProviderAgent::rebuildAdapterMaps(*) --compress-strings=no" \
+        "$host" "$@" >"$work/all"
+    awk '
+        /^ob=/ { ours = /vln_bench_module/ }
+        /^cfn=/ { of_a_pass = /rebuildAdapterMaps\([^()]*\)$/ }
+        /^calls=/ { if (of_a_pass) { sub("calls=", ""); passes += $1 } getline; next }
+        ours && /^[-+*0-9]/ { own += $2 }
+        END { printf "%.0f %d\n", own, passes }' "$work/out"
+}
+read -r own passes <<<"$(refreshes refresh 1)"
 read -r made _ <"$work/result"
-read -r own passes <<<"$(awk '
-    /^ob=/ { ours = /vln_bench_module/ }
-    /^cfn=/ { of_a_pass = /rebuildAdapterMaps\([^()]*\)$/ }
-    /^calls=/ { if (of_a_pass) { sub("calls=", ""); passes += $1 } getline; next }
-    ours && /^[-+*0-9]/ { own += $2 }
-    END { printf "%.0f %d", own, passes }' "$work/out")"
 [ "$passes" -gt 0 ] || { echo "bench: no adapter pass was seen; have its functions other names?" >&2; exit 1; }
 read -r _ time <<<"$("$host" refresh 1)"
 echo
@@ -110,6 +113,19 @@ read -r median most longest <<<"$("$host" latency 1)"
 printf 'An enumeration of VLNMPCA_EthernetPort while refreshes run: median %d us, 99 %% %d us, longest %d us\n' \
     "$median" "$most" "$longest"
 printf 'memory: %d bytes per instance, the model of the devices included\n' "$("$host" memory 1)"
+
+echo
+echo "An adapter refresh of 16 ports with virtual functions, of the module itself"
+printf '%9s %10s %14s %30s\n' 'functions' instances instructions 'to half the functions, at most 2.3'
+former=
+for functions in 16 32 64; do
+    read -r own passes <<<"$(refreshes virtual $functions)"
+    read -r made _ <"$work/result"
+    own=$((own / passes))
+    printf '%9s %10d %14d %30s\n' "16 x $functions" "$made" $own \
+        "$([ -z "$former" ] || awk "BEGIN { printf \"%.2f\", $own / $former }")"
+    former=$own
+done
 
 san="$build/bin/bench_san"
 pass="--toggle-collect=cimple::ProviderAgent::runSANPass()

@@ -115,6 +115,28 @@ public:
     // multichannel does.
     static AX_STATUS SetSRIOVEnabledState(const HBA_WWN* name, uint32 state);
 
+    // ---- Network boot and quality of service (nic_settings.cpp) ----
+
+    // How an adapter boots over the network.
+    enum Boot_Method : uint32 { BOOT_UNKNOWN = 0, BOOT_PXE = 1, BOOT_IBFT = 2, BOOT_NONE = 3 };
+    // hasSeveral: iBFT is offered beside PXE. state: 1 on, 0 off.
+    static AX_STATUS GetNICNetworkBootParams(const HBA_WWN* name, Boot_Method* method,
+                                             bool* hasSeveral, uint32* state);
+    // control: "E" to switch the boot on, with that method, "D" to switch it off; 1 for another
+    // word. An adapter that does not tell its method has its boot code switched.
+    static AX_STATUS SetNICNetworkBootParams(const HBA_WWN* name, const char* control,
+                                             Boot_Method method);
+    // What the function of the kind that qos tells is limited to. 1 beyond what that kind takes.
+    static AX_STATUS SetQOSParams(const HBA_WWN* name, const AX_QoS* qos);
+    static AX_STATUS GetQosInfo(const HBA_WWN* name, AX_QoS* qos);
+
+    // ---- Virtual functions (virtual_functions.cpp) ----
+
+    // The names of the virtual functions of a port.
+    static AX_STATUS GetVirtualFuncList(const HBA_WWN* name, std::vector<AX_NAME>* functions);
+    static AX_STATUS GetVirtualFuncPropertyList(const HBA_WWN* name, const AX_NAME& function,
+                                                AX_VirtualFunctionProperties* properties);
+
     // ---- Driver parameters (driver_parameters.cpp) ----
 
     // What the driver is set to: for the port with that device identifier or, global, for all of

@@ -9,6 +9,8 @@
 #include "services/dump/instances.h"
 #include "services/fip/instances.h"
 #include "services/firmware/instances.h"
+#include "services/nic_settings/instances.h"
+#include "services/nic_settings/virtual_functions.h"
 #include "services/phy/instances.h"
 #include "services/record_logs/instances.h"
 #include "services/wwn/instances.h"
@@ -30,6 +32,12 @@ constexpr Class_Group GROUPS[] = {
      .done = {VLN_DBG, "10GBaseT feature classes created Successfully"},
      .failed = {VLN_DBG, "10GBaseT feature is either Not Supported/Failed to Create the feature"},
      .thrown = {VLN_ERR, "Exception in 10GBaseT class creation"}},
+    {.place = NIC,
+     .create = create_nic_settings,
+     .clear = clear_nic_settings,
+     .done = {VLN_INFO, "NIC Setting Service classes are successfully created"},
+     .failed = {VLN_INFO, "Issue with NIC Setting Service classes"},
+     .thrown = {VLN_ERR, "----- unknown exception ------ "}},
     {.place = NIC,
      .create = create_nic_bridging,
      .clear = clear_bridging,
@@ -66,6 +74,12 @@ constexpr Class_Group GROUPS[] = {
      .clear = clear_diagnostic_classes,
      .before = {VLN_DBG, "Create the Diagnostic classes"},
      .thrown = {VLN_DBG, "Dignostic Test creation failed"}},
+    {.place = CLOSING,
+     .create = create_virtual_functions,
+     .clear = clear_virtual_functions,
+     .before = {VLN_DBG, "Creating CreateNICSrIovClasses "},
+     .failed = {VLN_DBG, "SR-IOV classes are not created"},
+     .thrown = {VLN_ERR, "CreateNICSrIovClasses Failed"}},
 };
 
 } // namespace

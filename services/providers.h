@@ -12,6 +12,7 @@
 #include "services/dump/settings_provider.h"
 #include "services/fip/provider.h"
 #include "services/firmware/provider.h"
+#include "services/nic_settings/provider.h"
 #include "services/phy/provider.h"
 #include "services/profiles/provider.h"
 #include "services/wwn/provider.h"

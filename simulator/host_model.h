@@ -149,6 +149,11 @@ struct Name_Management {
     std::uint32_t busy = 0; // calls that change names and are answered "in progress" yet
 };
 
+struct Virtual_Function {
+    std::uint64_t name = 0;
+    AX_VirtualFunctionProperties properties{};
+};
+
 // A feature's answer: a value, or a status alone.
 struct Feature {
     std::uint32_t value = 0;
@@ -221,6 +226,8 @@ struct Function {
     std::optional<Name_Pair> volatile_names;
     std::vector<std::uint64_t> former_wwpns; // by which callers may still know it
     std::vector<AX_VPort> virtual_ports;
+    std::optional<AX_QoS> qos; // its kind is a set call's
+    std::vector<Virtual_Function> virtual_functions;
 
     std::optional<std::string> hba_name; // the adapter's name in the HBA API, which then knows it
     std::uint32_t hba_ports = 1;

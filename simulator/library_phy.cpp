@@ -29,11 +29,6 @@ std::string text_of(const Function& function, std::uint16_t identifier) {
     return found == function.port_attributes.end() ? "" : found->second.text();
 }
 
-std::uint32_t port_number(const Function& function) {
-    const auto found = function.adapter_attributes.find(adapter_port_number);
-    return found == function.adapter_attributes.end() ? 0 : found->second.number();
-}
-
 // Whether the speed is one of a list with commas between.
 bool is_listed(const std::string& list, const std::string& speed) {
     return !speed.empty() && ("," + list + ",").find("," + speed + ",") != std::string::npos;
@@ -64,8 +59,7 @@ bool offers(const Function& function, std::uint32_t feature) {
 void set_on_port(Host& host, const Function& function, std::uint16_t identifier,
                  const Attribute& attribute) {
     for (Function& each : host.functions)
-        if (each.card == function.card && port_number(each) == port_number(function) &&
-            each.port_attributes.count(identifier))
+        if (each.shares_port(function) && each.port_attributes.count(identifier))
             each.port_attributes[identifier] = attribute;
 }
 

@@ -75,6 +75,9 @@ Diagnostics read_diagnostics(const Node& values);
 void set_diagnostic(Diagnostics& diagnostics, const std::string& name, const Node& value);
 std::vector<std::pair<std::string_view, std::uint32_t>> list_diagnostics(Diagnostics diagnostics);
 void read_bridging(const Node& values, Function& function);
+AX_QoS read_qos(const Node& values);
+// The virtual functions of a function; its names and its PCI registers have been read.
+std::vector<Virtual_Function> read_virtual_functions(const Node& values, const Function& function);
 
 // The targets that an iSCSI function sees; its initiator and network records have been read.
 std::vector<iSCSI_Target> read_iscsi_targets(const Node& values, const Function& function);

@@ -175,6 +175,8 @@ void read_records(const Node& values, Function& function) {
         read_name_management(*node, function);
     if (const auto node = values.member("virtualPorts"))
         function.virtual_ports = read_virtual_ports(*node);
+    if (const auto node = values.member("qos"))
+        function.qos = read_qos(*node);
     if (const auto node = values.member("pci")) {
         function.pci = read_pci(*node);
         if (!node->member("functionNumber"))
@@ -223,6 +225,8 @@ void read_changes(const Node& values, Function& function) {
     function.port_effect =
         read_effect(values, "portChangeTakesEffect", {"once", "reset"}, Effect::once);
     function.multichannel = values.number32("multichannel", 0);
+    if (const auto node = values.member("virtualFunctions"))
+        function.virtual_functions = read_virtual_functions(*node, function);
     if (const auto node = values.member("profiles"))
         function.profiles = read_profiles(*node);
 }
@@ -285,6 +289,8 @@ std::span<const std::string_view> function_keys() {
                                                 "fip",
                                                 "nameManagement",
                                                 "virtualPorts",
+                                                "qos",
+                                                "virtualFunctions",
                                                 "dead",
                                                 "adapterAttributes",
                                                 "portAttributes",

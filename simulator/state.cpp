@@ -314,6 +314,7 @@ constexpr Piece PIECES[] = {
     whole<&Function::resets>("resets"),
     whole<&Function::initiator>("initiator"),
     whole<&Function::network>("network"),
+    whole<&Function::qos>("qos"),
 };
 
 void apply_pieces(Function& function, const Node& values) {

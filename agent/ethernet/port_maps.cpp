@@ -135,6 +135,7 @@ Ref<VLNMPCA_EthernetPort> Adapter_Map_Builder::CreateEthernetPort(const NIC_Port
     append_capabilities(port->Capabilities, attributes.Capabilities);
     append_capabilities(port->EnabledCapabilities, attributes.EnabledCapabilities);
     port->PortType.set(0);
+    port->SRIOVState.set(static_cast<uint16>(attributes.SRIOVState));
     read_beacon(*port);
     return port;
 }

@@ -201,14 +201,21 @@ typedef struct AX_VirtualFunctionList {
 
 /* Assumed: the layout. */
 typedef struct AX_VirtualFunctionProperties {
+    uint32_t busNumber; /* PCI */
+    uint32_t deviceNumber;
     uint32_t functionNumber;
+    uint16_t vendorID;
+    uint16_t deviceID;
+    uint16_t subVendorID;
+    uint16_t subsystemID;
+    uint32_t revisionID;
     uint32_t vlanID;
-    uint32_t linkSpeed; /* code as in the port attributes */
-    uint32_t enabled;
+    uint32_t linkStatus;
     uint8_t mac[6];
     uint8_t reserved[2];
-    char vmName[256];
+    char transmitRate[32]; /* with its unit */
 } AX_VirtualFunctionProperties;
+AX_CHECK_SIZE(AX_VirtualFunctionProperties, 72);
 
 enum { AX_QOS_NIC = 1, AX_QOS_ISCSI = 2 };
 

@@ -53,6 +53,8 @@ TEST_F(Simulated, EveryKeyIsDocumented) {
         R"({"network": {"?": 0}})",
         R"({"hba": {"?": 0}})",
         R"({"driverParameters": [{"?": 0}]})",
+        R"({"qos": {"?": 0}})",
+        R"({"virtualFunctions": {"?": 0}})",
         R"({"dumps": {"?": 0}})",
         R"({"dumps": {"logType": "?"}})",
         R"({"dumps": {"modules": [{"?": 0}]}})",

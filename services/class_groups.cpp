@@ -11,6 +11,7 @@
 #include "services/firmware/instances.h"
 #include "services/nic_settings/instances.h"
 #include "services/nic_settings/virtual_functions.h"
+#include "services/nic_settings/vnic_data.h"
 #include "services/phy/instances.h"
 #include "services/record_logs/instances.h"
 #include "services/wwn/instances.h"
@@ -80,6 +81,12 @@ constexpr Class_Group GROUPS[] = {
      .before = {VLN_DBG, "Creating CreateNICSrIovClasses "},
      .failed = {VLN_DBG, "SR-IOV classes are not created"},
      .thrown = {VLN_ERR, "CreateNICSrIovClasses Failed"}},
+    // Behind all that makes settings of channels.
+    {.place = CLOSING,
+     .create = update_vnic_data,
+     .before = {VLN_DBG, "Updating VNIC Information in the Ports "},
+     .failed = {VLN_DBG, "vNIC Info not updated"},
+     .thrown = {VLN_ERR, "UpdateVNICInfo Failed"}},
 };
 
 } // namespace

@@ -39,12 +39,13 @@ constexpr Expected ETHERNET_PORT[] = {
     {"SupportedMaximumTransmissionUnit", "9000", "9000"},
     {"ActiveMaximumTransmissionUnit", "1500", "1500"},
     {"Generation", "0", "1"},
-    {"OtherIdentifyingInfo", "{VR10420117:00, VR10420117:0, VR10420117}",
-     "{VR10420117:00, VR10420117:1, VR10420117}"},
+    {"OtherIdentifyingInfo", "{VR10420117:00, VR10420117:0, VR10420117, 0, NotSupported}",
+     "{VR10420117:00, VR10420117:1, VR10420117, 1, NotSupported}"},
     {"IdentifyingDescriptions",
-     "{SerialNumber + Sub-AdapterID, SerialNumber:PhysicalPortNumber, "
-     "SerialNumber}",
-     "{SerialNumber + Sub-AdapterID, SerialNumber:PhysicalPortNumber, SerialNumber}"},
+     "{SerialNumber + Sub-AdapterID, SerialNumber:PhysicalPortNumber, SerialNumber, "
+     "PhysicalPortNumber, VirtualPortNumber}",
+     "{SerialNumber + Sub-AdapterID, SerialNumber:PhysicalPortNumber, SerialNumber, "
+     "PhysicalPortNumber, VirtualPortNumber}"},
     {"FunctionalQosBandwidth", "10 Gbps", "10 Gbps"},
     {"FunctionalQosMinBandwidth", "1 Gbps", "1 Gbps"},
     {"PCIBusNumber", "16", "16"},

@@ -49,9 +49,10 @@ TEST(ISCSI, APortShowsWhatItsFunctionTells) {
          {"SRIOVState", "2"},
          {"LDTO", "30"},
          {"MaxCDBLength", "16"},
-         {"OtherIdentifyingInfo", "{VR10420117:00, VR10420117:0, VR10420117}"},
+         {"OtherIdentifyingInfo", "{VR10420117:00, VR10420117:0, VR10420117, 0, NotSupported}"},
          {"IdentifyingDescriptions",
-          "{SerialNumber + Sub-AdapterID, SerialNumber:PhysicalPortNumber, SerialNumber}"}});
+          "{SerialNumber + Sub-AdapterID, SerialNumber:PhysicalPortNumber, SerialNumber, "
+          "PhysicalPortNumber, VirtualPortNumber}"}});
     EXPECT_EQ(text_of(ports[1], "DeviceID"), "100002564C000103");
 }
 

@@ -57,12 +57,12 @@ sint32 set_states(const VLNMPCA_DcbxLldpData& model, const VLNMPCA_DcbxLldpData&
             continue;
         const char* number = state_number(wanted.value);
         if (!number)
-            return refuse_modify(MODIFY_INSTANCE_FAILED,
+            return refuse_modify(MODIFY_INSTANCE_INVALID_PARAMETER,
                                  "Invalid state, supported states are Enabled and Disabled");
         asked = true;
         if (VLN_MethodWrapper::vlncimSetCEEParams(&name, row.parameter, number, validate) !=
             AX_STATUS_OK)
-            return refuse_modify(MODIFY_INSTANCE_FAILED, row.failed);
+            return refuse_modify(MODIFY_INSTANCE_INVALID_PARAMETER, row.failed);
     }
     return MODIFY_INSTANCE_OK;
 }
@@ -70,17 +70,17 @@ sint32 set_states(const VLNMPCA_DcbxLldpData& model, const VLNMPCA_DcbxLldpData&
 sint32 modify_exchange(ProviderAgent& agent, const VLNMPCA_DcbxLldpData* model,
                        const VLNMPCA_DcbxLldpData* instance) {
     if (!model || !instance)
-        return refuse_modify(MODIFY_INSTANCE_FAILED,
+        return refuse_modify(MODIFY_INSTANCE_INVALID_PARAMETER,
                              "VLNMPCA_DcbxLldpData::modify_instance invalid parameter");
     const auto* found = agent.m_VLNMPCA_DcbxLldpData_map.lookup(model);
     if (!found)
-        return refuse_modify(MODIFY_INSTANCE_FAILED,
+        return refuse_modify(MODIFY_INSTANCE_INVALID_PARAMETER,
                              "Invalid instance of VLNMPCA_DcbxLldpData Data");
     const String device_id = found->ElementName.value;
     HBA_WWN name{};
     if (!nameOfDeviceId(device_id.c_str(), name,
                         "VLNMPCA_DcbxLldpData::modify_instance::", VLN_ERR))
-        return MODIFY_INSTANCE_NOT_FOUND;
+        return MODIFY_INSTANCE_FAILED;
     bool asked = false;
     const sint32 status = set_states(*model, *found, name, asked);
     if (status == MODIFY_INSTANCE_OK || asked)
@@ -93,26 +93,26 @@ sint32 modify_exchange(ProviderAgent& agent, const VLNMPCA_DcbxLldpData* model,
 sint32 modify_throttle(ProviderAgent& agent, const VLNMPCA_PFCThrottle* model,
                        const VLNMPCA_PFCThrottle* instance) {
     if (!model || !instance)
-        return refuse_modify(MODIFY_INSTANCE_FAILED,
+        return refuse_modify(MODIFY_INSTANCE_INVALID_PARAMETER,
                              "VLNMPCA_PFCThrottle::modify_instance invalid parameter");
     const auto* found = agent.m_VLNMPCA_PFCThrottle_map.lookup(model);
     if (!found)
-        return refuse_modify(MODIFY_INSTANCE_FAILED,
+        return refuse_modify(MODIFY_INSTANCE_INVALID_PARAMETER,
                              "Invalid instance of VLNMPCA_PFCThrottle Data");
     HBA_WWN name{};
     if (!nameOfDeviceId(found->ElementName.value.c_str(), name,
                         "VLNMPCA_PFCThrottle::modify_instance::", VLN_ERR))
-        return MODIFY_INSTANCE_NOT_FOUND;
+        return MODIFY_INSTANCE_FAILED;
     if (model->PFCThrottle.is_null())
         return MODIFY_INSTANCE_OK;
     const String& wanted = model->PFCThrottle.value;
     const bool on = begins_with(wanted, "enable", 2);
     if (!on && !begins_with(wanted, "disable", 2))
-        return refuse_modify(MODIFY_INSTANCE_FAILED,
+        return refuse_modify(MODIFY_INSTANCE_INVALID_PARAMETER,
                              "Invalid PFCThrottle, supported values are enable and disable");
     VLN_LOG(VLN_DBG, on ? "Setting PFCThrottle to enable" : "Setting PFCThrottle to disable");
     if (VLN_MethodWrapper::SetPfcThrottle(&name, on) != AX_STATUS_OK)
-        return refuse_modify(MODIFY_INSTANCE_NOT_FOUND, "VLN_MethodWrapper::SetPfcThrottle failed");
+        return refuse_modify(MODIFY_INSTANCE_FAILED, "VLN_MethodWrapper::SetPfcThrottle failed");
     change(agent.m_VLNMPCA_PFCThrottle_map, found, [on](VLNMPCA_PFCThrottle& throttle) {
         throttle.PFCThrottle.set(on ? "enabled" : "disabled");
     });

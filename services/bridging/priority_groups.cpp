@@ -54,7 +54,7 @@ sint32 Group_Change::setApplication(const Property<uint32>& wanted, const Proper
     const std::string value = std::to_string(wanted.value);
     if (VLN_MethodWrapper::vlncimSetCEEParams(&_name, parameter, value.c_str(), validate) !=
         AX_STATUS_OK)
-        return refuse_modify(MODIFY_INSTANCE_NOT_FOUND, failed);
+        return refuse_modify(MODIFY_INSTANCE_FAILED, failed);
     // Groups and flow control may have followed, and what is not given of them is to stay.
     read_groups_back(_agent, _device_id, _name);
     return MODIFY_INSTANCE_OK;
@@ -126,14 +126,14 @@ sint32 Group_Change::setPriorities() {
         return (_model.*list).is_null() ? had.*list : _model.*list;
     };
     if (_model.PFCPriority.value.size() > MAX_FLOW_CONTROL_PRIORITIES)
-        return refuse_modify(MODIFY_INSTANCE_NOT_FOUND, "Max two pfc priority are supported");
+        return refuse_modify(MODIFY_INSTANCE_FAILED, "Max two pfc priority are supported");
     Priority_Groups groups;
     bool changed = differs(_model.PFCPriority, had.PFCPriority);
     for (std::size_t i = 0; i < Priority_Groups::GROUPS; ++i) {
         const Priority_List list = PRIORITY_LISTS[i];
         changed = changed || differs(_model.*list, had.*list);
         if (!fill_group(groups.group[i], wanted(list).value))
-            return refuse_modify(MODIFY_INSTANCE_FAILED,
+            return refuse_modify(MODIFY_INSTANCE_INVALID_PARAMETER,
                                  "Invalid PriorityGroup, too many priorities are given");
     }
     if (!changed) {
@@ -144,7 +144,7 @@ sint32 Group_Change::setPriorities() {
     log_priorities(groups, bitmap);
     _asked = true;
     if (VLN_MethodWrapper::vlncimSetCeePriority(&_name, bitmap, groups, _validate) != AX_STATUS_OK)
-        return refuse_modify(MODIFY_INSTANCE_NOT_FOUND,
+        return refuse_modify(MODIFY_INSTANCE_FAILED,
                              "VLNMPCA_PGData_Provider::vlncimSetCeePriority call failed");
     return MODIFY_INSTANCE_OK;
 }
@@ -158,17 +158,17 @@ sint32 Group_Change::setBandwidths() {
     const Array<uint32>& wanted = _model.PriorityBandwidth.value;
     Group_Bandwidths bandwidths{};
     if (wanted.size() != had.value.size() || wanted.size() != bandwidths.size())
-        return refuse_modify(MODIFY_INSTANCE_FAILED,
+        return refuse_modify(MODIFY_INSTANCE_INVALID_PARAMETER,
                              "Invalid PriorityBandwidth data, Should be array of 8 elements");
     if (std::any_of(wanted.begin(), wanted.end(), [](uint32 percent) { return percent > 100; }))
-        return refuse_modify(MODIFY_INSTANCE_FAILED,
+        return refuse_modify(MODIFY_INSTANCE_INVALID_PARAMETER,
                              "Invalid PriorityBandwidth, Element Value Should be b/w 0 - 100");
     if (!differs(_model.PriorityBandwidth, had))
         return MODIFY_INSTANCE_OK;
     std::copy(wanted.begin(), wanted.end(), bandwidths.begin());
     _asked = true;
     if (VLN_MethodWrapper::vlncimSetPgBW(&_name, bandwidths) != AX_STATUS_OK)
-        return refuse_modify(MODIFY_INSTANCE_NOT_FOUND,
+        return refuse_modify(MODIFY_INSTANCE_FAILED,
                              "VLNMPCA_PGData_Provider::vlncimSetPgBW call failed");
     return MODIFY_INSTANCE_OK;
 }
@@ -181,12 +181,12 @@ sint32 Group_Change::setFlowControl() {
         return MODIFY_INSTANCE_OK;
     const bool enabled = wanted.value == "Yes";
     if (!enabled && wanted.value != "No")
-        return refuse_modify(MODIFY_INSTANCE_FAILED,
+        return refuse_modify(MODIFY_INSTANCE_INVALID_PARAMETER,
                              "Invalid PFCEnabled, supported values are Yes and No");
     _asked = true;
     if (VLN_MethodWrapper::vlncimSetCEEParams(&_name, "pfcenabled", enabled ? "1" : "0", true) !=
         AX_STATUS_OK)
-        return refuse_modify(MODIFY_INSTANCE_NOT_FOUND,
+        return refuse_modify(MODIFY_INSTANCE_FAILED,
                              "VLN_MethodWrapper::vlncimSetCEEParams call for PFCEnabled failed");
     return MODIFY_INSTANCE_OK;
 }
@@ -202,14 +202,15 @@ sint32 Group_Change::apply() {
 sint32 Group_Change::run() {
     const auto* found = _agent.m_VLNMPCA_PGData_map.lookup(&_model);
     if (!found)
-        return refuse_modify(MODIFY_INSTANCE_FAILED, "Invalid instance of VLNMPCA_PGData Data");
+        return refuse_modify(MODIFY_INSTANCE_INVALID_PARAMETER,
+                             "Invalid instance of VLNMPCA_PGData Data");
     if (std::strncmp(found->InstanceID.value.c_str(), CONFIGURED_SETTINGS,
                      std::strlen(CONFIGURED_SETTINGS)) != 0)
-        return refuse_modify(MODIFY_INSTANCE_FAILED,
+        return refuse_modify(MODIFY_INSTANCE_INVALID_PARAMETER,
                              "modify_instance is supported only on Configured instance");
     _device_id = found->ElementName.value;
     if (!nameOfDeviceId(_device_id.c_str(), _name, "VLNMPCA_PGData::modify_instance::", VLN_ERR))
-        return MODIFY_INSTANCE_NOT_FOUND;
+        return MODIFY_INSTANCE_FAILED;
     _validate = _model.ValidateRule.is_null() || _model.ValidateRule.value != 0;
     VLN_LOG(VLN_DBG, "ValidateRule = %d", static_cast<int>(_validate));
     const sint32 status = apply();
@@ -224,7 +225,7 @@ sint32 Priority_Group_Provider::modify_instance(const VLNMPCA_PGData* model,
                                                 const VLNMPCA_PGData* instance) {
     return answer_modify([&](ProviderAgent& agent) {
         if (!model || !instance)
-            return refuse_modify(MODIFY_INSTANCE_FAILED,
+            return refuse_modify(MODIFY_INSTANCE_INVALID_PARAMETER,
                                  "VLNMPCA_PGData::modify_instance invalid parameter");
         return Group_Change(agent, *model).run();
     });

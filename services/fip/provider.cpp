@@ -52,23 +52,23 @@ bool read_back(ProviderAgent& agent, const VLNMPCA_FIPData* model, const String&
 sint32 modify(ProviderAgent& agent, const VLNMPCA_FIPData* model, const VLNMPCA_FIPData* instance) {
     if (!model || !instance) {
         VLN_LOG(VLN_INFO, "VLNMPCA_Fip::modify_instance invalid parameter");
-        return MODIFY_INSTANCE_FAILED;
+        return MODIFY_INSTANCE_INVALID_PARAMETER;
     }
     const auto* found = agent.m_VLNMPCA_FIPData_map.lookup(model);
     if (!found)
-        return refuse_modify(MODIFY_INSTANCE_NOT_FOUND, "Invalid instance of VLNMPCA_FIPData");
+        return refuse_modify(MODIFY_INSTANCE_FAILED, "Invalid instance of VLNMPCA_FIPData");
     const String port = found->ElementName.value;
     HBA_WWN name{};
     if (!nameOfDeviceId(port.c_str(), name, "VLNMPCA_Fip::modify_instance::", VLN_ERR))
-        return MODIFY_INSTANCE_NOT_FOUND;
+        return MODIFY_INSTANCE_FAILED;
     VLN_FIPParams wanted;
     if (!read_wanted(*model, wanted))
-        return refuse_modify(MODIFY_INSTANCE_FAILED, "Error: No parameter specified");
+        return refuse_modify(MODIFY_INSTANCE_INVALID_PARAMETER, "Error: No parameter specified");
     const AX_STATUS status = VLN_MethodWrapper::vlnSetFIPParams(&name, wanted);
     const bool shown = read_back(agent, model, port, name);
     if (status != AX_STATUS_OK)
-        return status == AX_STATUS_INVALID_ARGUMENT ? MODIFY_INSTANCE_FAILED
-                                                    : MODIFY_INSTANCE_NOT_FOUND;
+        return status == AX_STATUS_INVALID_ARGUMENT ? MODIFY_INSTANCE_INVALID_PARAMETER
+                                                    : MODIFY_INSTANCE_FAILED;
     if (shown)
         VLN_LOG(VLN_WARN,
                 "Successfully modified the FIP parameters, need a port reset to take affect");

@@ -85,7 +85,8 @@ Change set(const char* property, const Value& value, CMPIrc status, const char* 
     return {{{property, value}}, status, line, fault};
 }
 
-constexpr CMPIrc OK = CMPI_RC_OK, FAILED = CMPI_RC_ERR_FAILED, NOT_FOUND = CMPI_RC_ERR_NOT_FOUND;
+constexpr CMPIrc OK = CMPI_RC_OK, INVALID = CMPI_RC_ERR_INVALID_PARAMETER,
+                 FAILED = CMPI_RC_ERR_FAILED;
 
 // ---- What is shown ----
 
@@ -157,37 +158,36 @@ TEST_F(Bridging, EachRefusalOfAPriorityHasItsLine) {
     const char* const unknown = "ERROR: Unable to determine port type.";
     const char* const fcoe_failed =
         "VLN_MethodWrapper::vlncimSetCEEParams call for FCoEPriority failed";
-    expect(NIC, {fcoe(5, NOT_FOUND, "ERROR: Cannot set DCB parameters on NIC adapters."),
-                 fcoe(5, NOT_FOUND, fcoe_failed),
-                 fcoe(5, NOT_FOUND, unknown, {"AX_GetHBAFeature", 190})});
-    expect(CNA,
-           {fcoe(8, NOT_FOUND, "\nERROR: FCoE priority valid range is 0 to 7\n"),
-            set("iSCSIPriority", number(4000000000), NOT_FOUND,
-                "\nERROR: iSCSI priority valid range is 0 to 7\n"),
-            set("iSCSIPriority", number(8), NOT_FOUND,
-                "VLN_MethodWrapper::vlncimSetCEEParams call for iSCSIPriority failed"),
-            set("RoCePriority", number(1), NOT_FOUND,
-                "ERROR:- Setting RoCE Priority on NON ROCE Port not allowed"),
-            fcoe(3, OK, "PriorityGroup and pfc are not modified."),
-            fcoe(5, NOT_FOUND, "ERROR: SetCeeParam failed: Unable to get DCBX state",
-                 {"AX_CNA_GetCEE_Params", 190}),
-            fcoe(5, NOT_FOUND, fcoe_failed, {"AX_CNA_SetPGPriorityBitmaps", 190}),
-            fcoe(5, NOT_FOUND, "Setting DCB Params failed with code 4", {"AX_CNA_GetTLV", 4})});
+    expect(NIC,
+           {fcoe(5, FAILED, "ERROR: Cannot set DCB parameters on NIC adapters."),
+            fcoe(5, FAILED, fcoe_failed), fcoe(5, FAILED, unknown, {"AX_GetHBAFeature", 190})});
+    expect(CNA, {fcoe(8, FAILED, "\nERROR: FCoE priority valid range is 0 to 7\n"),
+                 set("iSCSIPriority", number(4000000000), FAILED,
+                     "\nERROR: iSCSI priority valid range is 0 to 7\n"),
+                 set("iSCSIPriority", number(8), FAILED,
+                     "VLN_MethodWrapper::vlncimSetCEEParams call for iSCSIPriority failed"),
+                 set("RoCePriority", number(1), FAILED,
+                     "ERROR:- Setting RoCE Priority on NON ROCE Port not allowed"),
+                 fcoe(3, OK, "PriorityGroup and pfc are not modified."),
+                 fcoe(5, FAILED, "ERROR: SetCeeParam failed: Unable to get DCBX state",
+                      {"AX_CNA_GetCEE_Params", 190}),
+                 fcoe(5, FAILED, fcoe_failed, {"AX_CNA_SetPGPriorityBitmaps", 190}),
+                 fcoe(5, FAILED, "Setting DCB Params failed with code 4", {"AX_CNA_GetTLV", 4})});
     expect(ONLY_ISCSI,
-           {fcoe(5, NOT_FOUND, "ERROR:- Setting FCoE Priority on NON FCoE Port not allowed")});
-    expect(ONLY_FCOE, {set("iSCSIPriority", number(5), NOT_FOUND,
+           {fcoe(5, FAILED, "ERROR:- Setting FCoE Priority on NON FCoE Port not allowed")});
+    expect(ONLY_FCOE, {set("iSCSIPriority", number(5), FAILED,
                            "ERROR:- Setting iSCSI Priority on NON iSCSI Port not allowed")});
-    expect(MANY_GROUPS,
-           {fcoe(5, NOT_FOUND, "ERROR: More than 2 priority groups have priorities."),
-            fcoe(5, NOT_FOUND,
-                 "Use 'Setceepriority' command to correct the priority group information."),
-            {{{"iSCSIPriority", number(5)}, {"ValidateRule", number(0)}},
-             NOT_FOUND,
-             "ERROR: More than 2 priority groups have priorities."},
-            {{{"FCoEPriority", number(5)}, {"ValidateRule", number(0)}}, OK, "ValidateRule = 0"}});
+    expect(
+        MANY_GROUPS,
+        {fcoe(5, FAILED, "ERROR: More than 2 priority groups have priorities."),
+         fcoe(5, FAILED, "Use 'Setceepriority' command to correct the priority group information."),
+         {{{"iSCSIPriority", number(5)}, {"ValidateRule", number(0)}},
+          FAILED,
+          "ERROR: More than 2 priority groups have priorities."},
+         {{{"FCoEPriority", number(5)}, {"ValidateRule", number(0)}}, OK, "ValidateRule = 0"}});
     expect_properties(groups(MANY_GROUPS),
                       {{"FCoEPriority", "5"}, {"PriorityGroupTwo", "{3}"}, {"PFCPriority", "{3}"}});
-    expect(ROCE, {set("RoCePriority", number(2), NOT_FOUND,
+    expect(ROCE, {set("RoCePriority", number(2), FAILED,
                       "vlncimSetCEEParams call for RoCePriority failed"),
                   set("RoCePriority", number(1), OK,
                       "Note: This setting will only be used when not provided by the switch.")});
@@ -226,16 +226,16 @@ TEST_F(Bridging, GroupsFollowAPriority) {
 
 // What was written stays, and the instances show it.
 TEST_F(Bridging, AChangeThatFailsPartWayIsReadBack) {
-    expect(CNA, {set("FCoEPriority", number(5), NOT_FOUND,
-                     "Setting DCB Params failed with code 190", {"AX_CNA_SetTLV", 190})});
+    expect(CNA, {set("FCoEPriority", number(5), FAILED, "Setting DCB Params failed with code 190",
+                     {"AX_CNA_SetTLV", 190})});
     expect_properties(groups(CNA), {{"FCoEPriority", "3"}, {"PriorityGroupTwo", "{5}"}});
     expect(CNA, {{{{"FCoEPriority", number(6)}, {"PFCPriority", list({5, 6, 7})}},
-                  NOT_FOUND,
+                  FAILED,
                   "Max two pfc priority are supported"}});
     expect_properties(groups(CNA, "Active"), {{"FCoEPriority", "6"}, {"PFCPriority", "{6}"}});
     expect_changes(road, exchange(CNA),
                    {{{{"DCBXState", word("Disabled")}, {"LLDPtxState", word("Off")}},
-                     FAILED,
+                     INVALID,
                      "Invalid state, supported states are Enabled and Disabled"}});
     expect_properties(exchange(CNA), {{"DCBXState", "Disabled"}, {"LLDPtxState", "Enabled"}});
 }
@@ -246,52 +246,51 @@ TEST_F(Bridging, EachRefusalOfGroupsHasItsLine) {
     const Value all = list({0, 1, 2, 4, 5, 6, 7});
     const char* const failed = "VLNMPCA_PGData_Provider::vlncimSetCeePriority call failed";
     const Value::Array many(100'000, number(1));
-    expect(NIC, {set("PFCPriority", list({4}), NOT_FOUND,
+    expect(NIC, {set("PFCPriority", list({4}), FAILED,
                      "ERROR: Priority groups not supported on NIC adapters.")});
-    expect(ONLY_FCOE, {set("PFCPriority", list({3, 4}), NOT_FOUND,
+    expect(ONLY_FCOE, {set("PFCPriority", list({3, 4}), FAILED,
                            "ERROR: Only one PFC priority can be configured on this adapter.")});
-    expect(ONLY_ISCSI, {set("PFCPriority", list({}), NOT_FOUND,
+    expect(ONLY_ISCSI, {set("PFCPriority", list({}), FAILED,
                             "ERROR: Invalid Priority. \niSCSI Priority and non-iSCSI Priorities "
                             "cannot be assigned to the same priority group.")});
-    expect(CNA,
-           {set("PFCPriority", list({5}), NOT_FOUND, "ERROR: Unable to get PG settings.",
-                {"AX_CNA_GetCEE_Params", 190}),
-            {{{"PriorityGroupThree", list({5})},
-              {"PriorityGroupFour", list({6})},
-              {"PriorityGroupEight", list({7})}},
-             NOT_FOUND,
-             "ERROR: Only 4 priority groups can be configured on this adapter."},
-            set("PFCPriority", list({1, 2, 3}), NOT_FOUND, "Max two pfc priority are supported"),
-            set("PriorityGroupTwo", list({3, 300}), NOT_FOUND,
-                "ERROR: Invalid priority in priority group 1. Valid range is 0 to 7"),
-            {{{"PriorityGroupFifteen", Value::array(CMPI_uint32, many)}},
-             FAILED,
-             "Invalid PriorityGroup, too many priorities are given"},
-            set("PriorityGroupTwo", list({3, 4}), NOT_FOUND,
-                "ERROR: Invalid Priority. \nFCoE Priority and non-FCoE Priorities cannot be "
-                "assigned to the same priority group."),
-            set("PFCPriority", list({3, 5}), NOT_FOUND,
-                "ERROR: A PGID's priorities must be PFC priority or non-PFC priorities"),
-            set("PriorityGroupThree", list({7}), NOT_FOUND,
-                "ERROR: Priority groups 0 and 2 have same priority"),
-            set("PriorityGroupFifteen", list({7}), NOT_FOUND,
-                "ERROR: Priority groups 0 and 15 have same priority"),
-            set("PriorityGroupOne", list({0, 1}), NOT_FOUND,
-                "ERROR: Unable to set priority group priorities."),
-            {{{"PriorityGroupThree", list({7})}, {"ValidateRule", number(0)}}, NOT_FOUND, failed},
-            set("PFCPriority", list({}), NOT_FOUND, "ERROR: Unable to set pfcpriority.",
-                {"AX_CNA_SetPFC", 190}),
-            {{{"PriorityGroupOne", all}, {"PFCPriority", list({3})}},
-             OK,
-             "PriorityGroup and pfc are not modified."},
-            {{{"PriorityGroupOne", list({0, 1, 2, 5, 6, 7})},
-              {"PriorityGroupTwo", list({3, 4})},
-              {"ValidateRule", number(0)}},
-             OK,
-             "ValidateRule = 0"}});
+    expect(CNA, {set("PFCPriority", list({5}), FAILED, "ERROR: Unable to get PG settings.",
+                     {"AX_CNA_GetCEE_Params", 190}),
+                 {{{"PriorityGroupThree", list({5})},
+                   {"PriorityGroupFour", list({6})},
+                   {"PriorityGroupEight", list({7})}},
+                  FAILED,
+                  "ERROR: Only 4 priority groups can be configured on this adapter."},
+                 set("PFCPriority", list({1, 2, 3}), FAILED, "Max two pfc priority are supported"),
+                 set("PriorityGroupTwo", list({3, 300}), FAILED,
+                     "ERROR: Invalid priority in priority group 1. Valid range is 0 to 7"),
+                 {{{"PriorityGroupFifteen", Value::array(CMPI_uint32, many)}},
+                  INVALID,
+                  "Invalid PriorityGroup, too many priorities are given"},
+                 set("PriorityGroupTwo", list({3, 4}), FAILED,
+                     "ERROR: Invalid Priority. \nFCoE Priority and non-FCoE Priorities cannot be "
+                     "assigned to the same priority group."),
+                 set("PFCPriority", list({3, 5}), FAILED,
+                     "ERROR: A PGID's priorities must be PFC priority or non-PFC priorities"),
+                 set("PriorityGroupThree", list({7}), FAILED,
+                     "ERROR: Priority groups 0 and 2 have same priority"),
+                 set("PriorityGroupFifteen", list({7}), FAILED,
+                     "ERROR: Priority groups 0 and 15 have same priority"),
+                 set("PriorityGroupOne", list({0, 1}), FAILED,
+                     "ERROR: Unable to set priority group priorities."),
+                 {{{"PriorityGroupThree", list({7})}, {"ValidateRule", number(0)}}, FAILED, failed},
+                 set("PFCPriority", list({}), FAILED, "ERROR: Unable to set pfcpriority.",
+                     {"AX_CNA_SetPFC", 190}),
+                 {{{"PriorityGroupOne", all}, {"PFCPriority", list({3})}},
+                  OK,
+                  "PriorityGroup and pfc are not modified."},
+                 {{{"PriorityGroupOne", list({0, 1, 2, 5, 6, 7})},
+                   {"PriorityGroupTwo", list({3, 4})},
+                   {"ValidateRule", number(0)}},
+                  OK,
+                  "ValidateRule = 0"}});
     expect_properties(groups(CNA), {{"PriorityGroupTwo", "{3, 4}"}, {"PFCPriority", "{3}"}});
     testing::internal::CaptureStdout();
-    expect(CNA, {set("PFCPriority", list({8}), NOT_FOUND, failed)});
+    expect(CNA, {set("PFCPriority", list({8}), FAILED, failed)});
     EXPECT_EQ(testing::internal::GetCapturedStdout(),
               "\nERROR: Invalid PFC priority. Valid range is 0 to 7");
     EXPECT_EQ(road.count_in_log("ERROR: Invalid PFC priority."), 0u);
@@ -305,33 +304,33 @@ TEST_F(Bridging, BandwidthsAddUpAndFlowControlIsSwitched) {
     const char* const eight = "Invalid PriorityBandwidth data, Should be array of 8 elements";
     const char* const failed = "VLNMPCA_PGData_Provider::vlncimSetPgBW call failed";
     const auto equal = {13u, 13u, 13u, 13u, 12u, 12u, 12u, 12u};
-    expect(CNA, {share({100}, FAILED, eight), share({}, FAILED, eight),
-                 share({0, 0, 0, 0, 0, 0, 0, 101}, FAILED,
+    expect(CNA, {share({100}, INVALID, eight), share({}, INVALID, eight),
+                 share({0, 0, 0, 0, 0, 0, 0, 101}, INVALID,
                        "Invalid PriorityBandwidth, Element Value Should be b/w 0 - 100"),
-                 share({50, 49, 0, 0, 0, 0, 0, 0}, NOT_FOUND,
+                 share({50, 49, 0, 0, 0, 0, 0, 0}, FAILED,
                        "ERROR: Invalid bandwidth values. All bandwidths must add up to 100"),
-                 share(equal, NOT_FOUND, failed, {"AX_GetHBAFeature", 190}),
-                 share(equal, NOT_FOUND,
+                 share(equal, FAILED, failed, {"AX_GetHBAFeature", 190}),
+                 share(equal, FAILED,
                        "ERROR: Priority groups are not supported on the specified adapter.",
                        {"AX_GetHBAFeature", 1}),
-                 share(equal, NOT_FOUND, "ERROR: Setting of bandwidth failed",
+                 share(equal, FAILED, "ERROR: Setting of bandwidth failed",
                        {"AX_CNA_GetPGPriorityBitmaps", 190}),
-                 share(equal, NOT_FOUND, "", {"AX_CNA_SetPGBandwidth", 1}),
+                 share(equal, FAILED, "", {"AX_CNA_SetPGBandwidth", 1}),
                  share(equal, OK, "Successfully set priority group bandwidths."),
-                 set("PFCEnabled", word("yes"), FAILED, "Invalid PFCEnabled"),
+                 set("PFCEnabled", word("yes"), INVALID, "Invalid PFCEnabled"),
                  set("PFCEnabled", word("No"), OK, "DCB parameter successfully set.")});
     expect_properties(
         groups(CNA, "Active"),
         {{"PriorityBandwidth", "{13, 13, 13, 13, 12, 12, 12, 12}"}, {"PFCEnabled", "No"}});
-    expect(ROCE, {share(equal, NOT_FOUND,
+    expect(ROCE, {share(equal, FAILED,
                         "ERROR: Priority groups are not supported on the specified adapter.")});
-    expect(ONLY_ISCSI, {set("PFCEnabled", word("No"), NOT_FOUND,
+    expect(ONLY_ISCSI, {set("PFCEnabled", word("No"), FAILED,
                             "ERROR: Cannot set PFC parameters on a NIC or iSCSI port.")});
 }
 
 TEST_F(Bridging, OnlyWhatIsConfiguredIsModified) {
     expect_changes(road, groups(CNA, "Active"),
-                   {set("FCoEPriority", number(5), FAILED,
+                   {set("FCoEPriority", number(5), INVALID,
                         "modify_instance is supported only on Configured instance")});
     const auto rename = [](host::Instance instance) {
         host::set(instance.path.keys, "InstanceID", word("other"));
@@ -339,23 +338,23 @@ TEST_F(Bridging, OnlyWhatIsConfiguredIsModified) {
         return instance;
     };
     expect_changes(road, rename(groups(CNA)),
-                   {{{}, FAILED, "Invalid instance of VLNMPCA_PGData Data"}});
+                   {{{}, INVALID, "Invalid instance of VLNMPCA_PGData Data"}});
     expect_changes(road, rename(exchange(CNA)),
-                   {{{}, FAILED, "Invalid instance of VLNMPCA_DcbxLldpData Data"}});
+                   {{{}, INVALID, "Invalid instance of VLNMPCA_DcbxLldpData Data"}});
 }
 
 // ---- What is exchanged, and the throttle ----
 
 TEST_F(Bridging, StatesAreSetInTheirOrder) {
     expect_changes(road, exchange(QUIET),
-                   {set("DCBXState", word("Enabled"), FAILED,
+                   {set("DCBXState", word("Enabled"), INVALID,
                         "ERROR: Cannot enable dcbxstate when transmit(txstate) is disabled."),
                     {{{"DCBXState", word("Enabled")}, {"LLDPtxState", word("Enabled")}},
-                     FAILED,
+                     INVALID,
                      "VLN_MethodWrapper::vlncimSetCEEParams call for dcbxstate failed"},
-                    set("LLDPtxSysDesc", word("Disabled"), FAILED,
+                    set("LLDPtxSysDesc", word("Disabled"), INVALID,
                         "ERROR: Cannot set transmit properties when transmit state is disabled."),
-                    set("LLDPtxPortDesc", word("disabled"), FAILED, "Invalid state"),
+                    set("LLDPtxPortDesc", word("disabled"), INVALID, "Invalid state"),
                     {{{"LLDPtxState", word("Ena")}, {"LLDPtxSysName", word("Dis, for now")}},
                      OK,
                      "DCB parameter successfully set."},
@@ -366,9 +365,9 @@ TEST_F(Bridging, StatesAreSetInTheirOrder) {
                                         {"LLDPtxSysDesc", "Enabled"},
                                         {"LLDPtxSysName", "Disabled"}});
     expect_changes(road, exchange(QUIET),
-                   {set("LLDPrxState", word("Disabled"), FAILED,
+                   {set("LLDPrxState", word("Disabled"), INVALID,
                         "ERROR: Cannot (disable or be disabled) rxstate when DCBX is enabled."),
-                    set("LLDPtxSysCap", word("Disabled"), FAILED,
+                    set("LLDPtxSysCap", word("Disabled"), INVALID,
                         "VLN_MethodWrapper::vlncimSetCEEParams call for txsyscap failed",
                         {"AX_CNA_SetLldp", 190})});
 }
@@ -381,9 +380,9 @@ TEST(Bridging_Throttle, IsSwitchedByTheFirstTwoLetters) {
         return set("PFCThrottle", word(text), status, line, fault);
     };
     expect_changes(road, throttle,
-                   {turn("Enable", FAILED, "Invalid PFCThrottle"),
-                    turn("d", FAILED, "Invalid PFCThrottle"),
-                    turn("disable", NOT_FOUND, "VLN_MethodWrapper::SetPfcThrottle failed",
+                   {turn("Enable", INVALID, "Invalid PFCThrottle"),
+                    turn("d", INVALID, "Invalid PFCThrottle"),
+                    turn("disable", FAILED, "VLN_MethodWrapper::SetPfcThrottle failed",
                          {"AX_SetAdapterAttribute", 190}),
                     turn("di", OK, "Setting PFCThrottle to disable")});
     EXPECT_EQ(text_of(road.manager().get(throttle.path).value, "PFCThrottle"), "disabled");

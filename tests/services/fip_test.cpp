@@ -109,38 +109,38 @@ TEST_F(Fip, EachRefusalHasItsLineAndChangesNothing) {
     const char* const form = "pfabric value must be in the format XX:XX:XX:XX:XX:XX:XX:XX";
     const char* const range = "VLAN ID value must be between 0 and 4095";
     const Change rows[] = {
-        {{}, CMPI_RC_ERR_FAILED, "Error: No parameter specified"},
-        {texts("PrimaryFabricName", {"100002564CFAB001"}), CMPI_RC_ERR_FAILED, form},
-        {texts("PrimaryFabricName", {"30:00:02:56:4C:FA:B0:01"}), CMPI_RC_ERR_FAILED,
+        {{}, CMPI_RC_ERR_INVALID_PARAMETER, "Error: No parameter specified"},
+        {texts("PrimaryFabricName", {"100002564CFAB001"}), CMPI_RC_ERR_INVALID_PARAMETER, form},
+        {texts("PrimaryFabricName", {"30:00:02:56:4C:FA:B0:01"}), CMPI_RC_ERR_INVALID_PARAMETER,
          "Invalid World Wide Port Name entered for primary fabric name"},
-        {texts("PrimarySwitchName", {"x"}), CMPI_RC_ERR_FAILED, form},
-        {texts("PrimarySwitchName", {"00:00:02:56:4C:FA:B0:01"}), CMPI_RC_ERR_FAILED,
+        {texts("PrimarySwitchName", {"x"}), CMPI_RC_ERR_INVALID_PARAMETER, form},
+        {texts("PrimarySwitchName", {"00:00:02:56:4C:FA:B0:01"}), CMPI_RC_ERR_INVALID_PARAMETER,
          "Invalid World Wide Port Name entered for switch fabric name"},
-        {texts("VlanID", {"12x"}), CMPI_RC_ERR_FAILED, "Invalid VLAN ID value"},
-        {texts("VlanID", {" "}), CMPI_RC_ERR_FAILED, "Invalid VLAN ID value"},
-        {texts("VlanID", {"4096"}), CMPI_RC_ERR_FAILED, range},
-        {texts("VlanID", {"-1"}), CMPI_RC_ERR_FAILED, range},
-        {texts("VlanID", {"0x1000000000000000000000"}), CMPI_RC_ERR_FAILED, range},
-        {text("FCMap", "0EFC00"), CMPI_RC_ERR_FAILED, "Invalid fcmap value"},
-        {cin(4096), CMPI_RC_ERR_FAILED, "CIN VLAN ID value must be between 0 and 4095"},
+        {texts("VlanID", {"12x"}), CMPI_RC_ERR_INVALID_PARAMETER, "Invalid VLAN ID value"},
+        {texts("VlanID", {" "}), CMPI_RC_ERR_INVALID_PARAMETER, "Invalid VLAN ID value"},
+        {texts("VlanID", {"4096"}), CMPI_RC_ERR_INVALID_PARAMETER, range},
+        {texts("VlanID", {"-1"}), CMPI_RC_ERR_INVALID_PARAMETER, range},
+        {texts("VlanID", {"0x1000000000000000000000"}), CMPI_RC_ERR_INVALID_PARAMETER, range},
+        {text("FCMap", "0EFC00"), CMPI_RC_ERR_INVALID_PARAMETER, "Invalid fcmap value"},
+        {cin(4096), CMPI_RC_ERR_INVALID_PARAMETER, "CIN VLAN ID value must be between 0 and 4095"},
         {cin(7),
-         CMPI_RC_ERR_NOT_FOUND,
+         CMPI_RC_ERR_FAILED,
          "Failed to get FIP parameters, Unknown error, exited with error code 190",
          {"AX_GetHBAFeature"}},
         {cin(7),
-         CMPI_RC_ERR_NOT_FOUND,
+         CMPI_RC_ERR_FAILED,
          "Error getting DCB FIP Parameters, Cannot set the specified parameter",
          {"AX_CNA_FCOE_GetFCFConnectList"}},
         {cin(7),
-         CMPI_RC_ERR_NOT_FOUND,
+         CMPI_RC_ERR_FAILED,
          "Error getting CIN FIP Parameters, Cannot set the specified parameter",
          {"AX_CNA_FCOE_GetFIPParams"}},
         {cin(7),
-         CMPI_RC_ERR_NOT_FOUND,
+         CMPI_RC_ERR_FAILED,
          "Setting of CIN FIP Param Failed,exited with error 190",
          {"AX_CNA_FCOE_SetFIPParams"}},
         {texts("VlanID", {"7"}),
-         CMPI_RC_ERR_NOT_FOUND,
+         CMPI_RC_ERR_FAILED,
          "Setting of DCB FIP Param Failed, exited with error 190",
          {"AX_CNA_FCOE_SetFCFConnectList"}},
     };
@@ -154,11 +154,11 @@ TEST_F(Fip, EachRefusalHasItsLineAndChangesNothing) {
                                     {"FCMap", "0x0EFC00"},
                                     {"CinVlanID", "1"}});
     set_value(PORT, "features", "FCoE", "0");
-    expect({cin(7), CMPI_RC_ERR_NOT_FOUND, "Unknown error, exited with error code 0"});
+    expect({cin(7), CMPI_RC_ERR_FAILED, "Unknown error, exited with error code 0"});
     EXPECT_EQ(road.count_in_log("Not a valid card, Feature is not supported"), 1u);
     host::set(data.path.keys, "InstanceID", Value::text("VLNMPCA_FIPData::none"));
     host::set(data.properties, "InstanceID", Value::text("VLNMPCA_FIPData::none"));
-    expect({cin(7), CMPI_RC_ERR_NOT_FOUND, "Invalid instance of VLNMPCA_FIPData"});
+    expect({cin(7), CMPI_RC_ERR_FAILED, "Invalid instance of VLNMPCA_FIPData"});
 }
 
 TEST_F(Fip, WhatIsGivenIsSetAndTheRestStays) {
@@ -202,7 +202,7 @@ TEST_F(Fip, AnInstanceShowsWhatTheAdapterHas) {
     Named_Values both = texts("VlanID", {"7"});
     both.push_back(cin(8).at(0));
     expect({both,
-            CMPI_RC_ERR_NOT_FOUND,
+            CMPI_RC_ERR_FAILED,
             "Setting of CIN FIP Param Failed,exited with error 190",
             {"AX_CNA_FCOE_SetFIPParams"}});
     expect_properties(shown(PORT), {{"VlanID", "{7}"}, {"CinVlanID", "1"}});

@@ -1,4 +1,5 @@
 // Texts that name things: WWNs, MAC addresses, device identifiers, versions.
+#include "foundation/address_text.h"
 #include "foundation/common.h"
 #include "fuzz/fuzz.h"
 #include "operations/method_wrapper.h"
@@ -81,6 +82,18 @@ void bytes_to_text(const std::string& bytes) {
     FUZZ_CHECK(std::memchr(text, 0, sizeof text) != nullptr);
 }
 
+// What is an IPv4 address to the C library is one to us; what is shown is taken.
+void written_addresses(const std::string& text) {
+    uint8 expected[4] = {};
+    const auto address = parse_ipv4(text);
+    if (std::strlen(text.c_str()) == text.size() && inet_pton(AF_INET, text.c_str(), expected) == 1)
+        FUZZ_CHECK(address && std::memcmp(address->data(), expected, sizeof expected) == 0);
+    if (address)
+        FUZZ_CHECK(parse_ipv4(ipv4_text(*address)) == address);
+    if (const auto mac = parse_mac(text))
+        FUZZ_CHECK(parse_mac(mac_digits(*mac)) == mac);
+}
+
 // Only what is an address: anything else is a name, and would go out to the network's resolver.
 void addresses(const char* text) {
     uint8 expected[16] = {};
@@ -101,6 +114,7 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
     version_texts(text.c_str());
     tokens(text.c_str());
     bytes_to_text(text);
+    written_addresses(text);
     addresses(text.c_str());
     return 0;
 }

@@ -1,5 +1,6 @@
 #include "tests/foundation/foundation_fixture.h"
 
+#include "foundation/address_text.h"
 #include "foundation/common.h"
 
 #include <cstring>
@@ -101,6 +102,30 @@ TEST_F(Text_Forms_Test, MacToNaa) {
                             "00-11-22-aa-bb-ccc", "00:11-22-aa-bb-cc", "00-11-22-aa-bb.cc"})
         EXPECT_EQ(VLN_Common::macToNaa(&text, bad), 32769) << (bad ? bad : "null");
     EXPECT_EQ(text, "00:11:22:aa:bb:cc:00:00");
+}
+
+TEST_F(Text_Forms_Test, AddressesAreTakenWholeOrNotAtAll) {
+    const auto ipv4 = [](std::string_view given) {
+        const auto address = parse_ipv4(given);
+        return address ? ipv4_text(*address) : "";
+    };
+    const auto mac = [](std::string_view given) {
+        const auto address = parse_mac(given);
+        return address ? mac_digits(*address) : "";
+    };
+    EXPECT_EQ(ipv4("0.0.0.0"), "0.0.0.0");
+    EXPECT_EQ(ipv4("255.010.9.001"), "255.10.9.1");
+    for (const char* bad : {"", "300.1.1.1", "1.2.3", "1.2.3.4x", "1.2.3.4.", "1.2.3.4.5",
+                            " 1.2.3.4", "1.2.3.4 ", "1..3.4", "1.2.3.-4", "+1.2.3.4", "1.2.3.0x4",
+                            "1.2.3.0004", "1.2.3.256", "1,2,3,4", "::1"})
+        EXPECT_EQ(ipv4(bad), "") << bad;
+    EXPECT_EQ(ipv4({"1.2.3.4\0", 8}), "");
+    for (const char* good : {"02564cABcd00", "02-56-4c-ab-cd-00", "02:56:4C:AB:CD:00"})
+        EXPECT_EQ(mac(good), "02564cabcd00") << good;
+    for (const char* bad : {"", "02564cabcd0", "02564cabcd000", "02564cabcdxx", "02-56-4c-ab-cd:00",
+                            "02 56 4c ab cd 00", "2:56:4c:ab:cd:000", "0x564cabcd00",
+                            "02.56.4c.ab.cd.00", "-2564cabcd00"})
+        EXPECT_EQ(mac(bad), "") << bad;
 }
 
 TEST_F(Text_Forms_Test, FirmwareVersions) {

@@ -171,6 +171,9 @@ enum class Effect : std::uint8_t { once, reset, reboot };
 
 // Statuses that the simulated library answers beside those of axapi.h.
 enum : AX_STATUS {
+    ip_entry_exists = 131,
+    ip_no_such_entry = 132,
+    ip_gateway_unreachable = 133,
     firmware_unreadable = 140,
     firmware_no_image = 141,
     firmware_damaged = 142,
@@ -206,6 +209,8 @@ struct Function {
     std::vector<std::pair<std::string, Bytes>> pci_vpd; // AX_GetVPD
     std::optional<AX_iSCSI_InitiatorProperties> initiator;
     std::optional<AX_Ini_NetworkProperties> network;
+    std::vector<AX_ARPEntry> arp_table;
+    std::vector<AX_RouteEntry> route_table;
     std::optional<AX_PCIRegisters> pci;
     std::optional<AX_SffData> sff;
     std::optional<std::uint32_t> beacon;

@@ -169,10 +169,4 @@ AX_STATUS AX_Ini_GetNetworkProperties(AX_WWN wwn, AX_Ini_NetworkProperties* prop
         [&](Call& call) { return answer_copy(call, wwn, properties, &Function::network); }, wwn);
 }
 
-AX_STATUS AX_Ini_SetNetworkProperties(AX_WWN wwn, const AX_Ini_NetworkProperties* properties) {
-    return answer<AX_STATUS>(
-        Entry::AX_Ini_SetNetworkProperties,
-        [&](Call& call) { return answer_set(call, wwn, properties, &Function::network); }, wwn);
-}
-
 } // namespace vlnsim::library

@@ -41,7 +41,11 @@ void read_login_options(const Node& values, AX_iSCSI_LoginOptions& options);
 std::uint32_t read_authentication(const Node& values); // AX_ISCSI_AUTH_
 // False for a text that is neither an IPv4 nor an IPv6 address.
 bool parse_address(const std::string& text, AX_IPAddress& address);
+// The address of a member, if it is there.
+void read_address(const Node& values, std::string_view key, AX_IPAddress& address);
 AX_Ini_NetworkProperties read_network(const Node& values);
+std::vector<AX_ARPEntry> read_arp_table(const Node& values);
+std::vector<AX_RouteEntry> read_route_table(const Node& values);
 AX_PCIRegisters read_pci(const Node& values);
 AX_SffData read_sff(const Node& values);
 

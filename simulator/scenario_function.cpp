@@ -157,6 +157,10 @@ void read_records(const Node& values, Function& function) {
         function.initiator = read_initiator(*node);
     if (const auto node = values.member("network"))
         function.network = read_network(*node);
+    if (const auto node = values.member("arpTable"))
+        function.arp_table = read_arp_table(*node);
+    if (const auto node = values.member("routeTable"))
+        function.route_table = read_route_table(*node);
     if (const auto node = values.member("sff"))
         function.sff = read_sff(*node);
     if (const auto node = values.member("driverParameters"))
@@ -301,6 +305,8 @@ std::span<const std::string_view> function_keys() {
                                                 "sff",
                                                 "initiator",
                                                 "network",
+                                                "arpTable",
+                                                "routeTable",
                                                 "hba",
                                                 "targets",
                                                 "iscsiTargets"};

@@ -180,13 +180,13 @@ void read_page(const Node& values, std::uint8_t (&page)[256]) {
     }
 }
 
+} // namespace
+
 void read_address(const Node& values, std::string_view key, AX_IPAddress& address) {
     const auto node = values.member(key);
     if (node && !parse_address(node->text(), address))
         node->fail("\"" + node->text() + "\" is not an IPv4 or IPv6 address");
 }
-
-} // namespace
 
 bool parse_address(const std::string& text, AX_IPAddress& address) {
     if (inet_pton(AF_INET6, text.c_str(), address.address) == 1)

@@ -43,6 +43,14 @@ Json to_json(const Record& record) {
     return hexadecimal(&record, sizeof record);
 }
 
+template <Library_Record Record>
+Json to_json(const std::vector<Record>& records) {
+    Json list = Json::array();
+    for (const Record& record : records)
+        list.push_back(to_json(record));
+    return list;
+}
+
 template <class Value>
 Json to_json(const std::optional<Value>& value) {
     return value ? to_json(*value) : Json(nullptr);
@@ -60,6 +68,13 @@ void from_json(const Node& node, std::string& text) {
 template <Library_Record Record>
 void from_json(const Node& node, Record& record) {
     std::memcpy(&record, node.bytes(sizeof record).data(), sizeof record);
+}
+
+template <Library_Record Record>
+void from_json(const Node& node, std::vector<Record>& records) {
+    records.clear();
+    for (const Node& each : node.items())
+        from_json(each, records.emplace_back());
 }
 
 template <class Value>
@@ -82,7 +97,8 @@ struct Piece {
     void (*set)(Function& function, const std::string& name, const Node& value);
 };
 
-// A member as a whole: a number, a record, or either of them where it may be missing.
+// A member as a whole: a number, a record, either of them where it may be missing, or a list of
+// records.
 template <auto member>
 constexpr Piece whole(std::string_view name) {
     return {name,
@@ -315,6 +331,8 @@ constexpr Piece PIECES[] = {
     whole<&Function::initiator>("initiator"),
     whole<&Function::network>("network"),
     whole<&Function::qos>("qos"),
+    whole<&Function::arp_table>("arpTable"),
+    whole<&Function::route_table>("routeTable"),
 };
 
 void apply_pieces(Function& function, const Node& values) {

@@ -51,6 +51,8 @@ TEST_F(Simulated, EveryKeyIsDocumented) {
         R"({"initiator": {"authentication": "?"}})",
         R"({"initiator": {"loginOptions": {"?": 0}}})",
         R"({"network": {"?": 0}})",
+        R"({"arpTable": [{"?": 0}]})",
+        R"({"routeTable": [{"?": 0}]})",
         R"({"hba": {"?": 0}})",
         R"({"driverParameters": [{"?": 0}]})",
         R"({"qos": {"?": 0}})",

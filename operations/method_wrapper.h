@@ -85,6 +85,19 @@ public:
     static AX_STATUS GetiSCSILuns(const HBA_WWN* name, const char* target, AX_iSCSI_LunList** luns);
 
     // ---- Port speed and PHY (phy.cpp) ----
+    // ---- The IP stack of an iSCSI port (ip_tables.cpp) ----
+
+    // 4 for a null port; 8 when out of memory.
+    static AX_STATUS discoverARPTable(const HBA_WWN* port, std::vector<AX_ARPEntry>* entries);
+    static AX_STATUS discoverRoute(const HBA_WWN* port, std::vector<AX_RouteEntry>* entries);
+    static AX_STATUS AddARPTableEntry(const HBA_WWN* port, const AX_ARPEntry& entry);
+    static AX_STATUS DeleteARPTableEntry(const HBA_WWN* port, const AX_ARPEntry& entry);
+    static AX_STATUS AddRouteTableEntry(const HBA_WWN* port, const AX_RouteEntry& entry);
+    static AX_STATUS DeleteRouteTableEntry(const HBA_WWN* port, const AX_RouteEntry& entry);
+    static AX_STATUS SetNetworkSettings(const HBA_WWN* port,
+                                        const AX_Ini_NetworkProperties& settings);
+
+    // ---- Port speed (phy.cpp) ----
 
     // How the speed of the physical port is set. What the adapter does not tell is 0 or empty.
     static AX_STATUS GetPhyPortSpeedAttributesValues(const HBA_WWN* name,

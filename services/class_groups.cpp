@@ -9,6 +9,7 @@
 #include "services/dump/instances.h"
 #include "services/fip/instances.h"
 #include "services/firmware/instances.h"
+#include "services/ip_tables/instances.h"
 #include "services/nic_settings/instances.h"
 #include "services/nic_settings/virtual_functions.h"
 #include "services/nic_settings/vnic_data.h"
@@ -67,6 +68,7 @@ constexpr Class_Group GROUPS[] = {
     {.place = FC_PORTS,
      .create = create_fcoe_bridging,
      .before = {VLN_DBG, "calling CreateCeeClasses for FCoE port"}},
+    {.place = ISCSI_PORT, .create = create_ip_tables},
     {.place = ISCSI_PORTS,
      .create = create_iscsi_bridging,
      .before = {VLN_DBG, "calling CreateCeeClasses for iSCSI port"}},

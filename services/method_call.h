@@ -34,18 +34,25 @@ sint32 answer_method(Property<uint32>& return_value, Body body) {
     return INVOKE_METHOD_OK;
 }
 
-// Runs modify(agent) behind the prologue, which answers the status of modify_instance.
-template <class Modify>
-sint32 answer_modify(Modify modify) {
+// Runs body(agent) behind the prologue, which answers the status of a change of instances; failed
+// when it does not come to its end.
+template <class Body>
+sint32 answer_change(sint32 failed, Body body) {
     ProviderAgent* agent = ProviderAgent::current();
     if (!agent)
-        return MODIFY_INSTANCE_FAILED;
-    sint32 status = MODIFY_INSTANCE_FAILED;
+        return failed;
+    sint32 status = failed;
     const bool complete = run_guarded([&] {
         const Operation_Prologue prologue(*agent);
-        status = modify(*agent);
+        status = body(*agent);
     });
-    return complete ? status : MODIFY_INSTANCE_FAILED;
+    return complete ? status : failed;
+}
+
+// The same for modify_instance.
+template <class Modify>
+sint32 answer_modify(Modify modify) {
+    return answer_change(MODIFY_INSTANCE_FAILED, modify);
 }
 
 // The status of a modify_instance that ends with a line of the log.

@@ -14,6 +14,8 @@
 #include "services/firmware/provider.h"
 #include "services/nic_settings/provider.h"
 #include "services/phy/provider.h"
+#include "services/ip_tables/configuration_provider.h"
+#include "services/ip_tables/provider.h"
 #include "services/profiles/provider.h"
 #include "services/wwn/provider.h"
 

@@ -44,9 +44,9 @@ constexpr const char* ADAPTER_TEXTS[] = {"100002564C",
 // read through the first FCoE function.
 const std::vector<const char*> PORT_TEXTS[2] = {
     {"100002564C0000", "VR10420117:0", "vln0p0", "0:0:0x2210", "198.51.100.12", "502564C0",
-     "example:t-0", "Global Driver Parameter"},
+     "example:t-0", "02564c0000", "Global Driver Parameter"},
     {"100002564C0001", "VR10420117:1", "vln0p1", "1:0:0x2210", "198.51.100.13", "502564C1",
-     "example:t-1"},
+     "example:t-1", "02564c0001"},
 };
 
 // Ethernet ports by the kind of their function.

@@ -198,6 +198,7 @@ constexpr Scenario SCENARIOS[] = {
     {"TwoPorts", "two-port-cna.json"}, {"Blade", "blade-16-functions.json"},
     {"FCoE", "fcoe-pair.json"},        {"ISCSI", "iscsi-sessions.json"},
     {"SmallSAN", SMALL_SAN},           {"Diagnostics", "diagnostics.json"},
+    {"IPTables", "ip-tables.json"},
 };
 
 class Oracle : public testing::TestWithParam<Scenario> {};

@@ -55,8 +55,13 @@ Prepared_Change::Prepared_Change(road::Road& road, const Change& change) : _road
                                     SMALL, error, sizeof error),
               0)
         << error;
-    const std::size_t dot = change.what.find('.');
-    _instance = find_instance(road, change.what.substr(0, dot));
+    _kind = change.what.at(0);
+    const std::string what = change.what.substr(_kind == '+' || _kind == '-');
+    const std::size_t dot = what.find('.');
+    if (_kind == '+')
+        _instance.path.class_name = what;
+    else
+        _instance = find_instance(road, what.substr(0, dot));
     const host::ClassRepository& classes = road.manager().classes();
     const host::Class* known = classes.find(_instance.path.class_name);
     std::vector<std::string> values;
@@ -66,7 +71,7 @@ Prepared_Change::Prepared_Change(road::Road& road, const Change& change) : _road
         _values = mpcactl::read_properties(classes, *known, values, "root/vorlan");
         return;
     }
-    _method = change.what.substr(dot + 1);
+    _method = what.substr(dot + 1);
     const host::Method* method = known->find_method(_method);
     if (!method)
         throw std::runtime_error("no method " + change.what);
@@ -74,17 +79,24 @@ Prepared_Change::Prepared_Change(road::Road& road, const Change& change) : _road
 }
 
 std::string Prepared_Change::make() const {
-    if (!is_modify()) {
-        const auto reply = _road.manager().invoke(_instance.path, _method, _values);
-        return host::rc_name(reply.status.rc) +
-               (reply.ok() ? " " + std::to_string(reply.value.value.as_unsigned()) : "");
-    }
+    if (!is_method())
+        return make_of_instance();
+    const auto reply = _road.manager().invoke(_instance.path, _method, _values);
+    return host::rc_name(reply.status.rc) +
+           (reply.ok() ? " " + std::to_string(reply.value.value.as_unsigned()) : "");
+}
+
+std::string Prepared_Change::make_of_instance() const {
+    if (_kind == '-')
+        return host::rc_name(_road.manager().remove(_instance.path).rc);
     host::Instance changed = _instance;
     std::vector<std::string> names;
     for (const host::Named_Value& value : _values) {
         host::set(changed.properties, value.name, value.value);
         names.push_back(value.name);
     }
+    if (_kind == '+')
+        return host::rc_name(_road.manager().create(changed).status.rc);
     return host::rc_name(_road.manager().modify(changed, names).rc);
 }
 

@@ -1,5 +1,5 @@
 // The calls that change something, for tests that let each event of them fail in turn. A service
-// joins by a line of changes.tsv for each method and each modify.
+// joins by a line of changes.tsv for each method, modify, create and delete.
 #ifndef TESTS_HOSTILE_CHANGES_H
 #define TESTS_HOSTILE_CHANGES_H
 
@@ -9,8 +9,9 @@ namespace hostile {
 
 struct Change {
     std::string scenario; // a file of the scenarios
-    // "CLASS.METHOD", called on the first instance of the class, or "CLASS", whose first instance
-    // is modified. "CLASS#2" stands for the second instance, here and below.
+    // "CLASS.METHOD", called on the first instance of the class; "CLASS", whose first instance is
+    // modified; "+CLASS", of which an instance is created; "-CLASS", whose first instance is
+    // deleted. "CLASS#2" stands for the second instance, here and below.
     std::string what;
     // As mpcactl takes them, where <CLASS> stands for the path of the first instance of a class,
     // and <> for the folder of the host's root, in which the image new.img lies.
@@ -28,10 +29,13 @@ public:
 
     // As "OK 0" or "CMPI_RC_ERR_FAILED": the status, and what a method returned.
     std::string make() const;
-    bool is_modify() const { return _method.empty(); }
+    bool is_method() const { return !_method.empty(); }
 
 private:
+    std::string make_of_instance() const; // all but a method
+
     road::Road& _road;
+    char _kind = 0; // '+', '-', or neither
     std::string _method;
     host::Instance _instance;
     host::Named_Values _values;

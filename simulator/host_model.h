@@ -160,7 +160,8 @@ struct Feature {
     AX_STATUS status = AX_STATUS_OK;
 };
 
-// The profiles of an adapter that has profile management.
+// The profiles of an adapter that has profile management. The active one is that of its
+// configuration, if it has one.
 struct Profiles {
     std::uint32_t active = 0;
     std::vector<AX_Profile> list;
@@ -178,6 +179,7 @@ enum : AX_STATUS {
     firmware_no_image = 141,
     firmware_damaged = 142,
     firmware_of_other_model = 143,
+    configuration_refused = 144,
     boot_code_enabled = 221,
     name_in_use = 94,
 };
@@ -217,7 +219,14 @@ struct Function {
     std::optional<Driver_Parameters> driver_parameters;
     std::optional<Driver_Parameters> global_driver_parameters;
     std::optional<Profiles> profiles;
-    std::uint32_t multichannel = 0; // its type
+    std::uint32_t multichannel = 0; // its type, where there is no configuration
+    // How an adapter is split, how a port's link is, and how the adapter manages that. Functions of
+    // one adapter, or one port, have the same.
+    std::optional<AX_AdapterPortConfig> port_config;
+    std::optional<AX_AdapterPortConfig> factory_port_config;
+    std::optional<AX_ChannelMgmtCNAInfo> channel_management;
+    std::optional<AX_ChannelMgmtPortInfo> channels;
+    std::optional<AX_AdapterPersonalityInfo> personality;
     Effect firmware_effect = Effect::reset;
     Effect port_effect = Effect::once;
     std::uint32_t resets = 0;
@@ -275,6 +284,8 @@ struct Host {
 
 // What the host's next start brings into force.
 void reboot(Host& host);
+// The same, of how a function's adapter is split and managed.
+void start_configuration(Function& function);
 
 // Brings the names into force that the function is configured to have.
 void activate_names(Function& function);

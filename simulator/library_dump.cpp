@@ -2,6 +2,7 @@
 // and counted on, the oldest of which go when there are more than are to be kept.
 #include "simulator/call.h"
 #include "simulator/identifiers.h"
+#include "simulator/same_hardware.h"
 
 #include <algorithm>
 #include <cstring>
@@ -33,10 +34,6 @@ AX_STATUS with_adapter(Call& call, AX_WWN wwn, Body body) {
     AX_STATUS status = AX_STATUS_OK;
     Function* function = find_adapter(call, wwn, status);
     return function ? body(*function) : status;
-}
-
-bool same_adapter(const Function& one, const Function& other) {
-    return one.card == other.card && one.sub_adapter == other.sub_adapter;
 }
 
 // All functions of an adapter have what one of them was set to.

@@ -1,22 +1,11 @@
 // Firmware, resets, and what switches a port on and off.
 #include "simulator/call.h"
 #include "simulator/firmware_image.h"
-#include "simulator/identifiers.h"
+#include "simulator/same_hardware.h"
 #include "simulator/scenario.h"
-
-#include <algorithm>
-#include <set>
 
 namespace vlnsim {
 namespace {
-
-// Calls visit for each function of the same ASIC: a card may have several.
-template <class Visit>
-void each_of_asic(Host& host, const Function& asic, Visit visit) {
-    for (Function& function : host.functions)
-        if (function.card == asic.card && function.sub_adapter == asic.sub_adapter)
-            visit(function);
-}
 
 std::uint32_t number_of(const Attribute_Map& map, std::uint16_t identifier) {
     const auto found = map.find(identifier);
@@ -102,6 +91,7 @@ void reboot(Host& host) {
         start_firmware(function);
         settle_port(function);
         activate_names(function);
+        start_configuration(function);
     }
 }
 
@@ -143,7 +133,7 @@ AX_STATUS AX_DownloadFirmware(AX_WWN wwn, const char* file, uint32_t options) {
             const Firmware_Image image = read_firmware(file);
             if (const AX_STATUS status = check_image(image, *asked))
                 return status;
-            each_of_asic(call.host, *asked, [&](Function& function) {
+            each_of_adapter(call.host, *asked, [&](Function& function) {
                 function.adapter_attributes[AX_HA_FIRMWARE_ON_FLASH] =
                     Attribute::of_text(image.version);
                 if (asked->firmware_effect == Effect::once)
@@ -162,7 +152,7 @@ AX_STATUS AX_ResetHBA(AX_WWN wwn) {
             const Function* asked = call.function(wwn);
             if (!asked)
                 return AX_STATUS_ILLEGAL_WWN;
-            each_of_asic(call.host, *asked, [&](Function& function) {
+            each_of_adapter(call.host, *asked, [&](Function& function) {
                 ++function.resets;
                 if (function.firmware_effect != Effect::reboot)
                     start_firmware(function);
@@ -206,54 +196,6 @@ AX_STATUS AX_SetPortEnabled(AX_WWN wwn, uint32_t enabled, uint32_t* dynamic) {
             return AX_STATUS_OK;
         },
         wwn, enabled);
-}
-
-AX_STATUS AX_ListProfiles(AX_WWN wwn, AX_ProfileList* list) {
-    return answer<AX_STATUS>(
-        Entry::AX_ListProfiles,
-        [&](Call& call) -> AX_STATUS {
-            if (call.null(list, "list"))
-                return AX_STATUS_INVALID_ARGUMENT;
-            const Function* function = call.function(wwn);
-            if (!function)
-                return AX_STATUS_ILLEGAL_WWN;
-            if (!function->profiles)
-                return AX_STATUS_NOT_SUPPORTED;
-            const auto& profiles = function->profiles->list;
-            if (call.list_too_small(list->count, profiles.size()))
-                return AX_STATUS_MORE_DATA;
-            list->activeProfileId = function->profiles->active;
-            list->configuredProfileId = function->profiles->active;
-            AX_Profile* entry = list->profile;
-            for (const AX_Profile& profile : profiles)
-                *entry++ = profile;
-            return AX_STATUS_OK;
-        },
-        wwn);
-}
-
-AX_STATUS AX_GetAdapterPortConfig(AX_WWN wwn, AX_AdapterPortConfig* config) {
-    return answer<AX_STATUS>(
-        Entry::AX_GetAdapterPortConfig,
-        [&](Call& call) -> AX_STATUS {
-            if (call.null(config, "config"))
-                return AX_STATUS_INVALID_ARGUMENT;
-            const Function* asked = call.function(wwn);
-            if (!asked)
-                return AX_STATUS_ILLEGAL_WWN;
-            *config = {};
-            std::set<std::uint32_t> ports;
-            each_of_asic(call.host, *asked, [&](Function& function) {
-                ports.insert(number_of(function.adapter_attributes, adapter_port_number));
-            });
-            config->portCount = static_cast<std::uint32_t>(ports.size());
-            config->activeProfileId = asked->profiles ? asked->profiles->active : 0;
-            config->configuredProfileId = config->activeProfileId;
-            config->mcType = static_cast<std::int32_t>(asked->multichannel);
-            config->configuredMCType = config->mcType;
-            return AX_STATUS_OK;
-        },
-        wwn);
 }
 
 } // namespace library

@@ -83,6 +83,10 @@ AX_QoS read_qos(const Node& values);
 // The virtual functions of a function; its names and its PCI registers have been read.
 std::vector<Virtual_Function> read_virtual_functions(const Node& values, const Function& function);
 
+// How an adapter is split, how its links are, and how that is managed: the profile and the
+// multichannel type that the function names have been read.
+void read_channel_values(const Node& values, Function& function);
+
 // The targets that an iSCSI function sees; its initiator and network records have been read.
 std::vector<iSCSI_Target> read_iscsi_targets(const Node& values, const Function& function);
 

@@ -233,6 +233,7 @@ void read_changes(const Node& values, Function& function) {
         function.virtual_functions = read_virtual_functions(*node, function);
     if (const auto node = values.member("profiles"))
         function.profiles = read_profiles(*node);
+    read_channel_values(values, function);
 }
 
 bool read_mapping_by_unit(const Node& hba) {
@@ -285,6 +286,10 @@ std::span<const std::string_view> function_keys() {
                                                 "portChangeTakesEffect",
                                                 "multichannel",
                                                 "profiles",
+                                                "portConfig",
+                                                "channelManagement",
+                                                "channels",
+                                                "personality",
                                                 "driverParameters",
                                                 "globalDriverParameters",
                                                 "dumps",

@@ -13,6 +13,9 @@ AX_BEGIN_DECLS
 
 enum { AX_PERSONALITIES = 8 };
 
+/* Assumed: the numbers. */
+enum { AX_PERSONALITY_NIC = 1, AX_PERSONALITY_ISCSI, AX_PERSONALITY_FCOE, AX_PERSONALITY_ROCE };
+
 /* Assumed: the layout. */
 typedef struct AX_AdapterPersonalityInfo {
     uint32_t current;
@@ -51,8 +54,8 @@ enum {
 };
 
 typedef struct AX_FunctionConfig {
-    uint32_t protocol;        /* AX_PROTOCOL_, in force */
-    uint32_t pendingProtocol; /* after the next reboot */
+    uint32_t protocol;        /* AX_PROTOCOL_, in force; in a set call what is to be */
+    uint32_t pendingProtocol; /* after the next reboot; not looked at in a set call */
     uint32_t flags;           /* AX_FUNCTION_ */
     uint32_t functionNumber;  /* PCI */
     uint8_t mac[6];

@@ -127,6 +127,8 @@ public:
     // 1 on, 0 off, in force after a reboot. 2 when the profile in force forbids it, 4 when
     // multichannel does.
     static AX_STATUS SetSRIOVEnabledState(const HBA_WWN* name, uint32 state);
+    // As the port tells it, in force or not.
+    static AX_STATUS GetSRIOVState(const HBA_WWN* name, uint32* state);
 
     // ---- Network boot and quality of service (nic_settings.cpp) ----
 
@@ -264,6 +266,54 @@ public:
                                uint32 type, uint32* activation, const bool& stop);
     static AX_STATUS RestoreWWN(const HBA_WWN* name, uint32 type, uint32* activation,
                                 const bool& stop);
+
+    // ---- Channels of a port (channels.cpp) ----
+
+    // An adapter without channels answers 251, which is no failure.
+    static AX_STATUS GetChannelMgmtCNAInfo(const HBA_WWN* name, AX_ChannelMgmtCNAInfo* info);
+    // Never more channels than the record has room for.
+    static AX_STATUS GetChannelMgmtPortInfo(const HBA_WWN* name, AX_ChannelMgmtPortInfo* info);
+    // What mask names is written.
+    static AX_STATUS SetChannelMgmtPortInfo(const HBA_WWN* name,
+                                            const AX_ChannelMgmtPortInfo& info);
+    // 0 for off, or the mode after the next reboot. 251 for an adapter that is configured through
+    // its profiles, 1 with SR-IOV on, 2 for a mode that the adapter does not have.
+    static AX_STATUS SetCMMode(const HBA_WWN* name, uint32 mode);
+    static AX_STATUS SetVEPAState(const HBA_WWN* name, uint32 state);
+
+    // ---- Configuration of an adapter (port_configuration.cpp) ----
+
+    // What tells how an adapter can be configured.
+    enum Configuration_Feature : uint32 {
+        CHANGES_PERSONALITY = 422,
+        HAS_SRIOV_ON = 434,
+        HAS_PROFILES = 436,
+        HAS_CURRENT_CHANNEL_MGMT = 438,
+    };
+    static AX_STATUS HasFeature(const HBA_WWN* name, Configuration_Feature feature, bool* value);
+
+    // The record has no more ports and functions than it has room for.
+    static AX_STATUS GetAdpaterPortConfig(const HBA_WWN* name, AX_AdapterPortConfig* config);
+    // 0 or 4: whether the rules of its generation allow the configuration. capabilities are those
+    // of the channel management.
+    static AX_STATUS OrriganValidateParams(const AX_AdapterPortConfig& config, bool sriovSupported,
+                                           uint32 capabilities);
+    // What becomes of the partitioning into more functions (NPAR EP) with a new configuration.
+    enum NPAR_Update : uint8 { NPAR_STAYS, NPAR_GOES_ON, NPAR_GOES_OFF };
+    // Checks the configuration and writes it, in force after the next reboot. It gets the profile
+    // that fits if it names none. etsDisabled: it has the profile without ETS. A failure leaves the
+    // number of functions as far as it was set.
+    static AX_STATUS SetAdpaterPortConfig(const HBA_WWN* name, AX_AdapterPortConfig* config,
+                                          bool* etsDisabled, NPAR_Update npar);
+    // On success the caller frees the list with free(); its count is never beyond its entries.
+    static AX_STATUS ListProfiles(const HBA_WWN* name, AX_ProfileList** profiles);
+    static AX_STATUS SetAriFunctionCount(const HBA_WWN* name, uint32 count);
+    // The configuration that the adapter came with, after the next reboot.
+    static AX_STATUS FactoryDefaults(const HBA_WWN* name);
+    // Never more personalities than the record has room for.
+    static AX_STATUS GetAdapterPersonalities(const HBA_WWN* name, AX_AdapterPersonalityInfo* info);
+    // After the next reboot. 251 for an adapter that is configured through its profiles.
+    static AX_STATUS ChangeAdapterPersonality(const HBA_WWN* name, uint32 personality);
 
     // Logs a status of the library with its text for it, if it has one, at level 5.
     static void logStatus(AX_STATUS status);

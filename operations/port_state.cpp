@@ -1,51 +1,29 @@
 // What switches a port: enabled or not, with virtual functions or without.
-#include "operations/operation_frame.h"
-
-#include <strings.h>
+#include "cimple/guard.h"
+#include "device/library/attribute_buffer.h"
+#include "operations/adapter_profiles.h"
+#include "operations/orrigan_rules.h"
 
 namespace cimple {
 
 namespace {
 
-constexpr uint32 FEATURE_SRIOV_OF_SYSTEM = 35;
 constexpr uint32 FEATURE_SET_SRIOV = 435;
-constexpr uint32 FEATURE_PROFILE_MANAGEMENT = 436;
 
 constexpr AX_STATUS BOOT_CODE_ENABLED = 221;
 constexpr uint32 NEEDS_RESET = 5; // of what AX_SetPortEnabled tells
 
 constexpr AX_STATUS PROFILE_FORBIDS_DISABLING = 2;
 constexpr AX_STATUS MULTICHANNEL_FORBIDS_ENABLING = 4;
-constexpr char ETS_DISABLED_PROFILE[] = "NIC - ETS Disabled";
-
-// Whether the profile in force has no ETS, which it can't do with SR-IOV off.
-AX_STATUS findEtsDisabled(const HBA_WWN* name, bool& found) {
-    Reply reply;
-    const Reply_Shape shape{
-        .head = sizeof(AX_ProfileList), .entry = sizeof(AX_Profile), .first = AX_PROFILES};
-    const AX_STATUS status =
-        reply.fetch(shape, {"Unable to allocate the memory for the list of profiles"},
-                    counted<AX_ProfileList>([name](AX_ProfileList* list) {
-                        return AX_ListProfiles(wwnOf(name), list);
-                    }));
-    if (status != AX_STATUS_OK) {
-        VLN_OPERATION_FAILED(status, "AX_ListProfiles error: %d", status);
-        return status;
-    }
-    const auto* list = static_cast<const AX_ProfileList*>(reply.data());
-    const AX_Profile* profile = list->profile;
-    for (uint32 i = 0; i < reply.count(); ++i, ++profile)
-        if (profile->id == list->activeProfileId &&
-            strncasecmp(profile->name, ETS_DISABLED_PROFILE, sizeof profile->name) == 0)
-            found = true;
-    return AX_STATUS_OK;
-}
 
 AX_STATUS mayDisable(const HBA_WWN* name) {
-    bool etsDisabled = false;
-    if (const AX_STATUS status = findEtsDisabled(name, etsDisabled))
+    Adapter_Profiles list;
+    if (const AX_STATUS status = list.read(name))
         return status;
-    if (!etsDisabled)
+    const auto profiles = list.profiles();
+    if (std::none_of(profiles.begin(), profiles.end(), [&](const AX_Profile& profile) {
+            return profile.id == list.list().activeProfileId && isEtsDisabled(profile);
+        }))
         return AX_STATUS_OK;
     VLN_LOG(VLN_ERR,
             " NIC ETS Disabled profile must be deconfigured before SR-IOV can be disabled");
@@ -116,6 +94,20 @@ AX_STATUS VLN_MethodWrapper::SetSRIOVEnabledState(const HBA_WWN* name, uint32 st
     if (status != AX_STATUS_OK)
         VLN_OPERATION_FAILED(status, " Operation failure. SRIOV State has not been set");
     return status;
+}
+
+AX_STATUS VLN_MethodWrapper::GetSRIOVState(const HBA_WWN* name, uint32* state) {
+    Operation_Frame frame("VLN_MethodWrapper::GetSRIOVState");
+    if (!frame.given(state))
+        return frame.status();
+    AX_STATUS status = AX_STATUS_ERROR;
+    const bool complete = run_guarded([&] {
+        Attribute_Buffer buffer(AX_PORT_ATTRIBUTES_SIZE);
+        status = fetchPortAttributes(wwnOf(name), buffer);
+        if (status == AX_STATUS_OK)
+            status = getPortAttributeNumber(buffer, AX_PA_SRIOV_STATE, "_SRIOVState", state);
+    });
+    return complete ? status : AX_STATUS_ERROR;
 }
 
 } // namespace cimple

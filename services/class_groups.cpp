@@ -2,6 +2,8 @@
 
 #include "foundation/logger.h"
 #include "services/bridging/instances.h"
+#include "services/channels/instances.h"
+#include "services/channels/port_config.h"
 #include "services/configuration/instances.h"
 #include "services/diagnostics/instances.h"
 #include "services/driver_parameters/instances.h"
@@ -34,6 +36,11 @@ constexpr Class_Group GROUPS[] = {
      .done = {VLN_DBG, "10GBaseT feature classes created Successfully"},
      .failed = {VLN_DBG, "10GBaseT feature is either Not Supported/Failed to Create the feature"},
      .thrown = {VLN_ERR, "Exception in 10GBaseT class creation"}},
+    {.place = NIC_PORTS,
+     .create = create_adapter_configurations,
+     .clear = clear_adapter_configurations,
+     .failed = {VLN_ERR, "The configuration of an adapter could not be read"},
+     .thrown = {VLN_ERR, "Exception in the configuration of the adapters"}},
     {.place = NIC,
      .create = create_nic_settings,
      .clear = clear_nic_settings,
@@ -83,6 +90,12 @@ constexpr Class_Group GROUPS[] = {
      .before = {VLN_DBG, "Creating CreateNICSrIovClasses "},
      .failed = {VLN_DBG, "SR-IOV classes are not created"},
      .thrown = {VLN_ERR, "CreateNICSrIovClasses Failed"}},
+    {.place = CLOSING,
+     .create = create_channel_service,
+     .clear = clear_channel_service,
+     .before = {VLN_DBG, "Updating MC parameters "},
+     .failed = {VLN_ERR, "MC parameters are not updated"},
+     .thrown = {VLN_ERR, "CreateChannelMgmtServiceClasses Failed"}},
     // Behind all that makes settings of channels.
     {.place = CLOSING,
      .create = update_vnic_data,

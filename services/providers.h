@@ -4,6 +4,7 @@
 #define VLN_SERVICES_PROVIDERS_H
 
 #include "services/bridging/provider.h"
+#include "services/channels/provider.h"
 #include "services/configuration/provider.h"
 #include "services/diagnostics/log_provider.h"
 #include "services/diagnostics/settings_provider.h"

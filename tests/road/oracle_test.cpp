@@ -195,9 +195,13 @@ struct Scenario {
 };
 
 constexpr Scenario SCENARIOS[] = {
-    {"TwoPorts", "two-port-cna.json"}, {"Blade", "blade-16-functions.json"},
-    {"FCoE", "fcoe-pair.json"},        {"ISCSI", "iscsi-sessions.json"},
-    {"SmallSAN", SMALL_SAN},           {"Diagnostics", "diagnostics.json"},
+    {"TwoPorts", "two-port-cna.json"},
+    {"Blade", "blade-16-functions.json"},
+    {"FCoE", "fcoe-pair.json"},
+    {"ISCSI", "iscsi-sessions.json"},
+    {"SmallSAN", SMALL_SAN},
+    {"Diagnostics", "diagnostics.json"},
+    {"SplitCards", "split-cards.json"},
     {"IPTables", "ip-tables.json"},
 };
 

@@ -272,6 +272,7 @@ TEST_F(Dump, TraceLevelsAreSetForAllModulesAndReadBack) {
                        property);
     };
     EXPECT_EQ(shown("scheduler", "Modes"), "{}");
+    road.wait_for_refreshes(1);
     vlnsim_record_calls(1);
     const Named_Values inputs = {{"Target", fc_port},
                                  {"TraceLevel", Value::text("WARNING")},

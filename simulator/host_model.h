@@ -78,7 +78,18 @@ struct iSCSI_Target {
     std::vector<iSCSI_Session> sessions;
 };
 
-using Driver_Parameters = std::vector<AX_DriverParam>;
+// A parameter of a driver.
+struct Driver_Parameter {
+    AX_DriverParam record{};
+    std::uint32_t kept = 0;          // the value that the host's next start brings
+    AX_STATUS status = AX_STATUS_OK; // of a change that is in order otherwise
+
+    std::string name() const; // of the record, which needs no NUL
+};
+using Driver_Parameters = std::vector<Driver_Parameter>;
+
+// The logical units that have priority.
+using Unit_Priorities = std::vector<AX_OASLun>;
 
 using Trace_Settings = std::vector<AX_EventLogModule>;
 
@@ -181,6 +192,11 @@ enum : AX_STATUS {
     firmware_of_other_model = 143,
     configuration_refused = 144,
     boot_code_enabled = 221,
+    parameter_unknown = 161,
+    parameter_out_of_range = 162,
+    parameter_fixed = 163,
+    parameter_not_while_running = 164,
+    unit_not_seen = 165,
     name_in_use = 94,
 };
 
@@ -218,6 +234,7 @@ struct Function {
     std::optional<std::uint32_t> beacon;
     std::optional<Driver_Parameters> driver_parameters;
     std::optional<Driver_Parameters> global_driver_parameters;
+    std::optional<Unit_Priorities> unit_priorities;
     std::optional<Profiles> profiles;
     std::uint32_t multichannel = 0; // its type, where there is no configuration
     // How an adapter is split, how a port's link is, and how the adapter manages that. Functions of
@@ -251,7 +268,7 @@ struct Function {
     std::vector<Target> targets;
     std::vector<iSCSI_Target> iscsi_targets;
 
-    std::uint64_t mac_address() const; // as a number
+    std::uint64_t mac_address() const;             // as a number
     bool shares_port(const Function& other) const; // the physical one
 };
 
@@ -286,6 +303,9 @@ struct Host {
 void reboot(Host& host);
 // The same, of how a function's adapter is split and managed.
 void start_configuration(Function& function);
+
+// What the driver's next start makes of its parameters.
+void restart_driver(Function& function);
 
 // Brings the names into force that the function is configured to have.
 void activate_names(Function& function);

@@ -92,6 +92,7 @@ void reboot(Host& host) {
         settle_port(function);
         activate_names(function);
         start_configuration(function);
+        restart_driver(function);
     }
 }
 

@@ -64,9 +64,17 @@ void read_unit_rows(const Node& target_values, std::span<const std::string_view>
                     const Add_Unit& add);
 
 Driver_Parameters read_driver_parameters(const Node& values);
-// Changes the current value of a parameter; a name that there is none of is an error at value.
+// Changes the value of a parameter: a number, or {"current": now, "kept": after the next start}. A
+// name that there is none of is an error at value.
 void set_driver_parameter(std::optional<Driver_Parameters>& parameters, const std::string& name,
                           const Node& value);
+
+// Of a function that has its name.
+Unit_Priorities read_unit_priorities(const Node& values, const Function& function);
+// "initiator:target:unit:option", by which a state has a unit's priority.
+std::string unit_priority_name(const AX_OASLun& unit);
+// Gives the unit of that name priority, with a number as its state, or takes it away, with null.
+void set_unit_priority(Function& function, const std::string& name, const Node& value);
 
 Dumps read_dumps(const Node& values);
 Fip read_fip(const Node& values);

@@ -167,6 +167,8 @@ void read_records(const Node& values, Function& function) {
         function.driver_parameters = read_driver_parameters(*node);
     if (const auto node = values.member("globalDriverParameters"))
         function.global_driver_parameters = read_driver_parameters(*node);
+    if (const auto node = values.member("unitPriorities"))
+        function.unit_priorities = read_unit_priorities(*node, function);
     if (const auto node = values.member("dumps"))
         function.dumps = read_dumps(*node);
     if (const auto node = values.member("diagnostics"))
@@ -292,6 +294,7 @@ std::span<const std::string_view> function_keys() {
                                                 "personality",
                                                 "driverParameters",
                                                 "globalDriverParameters",
+                                                "unitPriorities",
                                                 "dumps",
                                                 "diagnostics",
                                                 "bridging",

@@ -260,14 +260,26 @@ template <auto parameters>
 Json list_parameters(const Function& function) {
     Json values = Json::object();
     if (function.*parameters)
-        for (const AX_DriverParam& each : *(function.*parameters))
-            values[std::string(each.name, strnlen(each.name, sizeof each.name))] = each.current;
+        for (const Driver_Parameter& each : *(function.*parameters)) {
+            const std::uint32_t current = each.record.current;
+            values[each.name()] = current == each.kept
+                                      ? Json(current)
+                                      : Json{{"current", current}, {"kept", each.kept}};
+        }
     return values;
 }
 
 template <auto parameters>
 void set_parameter(Function& function, const std::string& name, const Node& value) {
     set_driver_parameter(function.*parameters, name, value);
+}
+
+Json list_unit_priorities(const Function& function) {
+    Json values = Json::object();
+    if (function.unit_priorities)
+        for (const AX_OASLun& each : *function.unit_priorities)
+            values[unit_priority_name(each)] = each.state;
+    return values;
 }
 
 Json list_trace_settings(const Function& function) {
@@ -314,6 +326,7 @@ constexpr Piece PIECES[] = {
           set_parameter<&Function::driver_parameters>>("driverParameters"),
     table<list_parameters<&Function::global_driver_parameters>,
           set_parameter<&Function::global_driver_parameters>>("globalDriverParameters"),
+    table<list_unit_priorities, set_unit_priority>("unitPriorities"),
     of_part<&Function::dumps, &Dumps::directory>("dumpDirectory"),
     of_part<&Function::dumps, &Dumps::retention>("dumpRetention"),
     of_part<&Function::dumps, &Dumps::stored>("storedDumps"),

@@ -177,6 +177,7 @@ TEST_F(Simulated, AStateIsWhatDiffersAndReadsBackTheSame) {
         {"features", "SRIOV", R"({"status": 190})"},
         {"features", "35", "7"},
         {"driverParameters", "nodev_tmo", "44"},
+        {"driverParameters", "tune_07", R"({"current": 60})"},
     };
     for (const auto& [table, name, value] : changes)
         ASSERT_EQ(0, vlnsim_set_value(wwn, table, name, value, error, sizeof error)) << error;

@@ -57,6 +57,8 @@ TEST_F(Simulated, EveryKeyIsDocumented) {
         R"({"driverParameters": [{"?": 0}]})",
         R"({"qos": {"?": 0}})",
         R"({"virtualFunctions": {"?": 0}})",
+        R"({"unitPriorities": [{"?": 0}]})",
+        R"({"unitPriorities": [{"target": "5000024500000001", "option": "?"}]})",
         R"({"dumps": {"?": 0}})",
         R"({"dumps": {"logType": "?"}})",
         R"({"dumps": {"modules": [{"?": 0}]}})",

@@ -158,6 +158,22 @@ public:
     // its ports. 1 for a bad identifier, 8 when out of memory.
     static AX_STATUS FCoEGetDriverParam(const char* port, bool global,
                                         std::vector<AX_DriverParam>* parameters);
+    // How far a change of a parameter reaches, and how long it holds.
+    enum Parameter_Scope : uint32 { PARAMETER_LOCAL, PARAMETER_GLOBAL };
+    enum Parameter_Duration : uint32 { PARAMETER_TEMPORARY, PARAMETER_PERSISTENT };
+    // deviceId is for the log. 1 for an adapter that is not local, a bad scope or duration, a null
+    // text, or a name that no parameter can have.
+    static AX_STATUS vlncimSetDriverParam(const char* deviceId, const HBA_WWN* name, uint32 scope,
+                                          uint32 duration, const char* parameter,
+                                          const char* value);
+    // Turns the priority of a logical unit that vport sees on (1) or off (0), through the port
+    // initiator; the unit AX_OAS_ALL_LUNS stands for all of the target. option: AX_OAS_. 1 for an
+    // identifier or a number of a unit that is none.
+    static AX_STATUS SetOASLunState(const char* initiator, const char* vport, const char* target,
+                                    const char* lun, uint32 state, uint32 option);
+    // The units with priority that the port and its virtual ports see.
+    static AX_STATUS GetOASLunList(const HBA_WWN* name, uint32 option,
+                                   std::vector<AX_OASLun>* units);
 
     // ---- Files from and to other hosts (curl_transfer.cpp) ----
 

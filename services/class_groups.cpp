@@ -7,6 +7,7 @@
 #include "services/configuration/instances.h"
 #include "services/diagnostics/instances.h"
 #include "services/driver_parameters/instances.h"
+#include "services/driver_parameters/lun_priorities.h"
 #include "services/dump/down_ports.h"
 #include "services/dump/instances.h"
 #include "services/fip/instances.h"
@@ -75,6 +76,7 @@ constexpr Class_Group GROUPS[] = {
     {.place = FC_PORTS,
      .create = create_fcoe_bridging,
      .before = {VLN_DBG, "calling CreateCeeClasses for FCoE port"}},
+    {.place = FC_PORTS, .create = create_lun_priorities}, // behind virtual ports, which it joins
     {.place = ISCSI_PORT, .create = create_ip_tables},
     {.place = ISCSI_PORTS,
      .create = create_iscsi_bridging,

@@ -9,6 +9,7 @@
 #include "services/diagnostics/log_provider.h"
 #include "services/diagnostics/settings_provider.h"
 #include "services/diagnostics/test_provider.h"
+#include "services/driver_parameters/provider.h"
 #include "services/dump/provider.h"
 #include "services/dump/settings_provider.h"
 #include "services/fip/provider.h"

@@ -1,12 +1,10 @@
 #include "services/driver_parameters/instances.h"
 
-#include "agent/associations.h"
 #include "agent/element_setting.h"
 #include "agent/provider_agent.h"
 #include "agent/status/dynamic_status.h"
 #include "agent/store_search.h"
 #include "agent/text.h"
-#include "classes/CIM_ElementSettingData.h"
 #include "classes/VLNMPCA_DriverParameterService.h"
 #include "classes/VLNMPCA_DriverParameterSettingData.h"
 #include "classes/VLNMPCA_FCPort.h"
@@ -25,16 +23,14 @@ enum class Parameter_Scope : uint8 {
     GLOBAL, // of the driver
 };
 
-constexpr char LOCAL_CONFIGURATION[] = "local";
-
 struct Parameter_Kind {
     const char* word;     // of the identifier
     const char* key_head; // by which a setting's kind is known
     uint32_t AX_DriverParam::*value;
-    Property<uint16> CIM_ElementSettingData::*flag;
+    Setting_Flag flag;
 };
 
-constexpr Parameter_Kind CURRENT = {"Current", "VLN:FCoE C", &AX_DriverParam::current,
+constexpr Parameter_Kind CURRENT = {"Current", CURRENT_SETTING_HEAD, &AX_DriverParam::current,
                                     &CIM_ElementSettingData::IsCurrent};
 constexpr Parameter_Kind DEFAULT = {"Default", "VLN:FCoE D", &AX_DriverParam::defaultValue,
                                     &CIM_ElementSettingData::IsDefault};
@@ -48,7 +44,7 @@ using Kind_Order = const Parameter_Kind* [4];
 constexpr Kind_Order LOCAL_ORDER = {&CURRENT, &DEFAULT, &MAXIMUM, &MINIMUM};
 constexpr Kind_Order GLOBAL_ORDER = {&CURRENT, &MAXIMUM, &MINIMUM, &DEFAULT};
 
-constexpr Property<uint16> CIM_ElementSettingData::*FLAGS[] = {
+constexpr Setting_Flag FLAGS[] = {
     &CIM_ElementSettingData::IsDefault, &CIM_ElementSettingData::IsCurrent,
     &CIM_ElementSettingData::IsNext,    &CIM_ElementSettingData::IsMinimum,
     &CIM_ElementSettingData::IsMaximum,
@@ -93,14 +89,6 @@ const Parameter_Kind* kind_of(const Setting& setting) {
     return nullptr;
 }
 
-Association_Details flags_of(const Parameter_Kind& kind) {
-    return [&kind](Instance& association) {
-        for (const auto flag : FLAGS)
-            (cast<CIM_ElementSettingData>(&association)->*flag)
-                .set(flag == kind.flag ? SETTING_IS : SETTING_IS_NOT);
-    };
-}
-
 // What the library tells of one scope now, in the settings that stand for it. A setting that is not
 // in the store is left to the next refresh.
 void update_settings(ProviderAgent& agent, const String& port_name, Parameter_Scope scope) {
@@ -137,12 +125,20 @@ Ref<VLNMPCA_DriverParameterService> parameter_service_instance(const CIM_Compute
     return service;
 }
 
-const VLNMPCA_DriverParameterService* parameter_service(ProviderAgent& agent) {
+} // namespace
+
+const VLNMPCA_DriverParameterService* parameter_service(const ProviderAgent& agent) {
     const auto& services = agent.m_VLNMPCA_DriverParameterService_map;
     return services.size() == 0 ? nullptr : services[0];
 }
 
-} // namespace
+Association_Details setting_flags(Setting_Flag one) {
+    return [one](Instance& association) {
+        for (const auto flag : FLAGS)
+            (cast<CIM_ElementSettingData>(&association)->*flag)
+                .set(flag == one ? SETTING_IS : SETTING_IS_NOT);
+    };
+}
 
 uint32 create_driver_parameter_service(const Map_Scope& scope) {
     ProviderAgent& agent = scope.agent;
@@ -181,14 +177,14 @@ uint32 join_driver_parameters(const Map_Scope& scope) {
         }
         if (service)
             associate(agent.m_VLNMPCA_DriverElementSettingData_map, service, &setting, {},
-                      flags_of(*kind));
+                      setting_flags(kind->flag));
         if (setting.ConfigurationName.value != LOCAL_CONFIGURATION)
             continue;
         const auto* port = find_in_system(agent, agent.m_VLNMPCA_FCPort_map,
                                           &VLNMPCA_FCPort::DeviceID, setting.ElementName.value);
         if (port)
             associate(agent.m_VLNMPCA_LocalPortElementSettingData_map, port, &setting, {},
-                      flags_of(*kind));
+                      setting_flags(kind->flag));
     }
     return MAP_OK;
 }

@@ -5,9 +5,18 @@
 #ifndef VLN_SERVICES_DRIVER_PARAMETERS_INSTANCES_H
 #define VLN_SERVICES_DRIVER_PARAMETERS_INSTANCES_H
 
+#include "agent/associations.h"
 #include "agent/class_groups.h"
+#include "classes/CIM_ElementSettingData.h"
 
 namespace cimple {
+
+struct VLNMPCA_DriverParameterService;
+
+// The identifiers of current settings begin with it, and no others do.
+inline constexpr char CURRENT_SETTING_HEAD[] = "VLN:FCoE C";
+// ConfigurationName of a parameter that each port has for itself.
+inline constexpr char LOCAL_CONFIGURATION[] = "local";
 
 // The service, before the first FC port.
 uint32 create_driver_parameter_service(const Map_Scope& scope);
@@ -16,6 +25,14 @@ uint32 create_driver_parameter_service(const Map_Scope& scope);
 uint32 create_driver_parameters(const Map_Scope& scope);
 // Joins every setting with the service that sets it and, one of a port, with its port.
 uint32 join_driver_parameters(const Map_Scope& scope);
+
+// In its store, or null on a host without one.
+const VLNMPCA_DriverParameterService* parameter_service(const ProviderAgent& agent);
+
+// What an association with a setting tells: the one flag that holds, and that all others do not;
+// null for none that holds.
+using Setting_Flag = Property<uint16> CIM_ElementSettingData::*;
+Association_Details setting_flags(Setting_Flag one);
 
 } // namespace cimple
 

@@ -203,6 +203,7 @@ constexpr Scenario SCENARIOS[] = {
     {"Diagnostics", "diagnostics.json"},
     {"SplitCards", "split-cards.json"},
     {"IPTables", "ip-tables.json"},
+    {"DriverParameters", "driver-parameters.json"},
 };
 
 class Oracle : public testing::TestWithParam<Scenario> {};

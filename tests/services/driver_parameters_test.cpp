@@ -1,5 +1,6 @@
-// The parameters of the FCoE driver as a client reads them.
+// The parameters of the FCoE driver as a client reads and sets them.
 #include "tests/road/properties.h"
+#include "tests/services/changes.h"
 
 using road::end_of;
 using road::expect_properties;
@@ -8,6 +9,9 @@ using road::Road;
 using road::set_value;
 using road::text_of;
 using road::walk;
+using services::Change;
+using services::expect_changes;
+using services::Fault;
 
 namespace {
 
@@ -118,6 +122,104 @@ TEST(DriverParameters, ValuesAreReadAtMostEveryFiveSeconds) {
     EXPECT_EQ(value(global), "128");
     EXPECT_EQ(value(local), "77");
     EXPECT_EQ(value(parameter_id("Default Local", std::string(ALONE) + ":nodev_tmo")), "30");
+}
+
+// ---- Changes ----
+
+constexpr CMPIrc REFUSED = CMPI_RC_ERR_INVALID_PARAMETER;
+constexpr CMPIrc FAILED = CMPI_RC_ERR_FAILED;
+
+class Driver_Parameter_Changes : public testing::Test {
+protected:
+    host::Instance setting(const std::string& id) {
+        return find(road, "VLNMPCA_DriverParameterSettingData", "InstanceID", id);
+    }
+    host::Instance local(const char* name) {
+        return setting(parameter_id("Current Local", std::string(PAIRED) + ":" + name));
+    }
+    host::Instance global(const char* name) {
+        return setting(parameter_id("Current Global", name));
+    }
+    std::string value(const host::Instance& setting) {
+        return text_of(road.manager().get(setting.path).value, "Value");
+    }
+
+    Road road{{.scenario = "driver-parameters.json", .log = true}};
+};
+
+Change set(std::uint32_t value, CMPIrc status, const char* line, const Fault& fault = {}) {
+    return {{{"Value", services::number(CMPI_uint32, value)}}, status, line, fault};
+}
+
+Change asks(std::uint32_t value, const char* call) {
+    return {{{"Value", services::number(CMPI_uint32, value)}},
+            CMPI_RC_OK,
+            "vlncimFCoESetDriverParam succeded",
+            {},
+            call};
+}
+
+TEST_F(Driver_Parameter_Changes, ScopeAndDurationAreThoseOfTheParameter) {
+    const host::Instance timeout = local("nodev_tmo"), depth = local("lun_queue_depth");
+    const host::Instance verbose = global("log_verbose"), npiv = global("enable_npiv");
+    expect_changes(road, timeout, {asks(60, R"("nodev_tmo=60", 0))")});
+    expect_changes(road, depth, {asks(128, R"("lun_queue_depth=128", 1))")});
+    expect_changes(road, verbose, {asks(0xFFFFFFFF, R"("log_verbose=-1", 2))")});
+    expect_changes(road, npiv, {asks(0, R"("enable_npiv=0", 3))")});
+    vlnsim_advance(5 * SECOND);
+    const auto expect = [&](const char* of_timeout, const char* of_depth, const char* of_verbose,
+                            const char* of_npiv) {
+        EXPECT_EQ(value(timeout), of_timeout);
+        EXPECT_EQ(value(depth), of_depth);
+        EXPECT_EQ(value(verbose), of_verbose);
+        EXPECT_EQ(value(npiv), of_npiv);
+    };
+    expect("60", "128", "4294967295", "0");
+    EXPECT_EQ(value(setting(parameter_id("Default Local", std::string(PAIRED) + ":nodev_tmo"))),
+              "30");
+    vlnsim_reboot();
+    vlnsim_advance(5 * SECOND);
+    expect("30", "128", "0", "0");
+}
+
+TEST_F(Driver_Parameter_Changes, EachRefusalHasItsLine) {
+    const auto through = [](const char* port, CMPIrc status, const char* line) {
+        return Change{{{"Value", services::number(CMPI_uint32, 60)},
+                       {"ElementName", host::Value::text(port)}},
+                      status,
+                      line};
+    };
+    const char* const not_set = "vlncimFCoESetDriverParam failed";
+    const host::Instance timeout = local("nodev_tmo");
+    expect_changes(
+        road, timeout,
+        {{{}, REFUSED, "No Value specified"},
+         {{{"Value", host::Value::null(CMPI_uint32)}}, REFUSED, "No Value specified"},
+         set(0, FAILED, "The value is out of the parameter's range"),
+         set(256, FAILED, not_set),
+         set(60, FAILED, "AX_SetDriverParam fails with status : 190", {"AX_SetDriverParam", 190}),
+         set(60, FAILED, "INVALID wwpn", {"AX_IsLocalHBA", 1}),
+         through("100002564C00", FAILED, "::modify_instance::str2HBAName failed"),
+         through(ALONE, FAILED, "The driver parameter is not set through the port"),
+         through("\"100002564C000001", CMPI_RC_OK, "succeded"),
+         through("", CMPI_RC_OK, "succeded")});
+    EXPECT_EQ(value(timeout), "60");
+    expect_changes(road, local("topology"), {set(1, FAILED, "The parameter can't be changed")});
+    expect_changes(road, local("scan_down"), {set(0, FAILED, "fails with status : 190")});
+    EXPECT_EQ(value(local("scan_down")), "1");
+    host::Instance unknown = timeout;
+    for (host::Named_Values* values : {&unknown.path.keys, &unknown.properties})
+        host::set(*values, "InstanceID",
+                  host::Value::text(parameter_id("Current Local", "nodev_tmo")));
+    expect_changes(road, unknown, {set(60, FAILED, "Invalid instance of VLNMPCA_DriverParameter")});
+    for (const std::string& id :
+         {parameter_id("Default Global", "log_verbose"),
+          parameter_id("Maximum Local", std::string(PAIRED) + ":nodev_tmo"),
+          parameter_id("Minimum Global", "log_verbose"),
+          std::string("VLN:PrioVia:Driver:100002564C000001:502564C000000000:1")})
+        expect_changes(
+            road, setting(id),
+            {set(1, REFUSED, "Modify instance is supported only on the current instance.")});
 }
 
 } // namespace

@@ -5,6 +5,7 @@
 #define VLNSIM_HOST_MODEL_H
 
 #include "device/library/axapi.h"
+#include "simulator/iscsi_model.h"
 
 #include <array>
 #include <cstdint>
@@ -58,24 +59,6 @@ struct Target {
     std::uint32_t bus = 0;
     std::uint32_t number = 0;
     std::vector<Unit> units;
-};
-
-// What an iSCSI function sees. Bytes of a record that the library leaves as they are are not zero.
-struct iSCSI_Unit {
-    AX_iSCSI_Lun entry{};
-    AX_iSCSI_LunProperties properties{};
-    bool silent = false; // its properties can't be had
-};
-
-struct iSCSI_Session {
-    AX_iSCSI_Session entry{};
-    AX_iSCSI_SessionInfo info{};
-};
-
-struct iSCSI_Target {
-    AX_iSCSI_Target entry{};
-    std::vector<iSCSI_Unit> units;
-    std::vector<iSCSI_Session> sessions;
 };
 
 // A parameter of a driver.
@@ -267,6 +250,10 @@ struct Function {
     bool mapping_by_unit = false; // all targets' first units first, or target by target
     std::vector<Target> targets;
     std::vector<iSCSI_Target> iscsi_targets;
+    std::vector<Send_Target_Portal> send_target_portals;
+    Name_Servers name_servers; // iSNS
+    AX_iSCSI_PortStatistics iscsi_statistics{};
+    bool takes_eto = true; // whether the operating system takes a target's extended time-out
 
     std::uint64_t mac_address() const;             // as a number
     bool shares_port(const Function& other) const; // the physical one
@@ -295,6 +282,7 @@ struct Host {
     AX_ServerAttributes server{};
     std::string address = "192.0.2.10"; // of the host's name; empty: cannot be resolved
     std::vector<Function> functions;
+    iSCSI_Network iscsi_network;
     std::vector<Function> dead_ports; // whose firmware has failed: no instances of the library
     std::vector<Fault> faults;
 };

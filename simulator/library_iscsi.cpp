@@ -7,6 +7,8 @@
 namespace vlnsim::library {
 namespace {
 
+const std::vector<iSCSI_Unit> no_units;
+
 bool is_iscsi(const Function& function) {
     return function.special_features & AX_FEATURE_ISCSI_FUNCTION;
 }
@@ -96,7 +98,9 @@ AX_STATUS AX_iSCSI_GetLuns(AX_WWN wwn, const char* targetName, AX_iSCSI_LunList*
             if (call.null(list, "list"))
                 return status;
             const iSCSI_Target* target = find_target(call, wwn, targetName, status);
-            return target ? answer_list(call, target->units, list) : status;
+            if (!target)
+                return status;
+            return answer_list(call, target->lists_units ? target->units : no_units, list);
         },
         wwn, targetName);
 }

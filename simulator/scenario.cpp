@@ -300,8 +300,8 @@ Host read_scenario(const std::string& text, const std::string& name) {
     const Value document = with_includes(text, name, 0);
     const Scope scope;
     const Node top(document, scope);
-    top.expect_object(
-        {"description", "include", "templates", "libraries", "server", "cards", "faults"});
+    top.expect_object({"description", "include", "templates", "libraries", "server", "iscsiNetwork",
+                       "cards", "faults"});
     Host host;
     copy_text("simulated-host", host.server.hostName, sizeof host.server.hostName);
     copy_text("Linux 2.6 x86_64 RH", host.server.targetOS, sizeof host.server.targetOS);
@@ -309,6 +309,8 @@ Host read_scenario(const std::string& text, const std::string& name) {
         read_libraries(*libraries, host);
     if (const auto server = top.member("server"))
         read_server(*server, host);
+    if (const auto network = top.member("iscsiNetwork"))
+        host.iscsi_network = read_iscsi_network(*network);
     if (const auto cards = top.member("cards")) {
         Card_Reader reader(top, host);
         for (const Node& card : cards->items())

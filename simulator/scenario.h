@@ -39,6 +39,9 @@ AX_iSCSI_InitiatorProperties read_initiator(const Node& values);
 // Options that are not given stay as they are.
 void read_login_options(const Node& values, AX_iSCSI_LoginOptions& options);
 std::uint32_t read_authentication(const Node& values); // AX_ISCSI_AUTH_
+// The same with names and secrets.
+AX_iSCSI_Authentication read_account(const Node& values);
+AX_iSCSI_PortStatistics read_iscsi_statistics(const Node& values);
 // False for a text that is neither an IPv4 nor an IPv6 address.
 bool parse_address(const std::string& text, AX_IPAddress& address);
 // The address of a member, if it is there.
@@ -97,6 +100,8 @@ void read_channel_values(const Node& values, Function& function);
 
 // The targets that an iSCSI function sees; its initiator and network records have been read.
 std::vector<iSCSI_Target> read_iscsi_targets(const Node& values, const Function& function);
+iSCSI_Network read_iscsi_network(const Node& values);
+Name_Servers read_name_servers(const Node& values);
 
 Fault read_fault(const Node& values);
 

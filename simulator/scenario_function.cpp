@@ -265,6 +265,16 @@ void read_san(const Node& values, bool in_hba_api, Function& function) {
         function.targets = read_targets(*targets);
 }
 
+void read_iscsi(const Node& values, Function& function) {
+    if (const auto targets = values.member("iscsiTargets"))
+        function.iscsi_targets = read_iscsi_targets(*targets, function);
+    if (const auto statistics = values.member("iscsiStatistics"))
+        function.iscsi_statistics = read_iscsi_statistics(*statistics);
+    if (const auto servers = values.member("isns"))
+        function.name_servers = read_name_servers(*servers);
+    function.takes_eto = values.boolean("takesETO", true);
+}
+
 } // namespace
 
 std::span<const std::string_view> function_keys() {
@@ -317,7 +327,10 @@ std::span<const std::string_view> function_keys() {
                                                 "routeTable",
                                                 "hba",
                                                 "targets",
-                                                "iscsiTargets"};
+                                                "iscsiTargets",
+                                                "iscsiStatistics",
+                                                "isns",
+                                                "takesETO"};
     return keys;
 }
 
@@ -382,8 +395,7 @@ Function read_function(const Node& values) {
     read_records(values, function);
     read_changes(values, function);
     read_san(values, type.in_hba_api, function);
-    if (const auto targets = values.member("iscsiTargets"))
-        function.iscsi_targets = read_iscsi_targets(*targets, function);
+    read_iscsi(values, function);
     return function;
 }
 

@@ -12,9 +12,8 @@ namespace {
 constexpr std::uint64_t max_targets = 4096;
 constexpr std::uint64_t max_sessions = 1024;
 constexpr std::uint16_t iscsi_port = 3260;
-constexpr std::uint16_t first_dynamic_port = 49152; // RFC 6335
-constexpr std::uint64_t isid_base = 0x400002560000; // enterprise number form, RFC 7143, 11.12.5
-constexpr std::uint64_t max_isid = 0xFFFFFFFFFFFF;  // 48 bits
+constexpr std::uint16_t isns_port = 3205;
+constexpr std::uint64_t max_isid = 0xFFFFFFFFFFFF; // 48 bits
 constexpr std::string_view default_target = "198.51.100.200";
 
 // Keys of a unit; at a target they hold for all its units.
@@ -186,12 +185,7 @@ iSCSI_Session read_session(const Session_Row& row) {
     if (const auto negotiated = values.member("negotiated"))
         read_login_options(*negotiated, info.negotiated);
     read_counters(values, info);
-    soil(&session.entry, 0, sizeof session.entry);
-    session.entry.isid = info.isid;
-    session.entry.isidQualifier = info.isidQualifier;
-    session.entry.tsih = info.tsih;
-    session.entry.closed = info.closed;
-    session.entry.sessionId = values.number32("id", row.id);
+    session.entry = session_entry(info, values.number32("id", row.id));
     return session;
 }
 
@@ -232,8 +226,11 @@ void read_sessions(const Node& values, const Function& function, std::uint32_t& 
     }
 }
 
-iSCSI_Target read_target(const Node& values, const Function& function, std::uint64_t number,
-                         std::uint32_t& next_id) {
+constexpr std::string_view account_keys[] = {"authentication", "targetCHAPName", "targetSecret",
+                                             "initiatorCHAPName", "initiatorSecret"};
+
+// What a target is wherever it stands.
+iSCSI_Target read_target(const Node& values, std::uint64_t number) {
     iSCSI_Target target;
     soil(&target.entry, 0, sizeof target.entry);
     put_field(values, "name", "iqn.2010-04.com.example:target" + std::to_string(number),
@@ -241,29 +238,106 @@ iSCSI_Target read_target(const Node& values, const Function& function, std::uint
     read_unit_rows(values, unit_keys, [&](const Node&, const Node& unit, std::uint64_t lun) {
         target.units.push_back(read_unit(unit, number, lun));
     });
+    target.wanted = read_account(values);
+    target.alias = values.text("alias", "");
+    if (const auto options = values.member("loginOptions")) {
+        // What is not told is whatever is offered.
+        target.limits.emplace();
+        std::memset(&*target.limits, 0xFF, sizeof *target.limits);
+        target.limits->defaultTime2Wait = 0;
+        target.limits->initialR2T = 0;
+        target.limits->dataPDUInOrder = 0;
+        target.limits->dataSequenceInOrder = 0;
+        read_login_options(*options, *target.limits);
+    }
+    target.entry.flags = 0;
+    return target;
+}
+
+iSCSI_Target read_known_target(const Node& values, const Function& function, std::uint64_t number,
+                               std::uint32_t& next_id) {
+    iSCSI_Target target = read_target(values, number);
     read_sessions(values, function, next_id, target);
     std::uint64_t flags = target.sessions.empty() ? 0 : AX_ISCSI_TARGET_HAS_SESSIONS;
     if (values.boolean("boot", false))
         flags |= AX_ISCSI_TARGET_BOOT;
     target.entry.flags = static_cast<std::uint8_t>(values.number("flags", flags, 0xFF));
+    if (function.initiator)
+        target.login.options = function.initiator->loginOptions;
     return target;
+}
+
+// Calls add(values, number) for each target of a row of targets, or of a list of rows.
+template <class Add>
+void read_target_rows(const Node& rows, std::initializer_list<std::string_view> own, Add add) {
+    std::uint64_t number = 0;
+    for (const Node& row : rows.items_or_self()) {
+        std::vector<std::string_view> known = joined_keys(unit_keys, own);
+        known.insert(known.end(), std::begin(account_keys), std::end(account_keys));
+        known.insert(known.end(), {"count", "name", "luns", "alias", "loginOptions"});
+        row.expect_object(known);
+        const std::uint64_t count = row.number("count", 1, max_targets);
+        for (std::uint64_t i = 0; i < count; ++i, ++number) {
+            const Scope scope = row.scope().with("target", number);
+            add(Node(row.value(), scope), number);
+        }
+    }
+}
+
+iSCSI_Portal read_network_portal(const Node& values) {
+    values.expect_object(joined_keys(account_keys, {"address", "targets"}));
+    iSCSI_Portal portal;
+    const auto address = values.member("address");
+    if (!address)
+        values.fail("\"address\" is wanted");
+    read_portal(*address, iscsi_port, portal.address);
+    portal.wanted = read_account(values);
+    if (const auto targets = values.member("targets"))
+        read_target_rows(*targets, {}, [&](const Node& target, std::uint64_t number) {
+            portal.targets.push_back(read_target(target, number));
+        });
+    return portal;
 }
 
 } // namespace
 
+iSCSI_Network read_iscsi_network(const Node& values) {
+    values.expect_object({"portals", "hosts"});
+    iSCSI_Network network;
+    if (const auto portals = values.member("portals"))
+        for (const Node& portal : portals->items_or_self())
+            network.portals.push_back(read_network_portal(portal));
+    if (const auto hosts = values.member("hosts"))
+        for (const Node& host : hosts->items_or_self()) {
+            host.expect_object({"address", "answers"});
+            AX_IPAddress address{};
+            if (!parse_address(host.text("address", ""), address))
+                host.fail("\"address\" is wanted");
+            network.hosts.emplace_back(address, host.boolean("answers", true));
+        }
+    return network;
+}
+
+Name_Servers read_name_servers(const Node& values) {
+    values.expect_object({"enabled", "servers"});
+    Name_Servers servers;
+    servers.enabled = values.boolean("enabled", false);
+    if (const auto list = values.member("servers"))
+        for (const Node& server : list->items_or_self()) {
+            AX_IPAddress address{};
+            read_portal(server, isns_port, address);
+            servers.list.push_back(address);
+        }
+    return servers;
+}
+
 std::vector<iSCSI_Target> read_iscsi_targets(const Node& values, const Function& function) {
     std::vector<iSCSI_Target> targets;
     std::uint32_t next_id = 1;
-    for (const Node& row : values.items_or_self()) {
-        row.expect_object(
-            joined_keys(unit_keys, {"count", "name", "luns", "sessions", "boot", "flags"}));
-        const std::uint64_t count = row.number("count", 1, max_targets);
-        for (std::uint64_t i = 0; i < count; ++i) {
-            const std::uint64_t number = targets.size();
-            const Scope scope = row.scope().with("target", number);
-            targets.push_back(read_target(Node(row.value(), scope), function, number, next_id));
-        }
-    }
+    read_target_rows(values, {"sessions", "boot", "flags"},
+                     [&](const Node& target, std::uint64_t number) {
+                         targets.push_back(read_known_target(target, function, number, next_id));
+                     });
     return targets;
 }
 

@@ -115,8 +115,19 @@ const Field login_fields[] = {
 };
 #undef LOGIN
 
+#define COUNTER(field) FIELD(AX_iSCSI_PortStatistics, field)
+const Field statistics_fields[] = {
+    COUNTER(bytesTransmitted),    COUNTER(bytesReceived),          COUNTER(pdusTransmitted),
+    COUNTER(pdusReceived),        COUNTER(loginAccepts),           COUNTER(loginOtherFails),
+    COUNTER(loginRedirects),      COUNTER(loginAuthenticateFails), COUNTER(loginAuthorizeFails),
+    COUNTER(loginNegotiateFails), COUNTER(logoutNormals),          COUNTER(logoutOtherCodes),
+    COUNTER(sessionDigestErrors), COUNTER(sessionTimeoutErrors),   COUNTER(sessionFormatErrors),
+    COUNTER(sessionFailures),
+};
+#undef COUNTER
+
 void store(const Node& node, const Field& field, std::size_t index, void* record) {
-    const std::uint64_t maximum = field.width == 4 ? 0xFFFFFFFF : field.width == 2 ? 0xFFFF : 0xFF;
+    const std::uint64_t maximum = ~std::uint64_t{} >> (64 - 8 * field.width);
     // The low bytes come first on every platform of this project.
     const std::uint64_t number = node.number(maximum);
     std::memcpy(static_cast<std::uint8_t*>(record) + field.offset + index * field.width, &number,
@@ -208,6 +219,16 @@ std::uint32_t read_authentication(const Node& values) {
     return static_cast<std::uint32_t>(it - std::begin(names));
 }
 
+AX_iSCSI_Authentication read_account(const Node& values) {
+    AX_iSCSI_Authentication account{};
+    account.method = read_authentication(values);
+    read_text(values, "targetCHAPName", account.targetCHAPName);
+    read_text(values, "targetSecret", account.targetSecret);
+    read_text(values, "initiatorCHAPName", account.initiatorCHAPName);
+    read_text(values, "initiatorSecret", account.initiatorSecret);
+    return account;
+}
+
 void read_login_options(const Node& values, AX_iSCSI_LoginOptions& options) {
     read_fields(values, login_fields, &options);
 }
@@ -253,15 +274,16 @@ AX_iSCSI_InitiatorProperties read_initiator(const Node& values) {
     AX_iSCSI_InitiatorProperties initiator{};
     read_text(values, "name", initiator.name);
     read_text(values, "alias", initiator.alias);
-    auto& authentication = initiator.authentication;
-    authentication.method = read_authentication(values);
-    read_text(values, "targetCHAPName", authentication.targetCHAPName);
-    read_text(values, "targetSecret", authentication.targetSecret);
-    read_text(values, "initiatorCHAPName", authentication.initiatorCHAPName);
-    read_text(values, "initiatorSecret", authentication.initiatorSecret);
+    initiator.authentication = read_account(values);
     if (const auto options = values.member("loginOptions"))
         read_login_options(*options, initiator.loginOptions);
     return initiator;
+}
+
+AX_iSCSI_PortStatistics read_iscsi_statistics(const Node& values) {
+    AX_iSCSI_PortStatistics statistics{};
+    read_fields(values, statistics_fields, &statistics);
+    return statistics;
 }
 
 AX_Ini_NetworkProperties read_network(const Node& values) {

@@ -1,6 +1,7 @@
 #include "simulator/state.h"
 
 #include "simulator/scenario.h"
+#include "simulator/state_iscsi.h"
 
 #include <algorithm>
 #include <concepts>
@@ -14,16 +15,6 @@ namespace {
 using Json = nlohmann::ordered_json;
 
 // ---- A value as JSON, and back ----
-
-std::string hexadecimal(const void* data, std::size_t size) {
-    std::string text;
-    char pair[4];
-    for (std::size_t i = 0; i < size; ++i) {
-        std::snprintf(pair, sizeof pair, "%02X", static_cast<const std::uint8_t*>(data)[i]);
-        text += pair;
-    }
-    return text;
-}
 
 template <class Record>
 concept Library_Record = std::is_class_v<Record> && std::is_trivially_copyable_v<Record>;
@@ -350,6 +341,10 @@ constexpr Piece PIECES[] = {
     whole<&Function::qos>("qos"),
     whole<&Function::arp_table>("arpTable"),
     whole<&Function::route_table>("routeTable"),
+    table<list_iscsi_targets, set_iscsi_target>("iscsiTargets"),
+    table<list_send_target_portals, set_send_target_portal>("sendTargetPortals"),
+    table<list_name_servers, set_name_server>("isns"),
+    whole<&Function::iscsi_statistics>("iscsiStatistics"),
 };
 
 void apply_pieces(Function& function, const Node& values) {
@@ -369,6 +364,16 @@ std::string file_name(const std::string& path) {
 }
 
 } // namespace
+
+std::string hexadecimal(const void* data, std::size_t size) {
+    std::string text;
+    char pair[4];
+    for (std::size_t i = 0; i < size; ++i) {
+        std::snprintf(pair, sizeof pair, "%02X", static_cast<const std::uint8_t*>(data)[i]);
+        text += pair;
+    }
+    return text;
+}
 
 std::string state_text(const Host& now, const Host& described, const std::string& scenario) {
     Json functions = Json::object();

@@ -10,6 +10,9 @@
 
 namespace vlnsim {
 
+// Bytes as two digits each, which mean the same to both word sizes.
+std::string hexadecimal(const void* data, std::size_t size);
+
 // What differs between the running host and the one that its scenario describes. scenario is that
 // one's name, which the state remembers.
 std::string state_text(const Host& now, const Host& described, const std::string& scenario);

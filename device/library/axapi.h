@@ -53,6 +53,7 @@ typedef uint32_t AX_STATUS;
 #define AX_STATUS_WWN_NOT_SUPPORTED 89u
 #define AX_STATUS_WWN_NOT_AVAILABLE 92u
 #define AX_STATUS_WWN_IN_PROGRESS 97u /* call again */
+#define AX_STATUS_TARGET_IN_USE 108u  /* assumed: a target with sessions is not removed */
 #define AX_STATUS_PORTAL_EXISTS 116u  /* the portal stands with other login options */
 #define AX_STATUS_MAILBOX_FAILED 148u /* firmware download: internal error of the driver */
 #define AX_STATUS_MAILBOX_TIMEOUT 149u

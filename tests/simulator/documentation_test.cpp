@@ -92,6 +92,11 @@ TEST_F(Simulated, EveryKeyIsDocumented) {
         R"({"targets": {"luns": {"?": 0}}})",
         R"({"targets": {"luns": {"identifier": {"?": 0}}}})",
         R"({"targets": {"luns": {"responses": {"?": 0}}}})",
+        R"({"iscsiNetwork": {"?": 0}})",
+        R"({"iscsiNetwork": {"portals": {"?": 0}}})",
+        R"({"iscsiNetwork": {"hosts": {"?": 0}}})",
+        R"({"iscsiStatistics": {"?": 0}})",
+        R"({"isns": {"?": 0}})",
         R"({"iscsiTargets": {"?": 0}})",
         R"({"iscsiTargets": {"luns": {"?": 0}}})",
         R"({"iscsiTargets": {"sessions": {"?": 0}}})",
@@ -103,7 +108,7 @@ TEST_F(Simulated, EveryKeyIsDocumented) {
     for (std::string object : objects) {
         const bool is_top = object.starts_with("{\"?\"") || object.starts_with("{\"libraries") ||
                             object.starts_with("{\"server") || object.starts_with("{\"faults") ||
-                            object.starts_with("{\"cards");
+                            object.starts_with("{\"cards") || object.starts_with("{\"iscsiNetwork");
         if (!is_top)
             object = R"({"cards": [{"type": "fcoe", "wwpn": "1000024500000001", "functions": [)" +
                      object + "]}]}";

@@ -28,9 +28,9 @@ bool pass_adapter_maps(const Visit& visit) {
     return agent.m_bIsAdapterMapsReady || !visit.was_cut();
 }
 
-Mutex& data_mutex_behind_gates(ProviderAgent& agent) {
+Mutex& data_mutex_behind_gates(ProviderAgent& agent, Pending_Requests requests) {
     for (;;) {
-        const Visit visit(agent);
+        const Visit visit(agent, requests);
         if (pass_adapter_data(visit) && pass_adapter_maps(visit))
             return agent.m_DataMutex;
     }
@@ -44,8 +44,8 @@ void request_stale_san_maps(ProviderAgent& agent) {
         agent.m_bSANMapsAsked = true;
 }
 
-Operation_Prologue::Operation_Prologue(ProviderAgent& agent)
-    : _agent(agent), _data_lock(data_mutex_behind_gates(agent)) {}
+Operation_Prologue::Operation_Prologue(ProviderAgent& agent, Pending_Requests requests)
+    : _agent(agent), _data_lock(data_mutex_behind_gates(agent, requests)) {}
 
 void Operation_Prologue::refreshAdapterMaps() {
     struct Given_Up {

@@ -15,8 +15,9 @@ namespace cimple {
 // A look at the data: BuildCimpleInfo, and which refreshes had been cut before it.
 class Visit {
 public:
-    explicit Visit(ProviderAgent& agent) : agent(agent), _cuts(agent.m_CutRefreshes) {
-        agent.BuildCimpleInfo();
+    explicit Visit(ProviderAgent& agent, Pending_Requests requests = Pending_Requests::SERVED)
+        : agent(agent), _cuts(agent.m_CutRefreshes) {
+        agent.BuildCimpleInfo(requests);
     }
     bool was_cut() const { return _cuts != agent.m_CutRefreshes; }
 
@@ -86,7 +87,8 @@ void request_stale_san_maps(ProviderAgent& agent);
 // cancelled at the gates, but not in the library, whose own locks nobody would release.
 class Operation_Prologue {
 public:
-    explicit Operation_Prologue(ProviderAgent& agent);
+    explicit Operation_Prologue(ProviderAgent& agent,
+                                Pending_Requests requests = Pending_Requests::SERVED);
 
     // Has the adapter maps built anew and waits for them, with m_DataMutex, which the refresh
     // needs, given up meanwhile. What was read of the stores before is not to be trusted

@@ -35,6 +35,11 @@ struct Class_Loads {
     uint16 failures = 0; // of loads while the libraries were not usable
 };
 
+// What a call on a class makes of refreshes that services have asked for. A service whose changes
+// the stores show leaves them to whoever looks at the stores: its next call would wait for a
+// refresh that nobody has looked at, and a row of a thousand changes would take a thousand.
+enum class Pending_Requests : uint8 { SERVED, LEFT };
+
 class ProviderAgent : public Instance_Stores {
 public:
     // ---- The one agent of the process ----
@@ -59,7 +64,10 @@ public:
 
     // Every class operation calls this before it reads anything: decides whether a refresh is due
     // and starts it. Takes m_DataFetchMutex; answers 0 always and waits for no refresh.
-    int BuildCimpleInfo();
+    int BuildCimpleInfo(Pending_Requests requests = Pending_Requests::SERVED);
+    // A service has changed what iSCSI ports see: the next look at the SAN waits for a refresh of
+    // all. m_DataMutex is held.
+    void requestSANRefresh();
     // Asks for new adapter data, starts the refresh that brings them, and waits until their maps
     // are ready; no longer than to the end of that refresh, or of one that was under way, whatever
     // became of it. No lock is held.
@@ -135,6 +143,7 @@ public:
     Mutex m_DataFetchMutex; // guards the refresh decision and the members around it
     // A start that failed leaves it set: the stores stay as they are.
     bool m_bDataFetchRunning = false;
+    std::atomic<bool> m_bNoMoreRefreshes = false; // after such a start
     // Whether a refresh thread is at work. Its end is told at the gate of the adapter maps.
     std::atomic<bool> m_bRefreshAtWork = false;
     std::atomic<bool> m_bProcessEnds = false; // no refresh starts any more
@@ -164,7 +173,8 @@ private:
     // refresh.cpp
     static void* DataFetch_Handler(void* agent);
     bool isCacheTimedOut();
-    bool claimRefresh();
+    bool claimRefresh(Pending_Requests requests);
+    void keepSANMaps();
     bool isSANPassWanted() const;
     void runAdapterPass();
     void rebuildAdapterData();

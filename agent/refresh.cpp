@@ -47,10 +47,11 @@ bool ProviderAgent::isCacheTimedOut() {
 
 // Whether the caller has to start the refresh thread. It then owns m_bDataFetchRunning: no other
 // call comes past this test until that thread has ended, so the thread's handle needs no lock.
-bool ProviderAgent::claimRefresh() {
+bool ProviderAgent::claimRefresh(Pending_Requests requests) {
     Auto_Mutex lock(m_DataFetchMutex);
-    if (!isCacheTimedOut() && !m_bAdapterRefreshRequested && !m_bSANRefreshRequested &&
-        !m_bSANMapsAsked) {
+    const bool is_requested =
+        m_bAdapterRefreshRequested || m_bSANRefreshRequested || m_bSANMapsAsked;
+    if (!isCacheTimedOut() && !(is_requested && requests == Pending_Requests::SERVED)) {
         VLN_LOG(VLN_DBG, "PERF: ---No timeout BuildCimpleInfo END---");
         return false;
     }
@@ -72,7 +73,7 @@ bool ProviderAgent::claimRefresh() {
     return true;
 }
 
-int ProviderAgent::BuildCimpleInfo() {
+int ProviderAgent::BuildCimpleInfo(Pending_Requests requests) {
     const No_Cancellation claimed_and_started;
     VLN_LOG(VLN_INFO, " Entering BuildCimpleInfo()");
     // Without the libraries the refresh still runs: it raises the ready flags over empty stores, so
@@ -81,7 +82,7 @@ int ProviderAgent::BuildCimpleInfo() {
         VLN_LOG(VLN_DBG,
                 "Vorlan Provider dependent library load has failed..do nothing is the only "
                 "option");
-    if (!claimRefresh())
+    if (!claimRefresh(requests))
         return 0;
     // Only a pending SAN request alone may leave the adapter data as they are.
     if (!m_bSANRefreshRequested && !m_bSANMapsAsked)
@@ -91,9 +92,31 @@ int ProviderAgent::BuildCimpleInfo() {
     if (const int error = m_DataFetchThread.start(DataFetch_Handler, this)) {
         m_bRefreshAtWork = false;
         VLN_LOG(VLN_ERR, "Error : DataFetch_Handler thread could not be started (%d)", error);
+        keepSANMaps();
     }
     VLN_LOG(VLN_DBG, "PERF: ---Created DataFetch_Handler thread -- BuildCimpleInfo END---");
     return 0;
+}
+
+// The gate's flag is lowered as well, so that whoever looks at the SAN next waits for what the
+// change has brought. m_DataMutex, under which a pass raises the flag, keeps the two apart: a pass
+// that has read the library before the change has raised it before.
+void ProviderAgent::requestSANRefresh() {
+    m_bAdapterRefreshRequested = true;
+    m_bSANRefreshRequested = true;
+    m_bIsSANMapsReady = false;
+    if (m_bNoMoreRefreshes)
+        m_bIsSANMapsReady = true;
+}
+
+// Where no refresh will come, the stores of the last one are what there is.
+void ProviderAgent::keepSANMaps() {
+    m_bNoMoreRefreshes = true;
+    if (m_LoadedTime == Datetime())
+        return;
+    Auto_Mutex gate(m_SANMapsReadyMutex);
+    m_bIsSANMapsReady = true;
+    m_SANMapsReadyCond.broadcast();
 }
 
 // The refresh's own thread, in a request that an up-call leads to, would wait for itself.
@@ -219,13 +242,16 @@ void ProviderAgent::rebuildSANMaps() {
         // A part of the SAN is nobody's picture.
         if (scan_is_to_end)
             clearSANMaps();
+        m_bIsSANMapsReady = !scan_is_to_end; // see requestSANRefresh
+    } else {
+        m_bIsSANMapsReady = true;
     }
     m_bIsSANMapsBuilding = false;
     if (scan_is_to_end) {
+        m_bIsSANMapsReady = false;
         m_bSANRefreshRequested = true;
         return;
     }
-    m_bIsSANMapsReady = true;
     // Whoever has asked meanwhile has what it asked for. Clients ask under this mutex.
     m_bSANMapsAsked = false;
     m_SANMapsReadyCond.broadcast();

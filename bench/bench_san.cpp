@@ -1,6 +1,9 @@
 // What a SAN costs: the pass over it, what is kept of it, and asking for what it made.
 //
 //   bench_san pass UNITS       two SAN passes, the first one with a scan of the adapters
+//   bench_san iscsi TARGETS    so many targets are added and logged in to, one after the other,
+//   then
+//                              one look at what they have
 //   bench_san volumes COUNT    one enumeration of so many volumes; prints how many objects of the
 //                              object manager were alive at its peak
 //   bench_san resident UNITS   prints resident kilobytes before the module was loaded, and after
@@ -17,17 +20,29 @@
 namespace {
 
 constexpr const char* SCENARIO = "san-4096-luns.json";
+constexpr const char* ISCSI_SCENARIO = "iscsi-empty.json";
 constexpr const char* VOLUME = "VLNMPCA_StorageVolume";
 constexpr unsigned TARGETS = 16; // in the scenario, of 256 units each
 
-// The scenario with another number of units.
-std::string san_of(unsigned units) {
-    std::string text = read_scenario(SCENARIO);
-    const std::string as_it_is = "\"luns\": 256,";
+// A scenario with another text at one place.
+std::string changed(const char* scenario, const std::string& as_it_is, const std::string& wanted) {
+    std::string text = read_scenario(scenario);
     const std::size_t at = text.find(as_it_is);
-    if (at == std::string::npos || units % TARGETS != 0)
+    if (at == std::string::npos)
         fail("the scenario has another form than expected");
-    return text.replace(at, as_it_is.size(), "\"luns\": " + std::to_string(units / TARGETS) + ",");
+    return text.replace(at, as_it_is.size(), wanted);
+}
+
+std::string san_of(unsigned units) {
+    if (units % TARGETS != 0)
+        fail("the scenario has targets of equal size");
+    return changed(SCENARIO, "\"luns\": 256,",
+                   "\"luns\": " + std::to_string(units / TARGETS) + ",");
+}
+
+std::string iscsi_san_of(unsigned targets) {
+    return changed(ISCSI_SCENARIO, "{\"count\": 2,",
+                   "{\"count\": " + std::to_string(targets) + ",");
 }
 
 } // namespace
@@ -37,7 +52,28 @@ extern "C" __attribute__((noinline)) std::size_t vln_measured(host::Manager& man
     return manager.enumerate(VOLUME).value.size();
 }
 
+// The changes that are counted.
+extern "C" __attribute__((noinline)) void vln_measured_changes(host::Manager& manager,
+                                                               unsigned count) {
+    const auto service = manager.enumerate("VLNMPCA_iSCSISettingService").value.at(0).path;
+    for (unsigned i = 1; i <= count; ++i) {
+        const host::Named_Values inputs = {
+            {"InitPortMACAddress", host::Value::text("100002564C000002")},
+            {"TargetIPAddress", host::Value::text("198.51.100.200")},
+            {"TargetName", host::Value::text("iqn.2010-04.com.example:shelf-" + std::to_string(i))},
+            {"Login", host::Value::boolean(true)}};
+        if (manager.invoke(service, "AddTarget", inputs).value.value.as_unsigned() != 0)
+            fail("a target was refused");
+    }
+}
+
 namespace {
+
+void measure_iscsi(host::Manager& manager, unsigned count) {
+    vln_measured_changes(manager, count);
+    if (vln_measured(manager) != count)
+        fail("saw another number of volumes");
+}
 
 void measure_volumes(host::Manager& manager, unsigned count) {
     manager.restart_peak();
@@ -58,10 +94,12 @@ void measure_resident(host::Manager& manager, unsigned long before) {
 
 int main(int argc, char** argv) {
     if (argc != 3)
-        fail("usage: bench_san pass|resident UNITS, or volumes COUNT");
+        fail("usage: bench_san pass|resident UNITS, volumes COUNT, or iscsi TARGETS");
     const std::string mode = argv[1];
     const auto count = static_cast<unsigned>(std::strtoul(argv[2], nullptr, 10));
-    simulate(mode == "volumes" ? one_target(count) : san_of(count));
+    simulate(mode == "volumes" ? one_target(count)
+             : mode == "iscsi" ? iscsi_san_of(count)
+                               : san_of(count));
     host::Options options;
     options.strict = false;
     host::Manager manager(options);
@@ -76,6 +114,8 @@ int main(int argc, char** argv) {
     manager.enumerate(VOLUME); // what happens once is not counted
     if (mode == "pass")
         hook<decltype(&vln_bench_san_refresh)>("vln_bench_san_refresh")();
+    else if (mode == "iscsi")
+        measure_iscsi(manager, count);
     else if (mode == "volumes")
         measure_volumes(manager, count);
     else

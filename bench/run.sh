@@ -150,6 +150,20 @@ read -r before after made <<<"$("$san" resident 4096)"
 printf 'resident memory with 4,096 units, every class enumerated once: %d KiB for %d instances, at most 49152; %d KiB of it since the module was loaded\n' \
     "$after" "$made" $((after - before))
 
+# The library aside again; a change asks for a refresh, and the look at the end brings the only one.
+changes="--toggle-collect=vln_measured_changes --toggle-collect=vln_measured
+         --toggle-collect=cimple::ProviderAgent::runSANPass() --toggle-collect=vlnsim::library::AX_*"
+echo
+echo "iSCSI targets added and logged in to one after the other, then shown, the library not counted"
+printf '%9s %14s %12s %30s\n' targets instructions 'per target' 'to half the targets, at most 2.3'
+former=
+for targets in 500 1000 2000; do
+    own=$(count "$changes" "$san" iscsi $targets)
+    printf '%9d %14d %12d %30s\n' $targets $own $((own / targets)) \
+        "$([ -z "$former" ] || awk "BEGIN { printf \"%.2f\", $own / $former }")"
+    former=$own
+done
+
 # Again the module alone: the object manager hands out the bytes one by one.
 bytes=$((8 << 20))
 count "--toggle-collect=vln_measured --compress-strings=no" "$build/bin/bench_stream" $bytes >"$work/all"

@@ -27,6 +27,7 @@ constexpr Attribute_Row<A> TABLE[] = {
     {AX_PA_FUNCTIONAL_QOS_BANDWIDTH, "_FuncQosBandwidth", &A::FuncQosBandwidth},
     {AX_PA_CURRENT_MAC_ADDRESS, "_CurrentMACAddress", &A::CurrentMACAddress},
     {AX_PA_PHYSICAL_PORT_SPEED, "_PhysicalPortSpeed", &A::PhysicalPortSpeed},
+    {AX_PA_ISCSI_BOOT, "_iSCSIBoot", &A::iSCSIBoot},
     {AX_PA_PHY_LINK_DOWN_REASON, "_PhyLinkDownReason", &A::PhyLinkDownReason},
     {AX_PA_FUNCTIONAL_QOS_MIN_BANDWIDTH, "_FuncQosMinBandwidth", &A::FuncQosMinBandwidth},
     {AX_PA_IPV6_GATEWAY_ADDRESS, "_IPV6GatewayAddr", &A::IPV6GatewayAddr},

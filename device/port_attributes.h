@@ -97,6 +97,7 @@ public:
     uint32 DefaultETO = 0;
     uint32 MaxCDBLength = 0;
     uint32 PhysicalPortSpeed = 0;
+    uint32 iSCSIBoot = 0; // 1: the host boots over the port
 
     // From the initiator properties.
     std::string InitiatorName;

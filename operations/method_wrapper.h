@@ -40,6 +40,12 @@ struct VLN_EventLogSettings {
     std::vector<AX_EventLogModule> modules;
 };
 
+// The name servers (iSNS) of an iSCSI function.
+struct VLN_NameServers {
+    uint32 enabled = 0; // whether they are asked
+    std::vector<AX_IPAddress> list;
+};
+
 class VLN_MethodWrapper : public VLN_Identifiers {
 public:
     // Bytes of the name of the host's system with its end mark.
@@ -83,6 +89,57 @@ public:
     static AX_STATUS ListiSCSISessions(const HBA_WWN* name, const char* target,
                                        AX_iSCSI_SessionList** sessions);
     static AX_STATUS GetiSCSILuns(const HBA_WWN* name, const char* target, AX_iSCSI_LunList** luns);
+
+    // ---- iSCSI settings (iscsi_settings.cpp) ----
+
+    // An IPv4 address as a client writes it, with a port; false for any other text.
+    static bool addressOf(const char* text, uint16 tcpPort, AX_IPAddress& address);
+    static AX_STATUS GetIscsiInitiatorProps(const HBA_WWN* name,
+                                            AX_iSCSI_InitiatorProperties* properties);
+    static AX_STATUS SetInitiatorProperties(const HBA_WWN* name,
+                                            const AX_iSCSI_InitiatorProperties& properties);
+    static AX_STATUS GetIscsiPortStatistics(const HBA_WWN* name,
+                                            AX_iSCSI_PortStatistics* statistics);
+    // Whether the host boots over the function: 0 or 1.
+    static AX_STATUS SetiSCSIBoot(const HBA_WWN* name, uint32 enabled);
+    // 0 also for an address that refuses to answer; 1 for a text that is no address.
+    static AX_STATUS Ping(const HBA_WWN* name, const char* ipAddress, uint16 tcpPort);
+
+    static AX_STATUS GetiSNSServer(const HBA_WWN* name, VLN_NameServers* servers);
+    // Adds the server, whether it answers or not, and sets whether servers are asked. 1 for a text
+    // that is no address.
+    static AX_STATUS UpdateiSNSServer(const HBA_WWN* name, const char* ipAddress, uint16 tcpPort,
+                                      uint32 enable);
+    static AX_STATUS DeleteiSNSServer(const HBA_WWN* name, const AX_IPAddress& server);
+
+    // AX_STATUS_PORTAL_EXISTS: properties hold those that the portal stands with.
+    static AX_STATUS AddTargetPortal(const HBA_WWN* name, const AX_IPAddress& portal,
+                                     AX_iSCSI_LoginProperties* properties);
+    static AX_STATUS RemoveTargetPortal(const HBA_WWN* name, const AX_IPAddress& portal);
+    static AX_STATUS GetTargetPortalProperties(const HBA_WWN* name, const AX_IPAddress& portal,
+                                               AX_iSCSI_LoginProperties* properties);
+    static AX_STATUS SetTargetPortalProperties(const HBA_WWN* name, const AX_IPAddress& portal,
+                                               const AX_iSCSI_LoginProperties& properties);
+
+    static AX_STATUS AddTarget(const HBA_WWN* name, const char* target, const AX_IPAddress& portal,
+                               const AX_iSCSI_LoginProperties& properties, bool login, bool boot);
+    static AX_STATUS RemoveTarget(const HBA_WWN* name, const char* target);
+    static AX_STATUS TargetLogin(const HBA_WWN* name, const char* target,
+                                 const AX_IPAddress& portal,
+                                 const AX_iSCSI_LoginProperties& properties);
+    // portal: null for any.
+    static AX_STATUS TargetLogout(const HBA_WWN* name, const char* target,
+                                  const AX_IPAddress* portal, uint32 sessionId);
+    static AX_STATUS GetTargetLoginAuthProperties(const HBA_WWN* name, const char* target,
+                                                  AX_iSCSI_LoginProperties* properties);
+    static AX_STATUS SetTargetLoginAuthProperties(const HBA_WWN* name, const char* target,
+                                                  const AX_iSCSI_LoginProperties& properties);
+    // Seconds.
+    static AX_STATUS SetTargetProperties(const HBA_WWN* name, const char* target,
+                                         uint32 extendedTimeOut);
+    // address: null for any.
+    static AX_STATUS SetBootTargetSession(const HBA_WWN* name, const char* target,
+                                          const AX_IPAddress* address, uint32 enable);
 
     // ---- Port speed and PHY (phy.cpp) ----
     // ---- The IP stack of an iSCSI port (ip_tables.cpp) ----

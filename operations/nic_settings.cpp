@@ -119,11 +119,14 @@ struct QoS_Kind {
     const char* unknown;
     const char* absent;
     uint32 maxBytesPerSecond;
+    uint32 maxIOsPerSecond;
 };
 
 constexpr QoS_Kind QOS_KINDS[] = {
     {AX_QOS_NIC, 402, "Err: Unable to determine if port is a NIC port",
-     "Err: QoS is not supported on this adapter", 1000},
+     "Err: QoS is not supported on this adapter", 1000, UINT32_MAX},
+    {AX_QOS_ISCSI, 401, "Err: Unable to determine if port is an iSCSI port",
+     "Err: QoS is not supported on this adapter", 1280, 150},
 };
 
 const QoS_Kind* findKind(uint32 kind) {
@@ -176,6 +179,10 @@ AX_STATUS VLN_MethodWrapper::SetQOSParams(const HBA_WWN* name, const AX_QoS* qos
         return frame.status();
     if (qos->maxBytesPerSecond > kind->maxBytesPerSecond) {
         VLN_LOG(VLN_ERR, "Err: Invalid value of maxBytesPerSecond specified");
+        return AX_STATUS_ERROR;
+    }
+    if (qos->maxIOsPerSecond > kind->maxIOsPerSecond) {
+        VLN_LOG(VLN_ERR, "Err: Invalid value of maxIOsPerSecond specified");
         return AX_STATUS_ERROR;
     }
     const AX_STATUS status = AX_SetQoS(wwnOf(name), qos);

@@ -13,6 +13,7 @@
 #include "services/fip/instances.h"
 #include "services/firmware/instances.h"
 #include "services/ip_tables/instances.h"
+#include "services/iscsi_settings/instances.h"
 #include "services/nic_settings/instances.h"
 #include "services/nic_settings/virtual_functions.h"
 #include "services/nic_settings/vnic_data.h"
@@ -28,6 +29,7 @@ using enum Group_Place;
 
 constexpr Class_Group GROUPS[] = {
     {.place = PLATFORM, .create = create_configuration_settings},
+    {.place = PLATFORM, .create = forget_iscsi_settings},
     {.place = NIC_CARDS,
      .create = StartSoftwareInstallationService,
      .failed = {VLN_CRIT, "StartSoftwareInstallationService failed"}},
@@ -86,6 +88,10 @@ constexpr Class_Group GROUPS[] = {
      .clear = clear_diagnostic_classes,
      .before = {VLN_DBG, "Create the Diagnostic classes"},
      .thrown = {VLN_DBG, "Dignostic Test creation failed"}},
+    {.place = ISCSI_PORTS,
+     .create = create_iscsi_settings,
+     .clear = clear_iscsi_settings,
+     .failed = {VLN_ERR, "Failed to create the iscsi driver setting data"}},
     {.place = CLOSING,
      .create = create_virtual_functions,
      .clear = clear_virtual_functions,

@@ -14,6 +14,7 @@
 #include "services/dump/settings_provider.h"
 #include "services/fip/provider.h"
 #include "services/firmware/provider.h"
+#include "services/iscsi_settings/provider.h"
 #include "services/nic_settings/provider.h"
 #include "services/phy/provider.h"
 #include "services/ip_tables/configuration_provider.h"

@@ -39,7 +39,8 @@ constexpr const char* ADAPTER_TEXTS[] = {"100002564C",
                                          "VLNMPCA_SCSIProtocolController",
                                          "VLNMPCA_DriverParameter",
                                          "VLNMPCA_FCWWNService",
-                                         "VLNMPCA_FIPService"};
+                                         "VLNMPCA_FIPService",
+                                         "VLNMPCA_iSCSISettingService"};
 // The first of a port's texts is the beginning of all its WWNs. The driver's global parameters are
 // read through the first FCoE function.
 const std::vector<const char*> PORT_TEXTS[2] = {

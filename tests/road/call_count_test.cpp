@@ -12,7 +12,7 @@ namespace {
 // Values read out of the fetched buffers, per kind of function: the rows of its adapter attributes
 // and of its port attributes.
 constexpr unsigned long NIC_VALUES = 39 + 32;
-constexpr unsigned long ISCSI_VALUES = 19 + 17; // the operational firmware version counts twice
+constexpr unsigned long ISCSI_VALUES = 19 + 18; // the operational firmware version counts twice
 constexpr unsigned long FCOE_VALUES = 29 + 19;  // and here the class of service
 
 // Four cards of two ports: two with NIC and FCoE functions, two with NIC and iSCSI functions. So 16

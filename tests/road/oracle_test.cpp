@@ -202,6 +202,7 @@ constexpr Scenario SCENARIOS[] = {
     {"SmallSAN", SMALL_SAN},
     {"Diagnostics", "diagnostics.json"},
     {"SplitCards", "split-cards.json"},
+    {"ISCSIEmpty", "iscsi-empty.json"},
     {"IPTables", "ip-tables.json"},
     {"DriverParameters", "driver-parameters.json"},
 };

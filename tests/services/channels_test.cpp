@@ -163,6 +163,15 @@ TEST_F(Channels, EachMethodWantsItsServiceAndItsTarget) {
     }
 }
 
+TEST_F(Channels, APortTellsWhichChannelItIs) {
+    const auto shown = [&](const char* id) {
+        const host::Instance port = ethernet_port(id);
+        return text_of(port, "OtherPortType") + " of " + text_of(port, "OtherIdentifyingInfo");
+    };
+    EXPECT_EQ(shown("100002564C010000"), "vNIC of {VR10420118:00, VR10420118:0, VR10420118, 0, 0}");
+    EXPECT_EQ(shown("100002564C000001"), "vNIC of {VR10420117:00, VR10420117:0, VR10420117, 0, 1}");
+}
+
 TEST_F(Channels, ModesAreSetForTheNextStart) {
     expect_each(
         "SetCMMode",

@@ -37,6 +37,20 @@ int guarded(char* error, std::size_t size, Action action) {
     }
 }
 
+// action(host, function) of the running host, under its lock.
+template <class Action>
+int for_function(const char* wwn, char* error, std::size_t size, Action action) {
+    const auto number = wwn ? parse_number("0x" + std::string(wwn)) : std::nullopt;
+    Simulator& simulator = Simulator::instance();
+    std::lock_guard lock(simulator.mutex);
+    simulator.choose_scenario();
+    Function* function = number ? simulator.find_function(*number) : nullptr;
+    if (!function)
+        return fail("unknown WWN " + shown(wwn), error, size);
+    action(simulator.host, *function);
+    return 0;
+}
+
 int copy_line(const std::vector<std::string>& lines, std::size_t index, char* text,
               std::size_t size) {
     if (index >= lines.size() || !text)
@@ -125,15 +139,20 @@ int vlnsim_set_value(const char* wwn, const char* table, const char* name, const
         const Value source = value ? parse_source(value, name) : Value{};
         const Scope scope;
         const Node node(source, scope);
-        const auto number = wwn ? parse_number("0x" + std::string(wwn)) : std::nullopt;
-        Simulator& simulator = Simulator::instance();
-        std::lock_guard lock(simulator.mutex);
-        simulator.choose_scenario();
-        Function* function = number ? simulator.find_function(*number) : nullptr;
-        if (!function)
-            return fail("unknown WWN " + shown(wwn), error, size);
-        set_value(*function, table, name, node);
-        return 0;
+        return for_function(wwn, error, size, [&](Host&, Function& function) {
+            set_value(function, table, name, node);
+        });
+    });
+}
+
+int vlnsim_act(const char* wwn, enum vlnsim_action action, char* error, size_t size) {
+    return guarded(error, size, [&] {
+        return for_function(wwn, error, size, [&](Host& host, Function& function) {
+            if (action == VLNSIM_RESET_ADAPTER)
+                reset_adapter(host, function);
+            else
+                set_cable(host, function, action == VLNSIM_PLUG_CABLE);
+        });
     });
 }
 

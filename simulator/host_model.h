@@ -289,6 +289,9 @@ struct Host {
 
 // What the host's next start brings into force.
 void reboot(Host& host);
+void reset_adapter(Host& host, const Function& of);
+// Takes the link of the physical port down, or up. A port that is switched off stays so.
+void set_cable(Host& host, const Function& of, bool plugged);
 // The same, of how a function's adapter is split and managed.
 void start_configuration(Function& function);
 

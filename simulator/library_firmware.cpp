@@ -42,6 +42,7 @@ void start_firmware(Function& function) {
 // States of a port, of which two wait for a reset of the adapter.
 enum : std::uint32_t {
     state_up = 2,
+    state_link_down = 6,
     state_up_until_reset = 20,
     state_down_until_reset = 21,
     state_disabled = 22
@@ -85,6 +86,26 @@ AX_STATUS check_image(const Firmware_Image& image, const Function& function) {
 }
 
 } // namespace
+
+void reset_adapter(Host& host, const Function& asked) {
+    each_of_adapter(host, asked, [&](Function& function) {
+        ++function.resets;
+        if (function.firmware_effect != Effect::reboot)
+            start_firmware(function);
+        settle_port(function);
+        if (!names_wait_for_reboot(function))
+            activate_names(function);
+    });
+}
+
+void set_cable(Host& host, const Function& asked, bool plugged) {
+    const std::uint32_t from = plugged ? state_link_down : state_up;
+    const std::uint32_t to = plugged ? state_up : state_link_down;
+    for (Function& function : host.functions)
+        if (function.shares_port(asked) &&
+            number_of(function.port_attributes, port_physical_state) == from)
+            set_state(function, to, to);
+}
 
 void reboot(Host& host) {
     for (Function& function : host.functions) {
@@ -153,14 +174,7 @@ AX_STATUS AX_ResetHBA(AX_WWN wwn) {
             const Function* asked = call.function(wwn);
             if (!asked)
                 return AX_STATUS_ILLEGAL_WWN;
-            each_of_adapter(call.host, *asked, [&](Function& function) {
-                ++function.resets;
-                if (function.firmware_effect != Effect::reboot)
-                    start_firmware(function);
-                settle_port(function);
-                if (!names_wait_for_reboot(function))
-                    activate_names(function);
-            });
+            reset_adapter(call.host, *asked);
             return AX_STATUS_OK;
         },
         wwn);

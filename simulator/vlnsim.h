@@ -70,6 +70,12 @@ VLNSIM_API int vlnsim_load_state(const char* path, char* error, size_t size);
  * The provider sees it with its next refresh. */
 VLNSIM_API void vlnsim_reboot(void);
 
+/* What is done to an adapter or a port of the running host from outside: a reset of the adapter, as
+ * its library would do; the cable of the physical port pulled, and plugged in again. wwn as for
+ * vlnsim_set_value. Returns 0, or 1 with a text in error. */
+enum vlnsim_action { VLNSIM_RESET_ADAPTER = 0, VLNSIM_PULL_CABLE = 1, VLNSIM_PLUG_CABLE = 2 };
+VLNSIM_API int vlnsim_act(const char* wwn, enum vlnsim_action action, char* error, size_t size);
+
 /* Writes a firmware image for adapters of the model, with size bytes behind its head. Returns 0, or
  * 1 with a text in error. */
 VLNSIM_API int vlnsim_write_firmware(const char* path, const char* model, const char* version,

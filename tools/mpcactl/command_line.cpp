@@ -89,6 +89,7 @@ public:
         add_association_commands();
         add_method_command();
         add_hardware_command();
+        add_hand_commands();
         add_firmware_commands();
     }
 
@@ -211,10 +212,14 @@ private:
         invoke.add_flag("--check", _command.check, "Fail with status 1 if it does not return 0");
     }
 
+    void port_argument(CLI::App& command) {
+        required(command, "PORT", _command.port, "Port WWN, 16 hexadecimal digits");
+    }
+
     void add_hardware_command() {
         CLI::App& hardware =
             add("hardware", "With --simulate: change a value of the simulated hardware");
-        required(hardware, "PORT", _command.port, "Port WWN, 16 hexadecimal digits");
+        port_argument(hardware);
         required(hardware, "TABLE", _command.table,
                  "adapterAttributes, portAttributes, statistics, features, driverParameters or "
                  "globalDriverParameters");
@@ -222,8 +227,16 @@ private:
         required(hardware, "VALUE", _command.value, "New value; null takes it away");
     }
 
-    void add_firmware_commands() {
+    // What is done to the hardware of a host from outside.
+    void add_hand_commands() {
         add("reboot", "With --simulate: start the simulated host anew");
+        port_argument(add("reset", "With --simulate: reset the adapter of a port"));
+        port_argument(
+            add("pull", "With --simulate: pull the cable of a port, whose link goes down"));
+        port_argument(add("plug", "With --simulate: plug the cable of a port in again"));
+    }
+
+    void add_firmware_commands() {
         CLI::App& firmware =
             add("simulate-firmware", "With --simulate: write a firmware image for its adapters");
         required(firmware, "FILE", _command.file, "The file to write");

@@ -19,6 +19,12 @@ int start_anew(Session& session, const Command&) {
     return EXIT_FINE;
 }
 
+template <vlnsim_action action>
+int act(Session& session, const Command& command) {
+    session.simulation().act(command.port, action);
+    return EXIT_FINE;
+}
+
 int write_firmware(Session& session, const Command& command) {
     session.simulation().write_firmware(command.file, command.model, command.version, command.size);
     return EXIT_FINE;
@@ -46,6 +52,9 @@ constexpr Row COMMANDS[] = {
     {"invoke", invoke},
     {"hardware", change_hardware},
     {"reboot", start_anew},
+    {"reset", act<VLNSIM_RESET_ADAPTER>},
+    {"pull", act<VLNSIM_PULL_CABLE>},
+    {"plug", act<VLNSIM_PLUG_CABLE>},
     {"simulate-firmware", write_firmware},
 };
 

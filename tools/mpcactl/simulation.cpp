@@ -152,6 +152,13 @@ void Simulation::reboot() {
     function<decltype(vlnsim_reboot)>("vlnsim_reboot")();
 }
 
+void Simulation::act(const std::string& port, vlnsim_action action) {
+    char error[4096] = "";
+    if (function<decltype(vlnsim_act)>("vlnsim_act")(port.c_str(), action, error, sizeof error) !=
+        0)
+        throw Usage_Error(error);
+}
+
 void Simulation::write_firmware(const std::string& file, const std::string& model,
                                 const std::string& version, std::size_t size) {
     char error[4096] = "";

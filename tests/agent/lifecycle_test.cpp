@@ -52,23 +52,6 @@ TEST_F(Lifecycle_Test, LoadFailsWithoutLibrariesAndNobodyHangs) {
     pattern_unload(pattern_table[0]);
 }
 
-TEST_F(Lifecycle_Test, LastReleaseDestroysAndTheNextLoadStartsAfresh) {
-    ASSERT_EQ(pattern_load(pattern_table[0]), 0);
-    ASSERT_EQ(pattern_load(pattern_table[0]), 0);
-    EXPECT_EQ(pattern_unload(pattern_table[0]), 0);
-    ProviderAgent* agent = ProviderAgent::current();
-    ASSERT_NE(agent, nullptr);
-    EXPECT_EQ(refreshes_started(*agent), 1);
-    EXPECT_EQ(pattern_unload(pattern_table[0]), 0);
-    EXPECT_EQ(ProviderAgent::current(), nullptr);
-    EXPECT_EQ(pattern_unload(pattern_table[0]), 0) << "one unload too many is harmless";
-
-    Loaded_Agent next;
-    EXPECT_TRUE(next->m_bAdapterRefreshRequested);
-    EXPECT_FALSE(next->m_bIsAdapterMapsReady);
-    EXPECT_EQ(next->m_CIM_ComputerSystem_map.size(), 0u);
-}
-
 TEST_F(Lifecycle_Test, LogSettingsAreSavedOnlyIfThereWereSome) {
     { Loaded_Agent agent; }
     EXPECT_FALSE(std::filesystem::exists(host_path(Host_File::LOG_SETTINGS)));

@@ -14,16 +14,6 @@ using Refresh_Test = Agent_Test;
 
 } // namespace
 
-TEST_F(Refresh_Test, TimeoutCountsFromTheEndOfARefresh) {
-    Loaded_Agent agent;
-    EXPECT_EQ(refreshes_started(*agent), 1); // takes two seconds of the clock, without adapters
-    EXPECT_EQ(refreshes_started(*agent), 0);
-    advance(10 * MINUTE - 1);
-    EXPECT_EQ(refreshes_started(*agent), 0);
-    advance(1);
-    EXPECT_EQ(refreshes_started(*agent), 1);
-}
-
 TEST_F(Refresh_Test, LimitIs32BitsWide) {
     const struct {
         uint32 minutes;
@@ -69,31 +59,6 @@ TEST_F(Refresh_Test, DiagnosticsHoldTheRefreshBack) {
     EXPECT_TRUE(agent->m_bAdapterRefreshRequested);
     agent->m_bDiagnosticsRunning = false;
     EXPECT_EQ(refreshes_started(*agent), 1);
-}
-
-TEST_F(Refresh_Test, OneThreadAtATime) {
-    Loaded_Agent agent;
-    Log_Capture log;
-    Long_Operation operation(*agent);
-    for (int call = 0; call < 3; ++call)
-        agent->BuildCimpleInfo();
-    operation.end();
-    settle(*agent);
-    EXPECT_EQ(log.count(VLN_DBG, "PERF: DataFetch_Handler Thread BEGIN"), 1);
-    EXPECT_EQ(log.count(VLN_DBG, "DataFetch_Handler thread already running-BuildCimpleInfo"), 2);
-}
-
-TEST_F(Refresh_Test, StaleSanClassAsksForItsPass) {
-    Loaded_Agent agent;
-    agent->m_bRefreshSANData = false;
-    EXPECT_EQ(refreshes_started(*agent), 1);
-    EXPECT_FALSE(agent->m_bIsSANMapsReady);
-    const int scans = Fake_Library::scans;
-
-    EXPECT_EQ(count_instances(VLNMPCA_StorageVolume::static_meta_class), 0);
-    settle(*agent);
-    EXPECT_TRUE(agent->m_bIsSANMapsReady);
-    EXPECT_EQ(Fake_Library::scans, scans);
 }
 
 // Clients of every kind arrive while the first refresh can't go on; all of them see whole stores.

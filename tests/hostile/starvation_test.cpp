@@ -133,7 +133,8 @@ TEST(Starvation, AThreadThatCannotBeStarted) {
     ASSERT_NE(refuse, nullptr);
     refuse(true);
     std::thread client([&] { road.manager().enumerate("VLNMPCA_Product"); });
-    while (road.count_in_log("DataFetch_Handler thread could not be started") == 0)
+    while (road.count_in_log("[VLN_ERR] Error : DataFetch_Handler thread could not be started") ==
+           0)
         std::this_thread::yield();
     pthread_cancel(client.native_handle());
     client.join();
@@ -143,7 +144,8 @@ TEST(Starvation, AThreadThatCannotBeStarted) {
     EXPECT_EQ(road.enumerate("VLNMPCA_Product").size(), 1u);
     refuse(true);
     EXPECT_EQ(road.enumerate("VLNMPCA_EthernetPort").size(), 2u);
-    EXPECT_EQ(road.count_in_log("PERF: Thread DynamicDataFetch_Handler Creation failed"), 1u);
+    EXPECT_EQ(road.count_in_log("[VLN_ERR] PERF: Thread DynamicDataFetch_Handler Creation failed"),
+              1u);
     EXPECT_EQ(vlnsim_paused(), 0u);
     refuse(false);
     vlnsim_advance(11ull * 1000000);

@@ -182,18 +182,6 @@ TEST_F(Wrapper, VersionWithHostileSizes) {
     }
 }
 
-TEST_F(Wrapper, TesselGeneration) {
-    fake.features = {{201, 1}};
-    EXPECT_TRUE(W::IsTesselCNA(&NAME));
-    EXPECT_EQ(log_capture::count(log_capture::take(), "5:Tessel CNA Port "), 1);
-    fake.features = {{201, 2}};
-    EXPECT_FALSE(W::IsTesselCNA(&NAME));
-    fake.features = {{201, 1}};
-    fake.featureFailures = {{201, 1}};
-    EXPECT_FALSE(W::IsTesselCNA(&NAME));
-    EXPECT_FALSE(W::IsTesselCNA(nullptr));
-}
-
 TEST_F(Wrapper, CnaType) {
     const struct {
         std::map<uint32_t, uint32_t> features;

@@ -163,11 +163,4 @@ TEST(Orrigan_Rules, AreAsTheirOtherStatementHasThem) {
         EXPECT_GT(seen[rule], 20u) << "rule " << rule << " is hardly ever the first that is broken";
 }
 
-TEST(Orrigan_Rules, TheNumberOfARoceProfileIsFrom16To99) {
-    for (const auto& [pid, rule] : {std::pair{15u, 2u}, {16u, 0u}, {99u, 0u}, {100u, 2u}})
-        EXPECT_EQ(answered_rule({.ports = {"NR"}, .lacking = {"  "}, .configured = 0, .pid = pid}),
-                  rule)
-            << pid;
-}
-
 } // namespace

@@ -86,7 +86,8 @@ TEST(SuddenEnds, TheStatusThreadGoesWithThePortsAndComesBackWithThem) {
     EXPECT_EQ(road.enumerate("VLNMPCA_Card").size(), 1u);
 }
 
-// Eight clients of the SAN, each of another class, before and during a pass and twice after it.
+// Eight clients of the SAN, each of another class, before and during a pass and twice after it,
+// whether it reads the devices or makes the stores.
 TEST(SuddenEnds, ABusyConsoleSettlesAfterOnePass) {
     constexpr const char* CLASSES[] = {"VLNMPCA_StorageVolume",
                                        "VLNMPCA_SCSIProtocolEndpoint",
@@ -96,26 +97,29 @@ TEST(SuddenEnds, ABusyConsoleSettlesAfterOnePass) {
                                        "VLNMPCA_TapeDrive",
                                        "VLNMPCA_LogicalDisk",
                                        "VLNMPCA_StorageExtent"};
-    Held_Road road(true);
-    hold("HBA_SendReadCapacity");
-    std::vector<std::thread> clients;
-    for (std::size_t client = 0; client < std::size(CLASSES); ++client)
-        clients.emplace_back([&, client] {
-            if (client >= 2)
-                wait_until_held();
-            const std::size_t first = road->enumerate(CLASSES[client]).size();
-            EXPECT_EQ(first > 0, client < 5) << CLASSES[client];
-            for (int look = 0; look < 2; ++look)
-                EXPECT_EQ(road->enumerate(CLASSES[client]).size(), first);
-        });
-    wait_until_held();
-    while (road->count_in_log(" Entering BuildCimpleInfo()") < std::size(CLASSES))
-        std::this_thread::yield();
-    vlnsim_clear_faults();
-    for (std::thread& client : clients)
-        client.join();
-    road->close();
-    EXPECT_EQ(road->count_in_log("PERF: Building SAN Data..."), 1u);
+    for (const char* held : {"HBA_GetFcpTargetMapping", "HBA_SendReadCapacity"}) {
+        SCOPED_TRACE(held);
+        Held_Road road(true);
+        hold(held);
+        std::vector<std::thread> clients;
+        for (std::size_t client = 0; client < std::size(CLASSES); ++client)
+            clients.emplace_back([&, client] {
+                if (client >= 2)
+                    wait_until_held();
+                const std::size_t first = road->enumerate(CLASSES[client]).size();
+                EXPECT_EQ(first > 0, client < 5) << CLASSES[client];
+                for (int look = 0; look < 2; ++look)
+                    EXPECT_EQ(road->enumerate(CLASSES[client]).size(), first);
+            });
+        wait_until_held();
+        while (road->count_in_log(" Entering BuildCimpleInfo()") < std::size(CLASSES))
+            std::this_thread::yield();
+        vlnsim_clear_faults();
+        for (std::thread& client : clients)
+            client.join();
+        road->close();
+        EXPECT_EQ(road->count_in_log("PERF: Building SAN Data..."), 1u);
+    }
 }
 
 // What joins the adapters' picture with the SAN's is shown whole, whenever a refresh is looked at:

@@ -159,6 +159,13 @@ TEST_F(Conversion_Test, EmbeddedObjectsGoWhole) {
     EXPECT_EQ(sent->find("Object")->object->string("Caption"), "not a key");
     EXPECT_EQ(sent->find("Objects")->type, CMPI_instanceA);
 
+    // A list saves the conversion of what it does not name.
+    const char* names[] = {"Count", nullptr};
+    broker.failures = {{"newInstance", 9}};
+    EXPECT_TRUE(to_instance(holder.get(), names));
+    EXPECT_EQ(broker.failures["newInstance"], 8) << "asked for the instance alone";
+    broker.failures.clear();
+
     fake::Members members = sent->members;
     for (auto& [name, value] : members)
         if (name == "Objects")

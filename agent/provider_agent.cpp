@@ -14,7 +14,7 @@
 #include "foundation/host_paths.h"
 
 #include <atomic>
-#include <cstdlib>
+#include <cxxabi.h>
 
 #include <unistd.h>
 
@@ -33,8 +33,17 @@ constinit Process_Wide<Mutex> s_AgentMutex(false, RANK_AGENT, "s_AgentMutex");
 
 // Registered anew with each agent, behind the libraries that it has opened: what a process has
 // started last ends first, so that the threads are gone before the libraries are.
+// The handler goes with its agent, since an object manager may load and unload without end: it is
+// registered for an object of its own in place of the library (Itanium C++ ABI, 3.3.6).
+char s_Registration;
+
 void registerExit() {
-    std::atexit([] { ProviderAgent::endThreadsAtExit(); });
+    abi::__cxa_atexit([](void*) { ProviderAgent::endThreadsAtExit(); }, nullptr, &s_Registration);
+}
+
+// Runs the handler as well, which finds no agent.
+void forgetExit() {
+    abi::__cxa_finalize(&s_Registration);
 }
 
 // The provider whose call this thread is in.
@@ -113,6 +122,7 @@ void ProviderAgent::releaseRef(Class_Loads& loads) {
 void ProviderAgent::destroyLocked() {
     delete s_Agent.load(std::memory_order_relaxed);
     s_Agent.store(nullptr, std::memory_order_release);
+    forgetExit();
 }
 
 // ---- Construction ----

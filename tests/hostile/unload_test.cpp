@@ -1,33 +1,11 @@
 // Loading and unloading again and again, with a refresh running, leaves nothing behind.
+#include "tests/hostile/footprint.h"
 #include "tests/hostile/sudden_ends.h"
-
-#include <fstream>
-
-#include <unistd.h>
-
-namespace fs = std::filesystem;
 
 namespace {
 
 constexpr int ROUNDS = 200;
 constexpr int WARM_UP = 20; // until the heap has found its size
-
-struct Footprint {
-    std::ptrdiff_t threads, descriptors;
-    long resident; // KiB
-};
-
-Footprint footprint() {
-    const auto entries = [](const char* folder) {
-        return std::distance(fs::directory_iterator(folder), fs::directory_iterator());
-    };
-    std::ifstream statm("/proc/self/statm");
-    long size = 0;
-    long resident = 0;
-    statm >> size >> resident;
-    return {entries("/proc/self/task"), entries("/proc/self/fd"),
-            resident * sysconf(_SC_PAGESIZE) / 1024};
-}
 
 using sudden_ends::SCENARIO;
 
@@ -43,10 +21,10 @@ TEST(Unload, TwoHundredTimesWithARefreshRunningLeavesNothing) {
     host::Options options;
     options.trace = [&](const std::string& line) { up_calls.trace(line); };
     host::Manager manager(std::move(options));
-    Footprint start{};
+    hostile::Footprint start;
     for (int round = 0; round < ROUNDS; ++round) {
         if (round == WARM_UP)
-            start = footprint();
+            start = hostile::Footprint::now();
         vlnsim_restart();
         ASSERT_TRUE(manager.load(VLN_MODULE).ok());
         EXPECT_EQ(manager.enumerate("VLNMPCA_Card").value.size(), 1u);
@@ -61,13 +39,7 @@ TEST(Unload, TwoHundredTimesWithARefreshRunningLeavesNothing) {
         ASSERT_EQ(manager.fault_count(), 0u) << host::to_string(manager.faults()[0]);
         ASSERT_EQ(manager.live_object_count(), 0u);
     }
-    const Footprint end = footprint();
-    EXPECT_EQ(end.threads, start.threads);
-    EXPECT_EQ(end.descriptors, start.descriptors);
-#if !defined(__SANITIZE_ADDRESS__) && !defined(__SANITIZE_THREAD__)
-    // The sanitizers keep freed memory, and find leaks on their own.
-    EXPECT_LT(end.resident, start.resident + 4096);
-#endif
+    hostile::expect_no_growth(start, hostile::Footprint::now());
     vlnsim_close_libraries();
     vlnsim_reset();
 }

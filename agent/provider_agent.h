@@ -10,6 +10,7 @@
 #define VLN_AGENT_PROVIDER_AGENT_H
 
 #include "agent/agent_thread.h"
+#include "agent/driver_logs.h"
 #include "agent/plain_flag.h"
 #include "agent/status/dynamic_port_status.h"
 #include "agent/status/dynamic_status.h"
@@ -105,7 +106,10 @@ public:
     Provider_Loggers m_Loggers; // file, ring and system log, in this order
     VlnConfigFile m_ConfigFile; // saved when the agent goes
 
-    Mutex m_DataMutex; // guards m_pData and every store
+    Mutex m_DataMutex; // guards m_pData, every store and what is told of logs below
+
+    Driver_Log m_DriverLogs[NUM_DRIVER_KINDS];
+    uint16 m_NIMALogLevel = 3; // as a console has set it, or as the library begins
 
     bool m_bIsAdapterDataReady = false;
     bool m_bIsAdapterDataBuilding = false;

@@ -4,18 +4,18 @@
 
 namespace cimple {
 
-sint32 DeviceLog::Handlelog(const std::string& line) {
+sint32 DeviceLog::Handlelog(std::string line) {
     if (line.empty())
         return 0;
     VLN_LOG(VLN_DBG, "Handlelog ---  Prior to Inserting into DeviceLog Vector");
     if (m_lines.size() >= capacity)
         return 1;
-    m_lines.push_back(line);
+    m_lines.push_back(std::move(line));
     return 0;
 }
 
 void DeviceLog::clear() {
-    m_lines.clear();
+    std::vector<std::string>().swap(m_lines);
 }
 
 } // namespace cimple

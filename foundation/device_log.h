@@ -14,9 +14,10 @@ public:
     explicit DeviceLog(uint32 maximum = 1024) : capacity(maximum) {}
 
     // 1 if the log is full, else 0. An empty line is passed over.
-    sint32 Handlelog(const std::string& line);
+    sint32 Handlelog(std::string line);
     void clear();
 
+    uint32 maximum() const { return capacity; }
     const std::vector<std::string>& lines() const { return m_lines; }
 
 private:

@@ -1,4 +1,6 @@
+#include "foundation/log_file.h"
 #include "foundation/logger.h"
+#include "foundation/utf8.h"
 
 #include <cerrno>
 #include <cstring>
@@ -6,6 +8,7 @@
 #include <string>
 #include <sys/stat.h>
 #include <syslog.h>
+#include <unistd.h>
 
 namespace cimple {
 
@@ -21,18 +24,13 @@ constexpr uint32 RING_LEVELS = bit(VLN_INFO) - 1;
 // Meant: the provider's levels start at 1, so none of its lines floods the host's system log.
 constexpr uint32 SYSLOG_LEVELS = bit(VLN_INVALID);
 
+} // namespace
+
 const char* level_word(sint32 level) {
     static constexpr const char* WORDS[] = {"VLN_INVALID", "VLN_CRIT", "VLN_WARN",
                                             "VLN_ERR",     "VLN_INFO", "VLN_DBG"};
     return level >= VLN_CRIT && level <= VLN_DBG ? WORDS[level] : WORDS[VLN_INVALID];
 }
-
-// "e": a child process of the object manager must not inherit the log.
-File_Handle open_for_append(const char* path) {
-    return File_Handle(std::fopen(path, "a+e"));
-}
-
-} // namespace
 
 // The file.
 
@@ -63,7 +61,7 @@ void VLN_FileLogger::open() {
     if (!mode_has_file(CLogger::instance().get_mode()))
         return;
     set_stream(nullptr);
-    set_stream(open_for_append(path.c_str()));
+    set_stream(open_log_file(path.c_str()));
 }
 
 void VLN_FileLogger::close() {
@@ -72,9 +70,9 @@ void VLN_FileLogger::close() {
 }
 
 void VLN_FileLogger::clear() {
-    set_stream(nullptr);
-    const File_Handle emptied(std::fopen(path.c_str(), "we"));
-    set_stream(open_for_append(path.c_str()));
+    set_stream(open_log_file(path.c_str()));
+    if (stream && ftruncate(fileno(stream.get()), 0) != 0)
+        VLN_FileLogger::set_stream(nullptr);
 }
 
 sint32 VLN_FileLogger::validateAndSetPath(const char* newPath, bool isFfdc) {
@@ -82,12 +80,12 @@ sint32 VLN_FileLogger::validateAndSetPath(const char* newPath, bool isFfdc) {
         return -1;
     struct stat status;
     if (stat(newPath, &status) == 0) {
-        if (!(status.st_mode & S_IWUSR))
+        if (!S_ISREG(status.st_mode) || !(status.st_mode & S_IWUSR))
             return -1;
     } else if (errno != ENOENT) {
         return -1;
     }
-    File_Handle opened = open_for_append(newPath);
+    File_Handle opened = open_log_file(newPath);
     if (!opened)
         return -1;
 
@@ -137,7 +135,9 @@ void VLN_CIMLogger::log(sint32 level, const char*, uint32, const char* text) {
     if (!text || !wants(level))
         return;
     VLN_CIMLogEntry entry{static_cast<uint32>(level), Datetime::now(), {}};
-    std::snprintf(entry.message, sizeof entry.message, "[%s]", text);
+    const std::string whole = to_utf8(std::string("[") + text + "]");
+    const std::string_view shown = utf8_prefix(whole, sizeof entry.message - 1);
+    shown.copy(entry.message, shown.size());
     ++next;
     if (m_entries.size() >= capacity)
         m_entries[next % capacity] = entry;

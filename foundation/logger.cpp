@@ -288,13 +288,18 @@ void Provider_Loggers::start() {
         VLN_LOG(VLN_CRIT, " Continuing logs in Vorlan log provider. ");
         return;
     }
-    const std::string path = host_path(Host_File::FFDC_LOG);
-    VLN_LOG(VLN_CRIT, " Please see the default log: %s", path.c_str());
+    VLN_LOG(VLN_CRIT, " Please see the default log: %s", host_path(Host_File::FFDC_LOG).c_str());
     logger.set_ffdc();
     logger.set_enabled();
     logger.set_mode(LOG_MODE_FILE);
-    if (m_file.validateAndSetPath(path.c_str(), true) != 0)
-        VLN_LOG(VLN_ERR, "validateAndSetPath() failed");
+    use_default_file();
+}
+
+bool Provider_Loggers::use_default_file() {
+    if (m_file.validateAndSetPath(host_path(Host_File::FFDC_LOG).c_str(), true) == 0)
+        return true;
+    VLN_LOG(VLN_ERR, "validateAndSetPath() failed");
+    return false;
 }
 
 } // namespace cimple

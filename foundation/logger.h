@@ -36,6 +36,9 @@ inline bool mode_has_ring(sint32 mode) {
     return mode == LOG_MODE_RING || mode == LOG_MODE_BOTH;
 }
 
+// The word of a level in a record: "VLN_ERR".
+const char* level_word(sint32 level);
+
 // A sink. All operations are called with the list lock held.
 class VLN_LoggerInterface {
 public:
@@ -136,8 +139,8 @@ public:
     void close() override; // the path is forgotten
     void clear() override;
 
-    // Opens `newPath` for appending and makes it the log. With `isFfdc` the file keeps critical and
-    // error records only. 0, or -1 with the former file kept. Takes the list lock.
+    // Opens `newPath` for appending and makes it the log (log_file.h). With `isFfdc` the file keeps
+    // critical and error records only. 0, or -1 with the former file kept. Takes the list lock.
     sint32 validateAndSetPath(const char* newPath, bool isFfdc);
     const String& get_path() const { return path; }
 
@@ -164,7 +167,7 @@ public:
 struct VLN_CIMLogEntry {
     uint32 level;
     Datetime time;
-    char message[200]; // bracketed, cut to fit
+    char message[200]; // bracketed, as UTF-8, cut to fit behind a character
 };
 
 class VLN_CIMLogger : public VLN_LoggerInterface {
@@ -195,6 +198,9 @@ public:
     // Takes over the saved settings. A system that was never configured gets a small log of
     // critical and error records.
     void start();
+
+    // Makes the small default log the file. False, with a line of the log, if it cannot be opened.
+    bool use_default_file();
 
     VLN_FileLogger& file() { return m_file; }
     VLN_CIMLogger& ring() { return m_ring; }

@@ -101,4 +101,14 @@ std::string to_utf8(std::string_view bytes) {
     return text;
 }
 
+std::string_view utf8_prefix(std::string_view text, std::size_t size) noexcept {
+    if (text.size() <= size)
+        return text;
+    constexpr std::size_t MOST_BEHIND_A_LEAD = 3;
+    std::size_t end = size;
+    while (end > 0 && size - end < MOST_BEHIND_A_LEAD && in_range(text[end], 0x80, 0xBF))
+        --end;
+    return text.substr(0, in_range(text[end], 0x80, 0xBF) ? size : end); // else it is no text
+}
+
 } // namespace cimple

@@ -16,6 +16,9 @@ bool are_utf8(std::initializer_list<std::string_view> texts) noexcept;
 // replacement character U+FFFD, so that a reader sees where and how many.
 std::string to_utf8(std::string_view bytes);
 
+// The beginning of a text, of at most so many bytes, that does not end inside a character.
+std::string_view utf8_prefix(std::string_view text, std::size_t size) noexcept;
+
 } // namespace cimple
 
 #endif // FOUNDATION_UTF8_H

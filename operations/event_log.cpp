@@ -97,4 +97,12 @@ AX_STATUS VLN_MethodWrapper::vlncimRestoreDefaultSettings(const HBA_WWN* name) {
     return status;
 }
 
+AX_STATUS VLN_MethodWrapper::SetNIMATraceLevel(uint32 group, uint32 level) {
+    Operation_Frame frame("VLN_MethodWrapper::SetNIMATraceLevel");
+    const AX_STATUS status = AX_SetDebugTraces(group, level);
+    if (status != AX_STATUS_OK)
+        VLN_OPERATION_FAILED(status, "SetNIMATraceLevel exited with the error code %d", status);
+    return status;
+}
+
 } // namespace cimple

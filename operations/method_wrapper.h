@@ -273,6 +273,8 @@ public:
     static AX_STATUS vlncimSetAdvancedDumpTraceLevel(const HBA_WWN* name, uint32 level,
                                                      uint32 modes);
     static AX_STATUS vlncimRestoreDefaultSettings(const HBA_WWN* name);
+    // How much the management library itself traces of a group of its functions.
+    static AX_STATUS SetNIMATraceLevel(uint32 group, uint32 level);
 
     // ---- Diagnostic tests (diagnostics.cpp) ----
     //

@@ -18,6 +18,7 @@
 #include "services/nic_settings/virtual_functions.h"
 #include "services/nic_settings/vnic_data.h"
 #include "services/phy/instances.h"
+#include "services/record_logs/driver_logs.h"
 #include "services/record_logs/instances.h"
 #include "services/wwn/instances.h"
 
@@ -30,6 +31,9 @@ using enum Group_Place;
 constexpr Class_Group GROUPS[] = {
     {.place = PLATFORM, .create = create_configuration_settings},
     {.place = PLATFORM, .create = forget_iscsi_settings},
+    {.place = PLATFORM,
+     .create = read_driver_events,
+     .thrown = {VLN_ERR, "Exception in reading the events of the drivers"}},
     {.place = NIC_CARDS,
      .create = StartSoftwareInstallationService,
      .failed = {VLN_CRIT, "StartSoftwareInstallationService failed"}},
@@ -51,6 +55,12 @@ constexpr Class_Group GROUPS[] = {
      .failed = {VLN_INFO, "Issue with NIC Setting Service classes"},
      .thrown = {VLN_ERR, "----- unknown exception ------ "}},
     {.place = NIC,
+     .create = create_nic_driver_log,
+     .before = {VLN_DBG, "Calling DriverLog Creation class for NIC "},
+     .done = {VLN_INFO, "MPCA Driver Log classes are successfully created for NIC"},
+     .failed = {VLN_INFO, "Issue with MPCA Driver Log classes for NIC"},
+     .thrown = {VLN_ERR, "----- unknown exception ------ "}},
+    {.place = NIC,
      .create = create_nic_bridging,
      .clear = clear_bridging,
      .before = {VLN_DBG, "calling CreateCeeClasses for NIC port"}},
@@ -70,6 +80,12 @@ constexpr Class_Group GROUPS[] = {
     {.place = FC_PORT, .create = create_driver_parameters},
     {.place = FC_PORTS, .create = join_driver_parameters},
     {.place = FC_PORTS,
+     .create = create_fc_driver_log,
+     .before = {VLN_DBG, "Calling DriverLog Creation class for MPCA -- FCoE-FC "},
+     .done = {VLN_INFO, "MPCA Driver Log classes are successfully created for FCoE-FC"},
+     .failed = {VLN_INFO, "Issue with MPCA Driver Log classes for FCoE-FC"},
+     .thrown = {VLN_INFO, "Issue with MPCA Driver Log classes for FCoE-FC"}},
+    {.place = FC_PORTS,
      .create = create_fip_classes,
      .clear = clear_fip_classes,
      .done = {VLN_INFO, "FCoE FIP classes are successfully created"},
@@ -88,6 +104,10 @@ constexpr Class_Group GROUPS[] = {
      .clear = clear_diagnostic_classes,
      .before = {VLN_DBG, "Create the Diagnostic classes"},
      .thrown = {VLN_DBG, "Dignostic Test creation failed"}},
+    {.place = ISCSI_PORTS,
+     .create = create_iscsi_driver_log,
+     .failed = {VLN_INFO, "Issue with MPCA ISCSI Driver Log classes"},
+     .thrown = {VLN_INFO, "Issue with MPCA ISCSI Driver Log classes"}},
     {.place = ISCSI_PORTS,
      .create = create_iscsi_settings,
      .clear = clear_iscsi_settings,

@@ -14,12 +14,13 @@
 #include "services/dump/settings_provider.h"
 #include "services/fip/provider.h"
 #include "services/firmware/provider.h"
+#include "services/ip_tables/configuration_provider.h"
+#include "services/ip_tables/provider.h"
 #include "services/iscsi_settings/provider.h"
 #include "services/nic_settings/provider.h"
 #include "services/phy/provider.h"
-#include "services/ip_tables/configuration_provider.h"
-#include "services/ip_tables/provider.h"
 #include "services/profiles/provider.h"
+#include "services/record_logs/provider.h"
 #include "services/wwn/provider.h"
 
 #endif // VLN_SERVICES_PROVIDERS_H

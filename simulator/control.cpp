@@ -1,6 +1,7 @@
 // The control interface: scenario, faults, counts, records.
 #include "simulator/call.h"
 #include "simulator/firmware_image.h"
+#include "simulator/host_logs.h"
 #include "simulator/scenario.h"
 #include "simulator/state.h"
 
@@ -160,6 +161,11 @@ void vlnsim_reboot(void) {
     Simulator& simulator = Simulator::instance();
     std::lock_guard lock(simulator.mutex);
     reboot(simulator.host);
+    log_start(simulator.host, false);
+}
+
+int vlnsim_log(const char* line) {
+    return line && append_lines(system_log, {line}) ? 0 : 1;
 }
 
 int vlnsim_write_firmware(const char* path, const char* model, const char* version, size_t size,
@@ -172,8 +178,13 @@ int vlnsim_write_firmware(const char* path, const char* model, const char* versi
 
 void vlnsim_set_host_root(const char* folder) {
     static std::set<std::string>* const folders = new std::set<std::string>;
-    std::lock_guard lock(host_root_mutex);
-    host_root = folder && *folder ? &*folders->insert(folder).first : nullptr;
+    {
+        std::lock_guard lock(host_root_mutex);
+        host_root = folder && *folder ? &*folders->insert(folder).first : nullptr;
+    }
+    Simulator& simulator = Simulator::instance();
+    std::lock_guard lock(simulator.mutex);
+    log_start(simulator.host, true);
 }
 
 const char* vlnsim_host_root(void) {

@@ -283,7 +283,8 @@ struct Host {
     std::string address = "192.0.2.10"; // of the host's name; empty: cannot be resolved
     std::vector<Function> functions;
     iSCSI_Network iscsi_network;
-    std::vector<Function> dead_ports; // whose firmware has failed: no instances of the library
+    std::vector<Function> dead_ports;    // whose firmware has failed: no instances of the library
+    std::vector<std::string> system_log; // the lines of a start of the host
     std::vector<Fault> faults;
 };
 

@@ -1,5 +1,6 @@
 // The library itself and the enumeration of its instances.
 #include "simulator/call.h"
+#include "simulator/host_logs.h"
 
 #include <algorithm>
 #include <cstring>
@@ -152,8 +153,16 @@ AX_STATUS AX_StatusString(AX_STATUS status, char* text, uint32_t size) {
 
 AX_STATUS AX_SetDebugTraces(uint32_t traceGroup, uint32_t level) {
     return answer<AX_STATUS>(
-        Entry::AX_SetDebugTraces, [](Call&) -> AX_STATUS { return AX_STATUS_OK; }, traceGroup,
-        level);
+        Entry::AX_SetDebugTraces,
+        [&](Call&) -> AX_STATUS {
+            constexpr std::uint32_t max_level = 6;
+            if (level > max_level)
+                return AX_STATUS_INVALID_ARGUMENT;
+            append_lines(nima_log, {"trace group " + std::to_string(traceGroup) + ": level " +
+                                    std::to_string(level)});
+            return AX_STATUS_OK;
+        },
+        traceGroup, level);
 }
 
 int32_t VlnGetBoardNumber(AX_WWN wwn) {

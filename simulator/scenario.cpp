@@ -301,7 +301,7 @@ Host read_scenario(const std::string& text, const std::string& name) {
     const Scope scope;
     const Node top(document, scope);
     top.expect_object({"description", "include", "templates", "libraries", "server", "iscsiNetwork",
-                       "cards", "faults"});
+                       "cards", "faults", "systemLog"});
     Host host;
     copy_text("simulated-host", host.server.hostName, sizeof host.server.hostName);
     copy_text("Linux 2.6 x86_64 RH", host.server.targetOS, sizeof host.server.targetOS);
@@ -316,6 +316,9 @@ Host read_scenario(const std::string& text, const std::string& name) {
         for (const Node& card : cards->items())
             reader.read(card);
     }
+    if (const auto lines = top.member("systemLog"))
+        for (const Node& line : lines->items())
+            host.system_log.push_back(line.text());
     if (const auto faults = top.member("faults"))
         for (const Node& fault : faults->items())
             host.faults.push_back(read_fault(fault));

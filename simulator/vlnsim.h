@@ -53,7 +53,8 @@ VLNSIM_API void vlnsim_reset(void);
  * 16 hexadecimal digits; table is "adapterAttributes", "portAttributes", "statistics" or
  * "features"; name as in a scenario, by name or number; value is a JSON text, null to make the
  * value missing. The table may also be "driverParameters" or "globalDriverParameters", for the
- * current value of the parameter of that name, or "diagnostics". Returns 0, or 1 with a text in error. */
+ * current value of the parameter of that name, or "diagnostics". Returns 0, or 1 with a text in
+ * error. */
 VLNSIM_API int vlnsim_set_value(const char* wwn, const char* table, const char* name,
                                 const char* value, char* error, size_t size);
 
@@ -75,6 +76,10 @@ VLNSIM_API void vlnsim_reboot(void);
  * vlnsim_set_value. Returns 0, or 1 with a text in error. */
 enum vlnsim_action { VLNSIM_RESET_ADAPTER = 0, VLNSIM_PULL_CABLE = 1, VLNSIM_PLUG_CABLE = 2 };
 VLNSIM_API int vlnsim_act(const char* wwn, enum vlnsim_action action, char* error, size_t size);
+
+/* Writes a line behind the last one of the host's log, /var/log/messages below the host root.
+ * Returns 0, or 1 if it cannot be written, and without a host root. */
+VLNSIM_API int vlnsim_log(const char* line);
 
 /* Writes a firmware image for adapters of the model, with size bytes behind its head. Returns 0, or
  * 1 with a text in error. */

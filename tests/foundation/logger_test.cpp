@@ -6,6 +6,7 @@
 #include <filesystem>
 #include <sys/stat.h>
 #include <thread>
+#include <unistd.h>
 
 namespace {
 
@@ -172,16 +173,52 @@ TEST_F(Logger_Test, FileLoggerOpensClosesAndClears) {
 }
 
 TEST_F(Logger_Test, PathsThatAreNoLogAreRefusedAndTheFormerOneStays) {
+    namespace fs = std::filesystem;
+    fs::remove_all("paths");
+    fs::create_directory("paths");
     VLN_FileLogger file;
-    ASSERT_EQ(file.validateAndSetPath("good.log", false), 0);
-    write("locked.log", "");
-    chmod("locked.log", 0444);
-    for (const char* path : {static_cast<const char*>(nullptr), "", "no/such/folder/log", "host",
-                             "good.log/below", "locked.log"})
-        EXPECT_EQ(file.validateAndSetPath(path, false), -1) << (path ? path : "null");
-    EXPECT_STREQ(file.get_path().c_str(), "good.log");
-    std::filesystem::remove("good.log");
-    std::filesystem::remove("locked.log");
+    ASSERT_EQ(file.validateAndSetPath("paths/good.log", false), 0);
+    write("paths/locked.log", "");
+    chmod("paths/locked.log", 0444);
+    ASSERT_EQ(mkfifo("paths/pipe", 0600), 0);
+    for (const auto& [link, target] :
+         {std::pair("own", "other.log"), std::pair("own-own", "own"),
+          std::pair("foreign", "good.log"), std::pair("new", "/none/x"),
+          std::pair("own-foreign", "foreign"), std::pair("loop", "loop"),
+          std::pair("to-device", "/dev/null")})
+        fs::create_symlink(target, fs::path("paths") / link);
+    std::vector<std::string> bad = {
+        "",           "no/such/folder/log", "paths",      "paths/good.log/below",
+        "/dev/null",  "paths/locked.log",   "paths/pipe", "paths/to-device",
+        "paths/loop", "paths/new"};
+    if (lchown("paths/foreign", 1, 1) == 0) // root's to do
+        bad.insert(bad.end(), {"paths/foreign", "paths/own-foreign"});
+    EXPECT_EQ(file.validateAndSetPath(nullptr, false), -1);
+    for (const std::string& path : bad)
+        EXPECT_EQ(file.validateAndSetPath(path.c_str(), false), -1) << path;
+    EXPECT_STREQ(file.get_path().c_str(), "paths/good.log");
+    EXPECT_EQ(file.validateAndSetPath("paths/own-own", false), 0);
+    EXPECT_TRUE(fs::exists("paths/other.log"));
+    fs::remove_all("paths");
+}
+
+// The name is looked at each time that it is opened.
+TEST_F(Logger_Test, APathThatIsExchangedIsNeitherOpenedNorEmptied) {
+    namespace fs = std::filesystem;
+    write("precious", "kept");
+    VLN_FileLogger file;
+    logger.add_logger(&file);
+    ASSERT_EQ(file.validateAndSetPath("life.log", false), 0);
+    fs::remove("life.log");
+    fs::create_symlink("precious", "life.log");
+    if (lchown("life.log", 1, 1) == 0) {
+        logger.apply_mode(LOG_MODE_FILE);
+        VLN_LOG(VLN_ERR, "a line");
+        logger.clear_all();
+        EXPECT_EQ(read("precious"), "kept");
+    }
+    fs::remove("life.log");
+    fs::remove("precious");
 }
 
 TEST_F(Logger_Test, ThreadsLogWhileThePathChanges) {

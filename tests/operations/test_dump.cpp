@@ -97,6 +97,7 @@ AX_STATUS AX_Set_DX_EventLogConfigDataModule(AX_WWN, const char*, uint32_t, uint
     }
 NOT_ASKED(AX_Set_DX_EventLogTraceLevel, AX_WWN, uint32_t, uint32_t, uint32_t, uint32_t, uint32_t)
 NOT_ASKED(AX_Set_DX_DefaultLoggingConfig, AX_WWN)
+NOT_ASKED(AX_SetDebugTraces, uint32_t, uint32_t)
 NOT_ASKED(AX_GenerateDump, uint32_t, uint32_t, AX_WWN)
 NOT_ASKED(AX_GenerateEfdDump, AX_WWN, int32_t, uint32_t)
 NOT_ASKED(AX_GenerateCoreDump, AX_WWN, const char*)

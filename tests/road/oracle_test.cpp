@@ -205,6 +205,7 @@ constexpr Scenario SCENARIOS[] = {
     {"ISCSIEmpty", "iscsi-empty.json"},
     {"IPTables", "ip-tables.json"},
     {"DriverParameters", "driver-parameters.json"},
+    {"RecordLogs", "record-logs.json"},
 };
 
 class Oracle : public testing::TestWithParam<Scenario> {};

@@ -121,7 +121,7 @@ TEST(Software, RecordLogsShowTheLogger) {
         Road road;
         std::ofstream(road.root() / "etc/vorlan_mpca_provider.dmp") << row.settings;
         const auto logs = road.enumerate("VLNMPCA_RecordLog");
-        ASSERT_EQ(logs.size(), 2u);
+        ASSERT_EQ(logs.size(), 5u) << "and three of drivers";
         expect_properties(logs[0], {{"ElementName", "Record logs for Vorlan CIM Provider"},
                                     {"LogLevel", row.level},
                                     {"RequestedState", row.requested},

@@ -90,6 +90,7 @@ public:
         add_method_command();
         add_hardware_command();
         add_hand_commands();
+        add_system_log_command();
         add_firmware_commands();
     }
 
@@ -225,6 +226,11 @@ private:
                  "globalDriverParameters");
         required(hardware, "NAME", _command.value_name, "Name or number in the table");
         required(hardware, "VALUE", _command.value, "New value; null takes it away");
+    }
+
+    void add_system_log_command() {
+        CLI::App& log = add("system-log", "With --simulate: write a line to the host's log");
+        required(log, "LINE", _command.value, "As a driver writes it");
     }
 
     // What is done to the hardware of a host from outside.

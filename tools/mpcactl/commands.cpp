@@ -25,6 +25,11 @@ int act(Session& session, const Command& command) {
     return EXIT_FINE;
 }
 
+int write_system_log(Session& session, const Command& command) {
+    session.simulation().log(command.value);
+    return EXIT_FINE;
+}
+
 int write_firmware(Session& session, const Command& command) {
     session.simulation().write_firmware(command.file, command.model, command.version, command.size);
     return EXIT_FINE;
@@ -55,6 +60,7 @@ constexpr Row COMMANDS[] = {
     {"reset", act<VLNSIM_RESET_ADAPTER>},
     {"pull", act<VLNSIM_PULL_CABLE>},
     {"plug", act<VLNSIM_PLUG_CABLE>},
+    {"system-log", write_system_log},
     {"simulate-firmware", write_firmware},
 };
 

@@ -159,6 +159,11 @@ void Simulation::act(const std::string& port, vlnsim_action action) {
         throw Usage_Error(error);
 }
 
+void Simulation::log(const std::string& line) {
+    if (function<decltype(vlnsim_log)>("vlnsim_log")(line.c_str()) != 0)
+        throw Usage_Error("the log of the host cannot be written");
+}
+
 void Simulation::write_firmware(const std::string& file, const std::string& model,
                                 const std::string& version, std::size_t size) {
     char error[4096] = "";

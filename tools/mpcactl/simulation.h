@@ -32,6 +32,8 @@ public:
     // Starts the host anew.
     void reboot();
     void act(const std::string& port, vlnsim_action action); // Usage_Error: unknown port
+    // Writes a line to the log of the host.
+    void log(const std::string& line);
     // Writes a firmware image of so many bytes behind its head. Throws Usage_Error.
     void write_firmware(const std::string& file, const std::string& model,
                         const std::string& version, std::size_t size);

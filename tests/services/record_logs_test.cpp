@@ -266,7 +266,7 @@ TEST_F(Record_Logs, EachAnswerHasItsLine) {
     };
     for (const Row& row : rows)
         expect(row);
-    EXPECT_FALSE(fs::exists("two\nlines"));
+    EXPECT_FALSE(fs::exists(road.root() / "two\nlines"));
 }
 
 TEST_F(Record_Logs, LevelsOfTheLibraryAreItsOwn) {

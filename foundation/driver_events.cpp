@@ -38,19 +38,27 @@ public:
     void look_at(std::string_view line) {
         if (!memmem(line.data(), line.size(), _driver.key_word, _key_length))
             return;
-        _lines.push_back(shown(line));
-        _size += _lines.back().size();
+        _lines.emplace_back(line);
+        _size += line.size();
         while (_lines.size() > _driver.log->maximum() || _size > MAX_EVENT_TEXT) {
             _size -= _lines.front().size();
             _lines.pop_front();
         }
     }
 
-    // Each is in one place only at a time.
+    // Only what is handed over is made text, which takes longer than to read: a log may consist of
+    // lines of the driver. A line is here or there, so that both together need little memory.
     void hand_over() {
-        for (; !_lines.empty(); _lines.pop_back())
-            if (_driver.log->Handlelog(std::move(_lines.back())) != 0)
+        std::size_t room = MAX_EVENT_TEXT;
+        for (; !_lines.empty(); _lines.pop_back()) {
+            std::string text = shown(_lines.back());
+            if (text.size() > room)
                 break;
+            room -= text.size();
+            if (_driver.log->Handlelog(std::move(text)) != 0)
+                break;
+        }
+        _lines.clear();
         VLN_LOG(VLN_DBG, "Finished reading Events for %s", _driver.key_word);
     }
 

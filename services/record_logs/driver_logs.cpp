@@ -7,6 +7,7 @@
 #include "foundation/driver_events.h"
 #include "foundation/host_paths.h"
 
+#include <algorithm>
 #include <vector>
 
 namespace cimple {
@@ -57,6 +58,12 @@ uint32 create_driver_log(const Map_Scope& scope, Driver_Kind kind, Adapter& adap
     }
     join_log_with_user(agent.*row.uses, *log, *driver);
     return MAP_OK;
+}
+
+bool has_adapter(const ProviderAgent& agent, uint32 type) {
+    const auto& adapters = agent.m_pData->adapters;
+    return std::any_of(adapters.begin(), adapters.end(),
+                       [type](const auto& adapter) { return adapter->getAdapterType() == type; });
 }
 
 uint32 create_driver_log(const Map_Scope& scope, Driver_Kind kind) {
@@ -117,9 +124,10 @@ void read_driver_events(ProviderAgent& agent, Driver_Kind kind) {
 uint32 read_driver_events(const Map_Scope& scope) {
     std::vector<Driver_Kind> kinds;
     for (const Driver_Kind kind : {FC_DRIVER, ISCSI_DRIVER, NIC_DRIVER})
-        if (scope.agent.m_DriverLogs[kind].is_on)
+        if (scope.agent.m_DriverLogs[kind].is_on &&
+            has_adapter(scope.agent, driver_log_table[kind].adapter))
             kinds.push_back(kind);
-    if (!kinds.empty())
+    if (!kinds.empty()) // else the host's log need not be read
         read_events(scope.agent, kinds);
     return MAP_OK;
 }

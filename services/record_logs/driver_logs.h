@@ -29,8 +29,8 @@ struct Driver_Log_Row {
 // By Driver_Kind.
 extern const Driver_Log_Row driver_log_table[NUM_DRIVER_KINDS];
 
-// The groups of the adapter pass: the lines of all logs that are on, and each log, which a host has
-// with the first adapter of its kind.
+// The groups of the adapter pass: the lines of all logs that the host has and that are on, and each
+// log, which a host has with the first adapter of its kind.
 uint32 read_driver_events(const Map_Scope& scope);
 uint32 create_nic_driver_log(const Map_Scope& scope);
 uint32 create_fc_driver_log(const Map_Scope& scope);

@@ -35,7 +35,7 @@ struct Record_Log_Provider : Pattern_Provider<VLNMPCA_RecordLog> {
                         Property<String>* path, Result* result);
 };
 
-// A row for each class of records, and for each association of a log with its records.
+// Whose records.
 enum class Record_Class : uint8 { PROVIDER, FC, ISCSI, NIC };
 
 // Delivers the records of a class, or the associations with their log. Answers 0 always.

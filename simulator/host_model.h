@@ -48,6 +48,7 @@ struct Unit {
     std::optional<Bytes> capacity;      // READ CAPACITY(10), SBC
     std::uint32_t check_conditions = 0; // so many answers to each command come first
     bool silent = false;                // every command fails
+    bool reported = true;               // by the target, to a virtual port that asks for its units
     std::uint32_t from_call = 1;        // of the target mapping: before it the unit is not listed
     std::array<std::uint32_t, 4> checks_given{};
 };
@@ -59,6 +60,20 @@ struct Target {
     std::uint32_t bus = 0;
     std::uint32_t number = 0;
     std::vector<Unit> units;
+};
+
+struct Virtual_Machine {
+    std::string id;
+    std::string name;
+    std::string operating_system;
+};
+
+// A port with names of its own behind a function's, and what it sees.
+struct Virtual_Port {
+    AX_VPort names{};
+    AX_VPortAttributes attributes{};
+    std::optional<Virtual_Machine> machine; // that uses it
+    std::vector<Target> targets;
 };
 
 // A parameter of a driver.
@@ -239,7 +254,7 @@ struct Function {
     Name_Pair non_volatile_names;
     std::optional<Name_Pair> volatile_names;
     std::vector<std::uint64_t> former_wwpns; // by which callers may still know it
-    std::vector<AX_VPort> virtual_ports;
+    std::vector<Virtual_Port> virtual_ports;
     std::optional<AX_QoS> qos; // its kind is a set call's
     std::vector<Virtual_Function> virtual_functions;
 

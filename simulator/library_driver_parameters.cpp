@@ -133,24 +133,27 @@ bool same(const AX_NAME& one, const AX_NAME& other) {
     return std::memcmp(&one, &other, sizeof one) == 0;
 }
 
-bool carries(const Function& function, const AX_NAME& port) {
-    const auto& ports = function.virtual_ports;
-    return get_name(port.byte) == function.wwpn ||
-           std::any_of(ports.begin(), ports.end(),
-                       [&](const AX_VPort& each) { return same(each.wwpn, port); });
+// What the port of that name sees through the function: its own or a virtual one; else null.
+const std::vector<Target>* targets_of(const Function& function, const AX_NAME& port) {
+    if (get_name(port.byte) == function.wwpn)
+        return &function.targets;
+    for (const Virtual_Port& each : function.virtual_ports)
+        if (same(each.names.wwpn, port))
+            return &each.targets;
+    return nullptr;
 }
 
 // The function that has the name, or carries the virtual port that has it.
 Function* find_carrier(Call& call, AX_WWN wwn) {
     for (Function& function : call.host.functions)
-        if (carries(function, name_of(wwn)))
+        if (targets_of(function, name_of(wwn)))
             return &function;
     return call.function(wwn);
 }
 
 // All units of a target stand for one.
-bool sees(const Function& function, const AX_OASLun& unit) {
-    for (const Target& target : function.targets)
+bool see(const std::vector<Target>& targets, const AX_OASLun& unit) {
+    for (const Target& target : targets)
         if (target.port_wwn == get_name(unit.target.byte))
             return (unit.lun == AX_OAS_ALL_LUNS && unit.state == 0) ||
                    std::any_of(target.units.begin(), target.units.end(),
@@ -229,12 +232,13 @@ AX_STATUS AX_SetOASLunState(AX_WWN wwn, AX_WWN vport, AX_WWN target, uint32_t lu
                 return AX_STATUS_INVALID_ARGUMENT;
             }
             Function* function = find_carrier(call, wwn);
-            if (!function || !carries(*function, name_of(vport)))
+            const auto* targets = function ? targets_of(*function, name_of(vport)) : nullptr;
+            if (!targets)
                 return AX_STATUS_ILLEGAL_WWN;
             if (!function->unit_priorities)
                 return AX_STATUS_NOT_SUPPORTED;
             const AX_OASLun unit{name_of(vport), name_of(target), lun, state, option, 0};
-            if (!sees(*function, unit))
+            if (!see(*targets, unit))
                 return unit_not_seen;
             set_priority(*function->unit_priorities, unit);
             return AX_STATUS_OK;

@@ -1,26 +1,12 @@
 // The SNIA HBA API: adapters by name and handle, target mappings, SCSI commands.
-#include "simulator/call.h"
 #include "simulator/identifiers.h"
+#include "simulator/scsi.h"
 
 #include <algorithm>
 #include <cstring>
 
 namespace vlnsim::library {
 namespace {
-
-enum Command { inquiry, serial_page, identity_page, read_capacity };
-
-constexpr HBA_UINT32 page_serial = 0x80;
-constexpr HBA_UINT32 page_identity = 0x83;
-
-// Sense data in fixed format, SPC.
-struct Sense {
-    std::uint8_t key;
-    std::uint8_t code; // additional sense code
-};
-constexpr Sense unit_attention{6, 0x29};
-constexpr Sense invalid_command{5, 0x20};
-constexpr Sense invalid_field{5, 0x24};
 
 Function* function_of(Call& call, HBA_HANDLE handle) {
     const auto it = call.sim.handles.find(handle);
@@ -143,79 +129,12 @@ HBA_STATUS answer_mapping(Call& call, Function& function, HBA_FCPTARGETMAPPING& 
     return too_small ? HBA_STATUS_ERROR_MORE_DATA : HBA_STATUS_OK;
 }
 
-HBA_STATUS check_condition(Sense sense, void* buffer, HBA_UINT32 size) {
-    constexpr std::size_t length = 18;
-    const std::uint8_t bytes[length] = {0x70,       0, sense.key, 0, 0, 0,         0,
-                                        length - 8, 0, 0,         0, 0, sense.code};
-    std::memcpy(buffer, bytes, std::min<std::size_t>(size, length));
-    return HBA_STATUS_SCSI_CHECK_CONDITION;
-}
-
-struct Scsi_Buffers {
-    void* response;
-    HBA_UINT32 response_size;
-    void* sense;
-    HBA_UINT32 sense_size;
-};
-
-Unit* find_unit(Function& function, HBA_WWN port, HBA_UINT64 lun, HBA_STATUS& status) {
-    status = HBA_STATUS_ERROR_ILLEGAL_WWN;
-    for (Target& target : function.targets) {
-        if (target.port_wwn != get_name(port.wwn))
-            continue;
-        status = HBA_STATUS_ERROR_INVALID_LUN;
-        for (Unit& unit : target.units)
-            if (unit.fcp_lun == static_cast<std::uint64_t>(lun))
-                return &unit;
-    }
-    return nullptr;
-}
-
-const Bytes* response_of(const Unit& unit, Command command) {
-    const auto there = [](const std::optional<Bytes>& bytes) { return bytes ? &*bytes : nullptr; };
-    switch (command) {
-    case serial_page:
-        return there(unit.serial_page);
-    case identity_page:
-        return there(unit.identity_page);
-    case read_capacity:
-        return there(unit.capacity);
-    case inquiry:
-        break;
-    }
-    return &unit.inquiry;
-}
-
-HBA_STATUS answer_scsi(Call& call, HBA_HANDLE handle, HBA_WWN port, HBA_UINT64 lun,
-                       std::optional<Command> command, const Scsi_Buffers& buffers) {
+HBA_STATUS answer_command(Call& call, HBA_HANDLE handle, HBA_WWN port, HBA_UINT64 lun,
+                          std::optional<Scsi_Command> command, const Scsi_Buffers& buffers) {
     Function* function = function_of(call, handle);
-    if (!function)
-        return HBA_STATUS_ERROR_INVALID_HANDLE;
-    if (call.null(buffers.response, "response") || call.null(buffers.sense, "sense"))
-        return HBA_STATUS_ERROR_ARG;
-    HBA_STATUS status = HBA_STATUS_OK;
-    Unit* unit = find_unit(*function, port, lun, status);
-    if (!unit) {
-        call.violation("unknown target or logical unit at " + shown(port));
-        return status;
-    }
-    if (unit->silent)
-        return HBA_STATUS_ERROR;
-    if (!command)
-        return check_condition(invalid_field, buffers.sense, buffers.sense_size);
-    std::uint32_t& given = unit->checks_given[*command];
-    if (given < unit->check_conditions) {
-        ++given;
-        return check_condition(unit_attention, buffers.sense, buffers.sense_size);
-    }
-    given = 0;
-    const Bytes* response = response_of(*unit, *command);
-    if (!response)
-        return check_condition(*command == read_capacity ? invalid_command : invalid_field,
-                               buffers.sense, buffers.sense_size);
-    std::copy_n(response->data(), std::min<std::size_t>(buffers.response_size, response->size()),
-                static_cast<std::uint8_t*>(buffers.response));
-    return HBA_STATUS_OK;
+    return function ? answer_scsi(call, function->targets, get_name(port.wwn),
+                                  static_cast<std::uint64_t>(lun), command, buffers)
+                    : HBA_STATUS_ERROR_INVALID_HANDLE;
 }
 
 } // namespace
@@ -340,15 +259,8 @@ HBA_STATUS HBA_SendScsiInquiry(HBA_HANDLE handle, HBA_WWN PortWWN, HBA_UINT64 fc
     return answer<HBA_STATUS>(
         Entry::HBA_SendScsiInquiry,
         [&](Call& call) {
-            std::optional<Command> command;
-            if (EVPD == 0 && PageCode == 0)
-                command = inquiry;
-            else if (EVPD == 1 && PageCode == page_serial)
-                command = serial_page;
-            else if (EVPD == 1 && PageCode == page_identity)
-                command = identity_page;
-            return answer_scsi(call, handle, PortWWN, fcLUN, command,
-                               {pRspBuffer, RspBufferSize, pSenseBuffer, SenseBufferSize});
+            return answer_command(call, handle, PortWWN, fcLUN, inquiry_command(EVPD, PageCode),
+                                  {pRspBuffer, RspBufferSize, pSenseBuffer, SenseBufferSize});
         },
         handle, PortWWN, fcLUN, EVPD, PageCode, RspBufferSize, SenseBufferSize);
 }
@@ -359,8 +271,8 @@ HBA_STATUS HBA_SendReadCapacity(HBA_HANDLE handle, HBA_WWN portWWN, HBA_UINT64 f
     return answer<HBA_STATUS>(
         Entry::HBA_SendReadCapacity,
         [&](Call& call) {
-            return answer_scsi(call, handle, portWWN, fcLUN, read_capacity,
-                               {pRspBuffer, RspBufferSize, pSenseBuffer, SenseBufferSize});
+            return answer_command(call, handle, portWWN, fcLUN, Scsi_Command::read_capacity,
+                                  {pRspBuffer, RspBufferSize, pSenseBuffer, SenseBufferSize});
         },
         handle, portWWN, fcLUN, RspBufferSize, SenseBufferSize);
 }

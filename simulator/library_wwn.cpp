@@ -234,23 +234,5 @@ AX_STATUS AX_RestoreWWN(AX_WWN wwn, uint32_t type, uint32_t* activation) {
         wwn, type);
 }
 
-AX_STATUS AX_VPList(AX_WWN wwn, AX_VPortList* list) {
-    return answer<AX_STATUS>(
-        Entry::AX_VPList,
-        [&](Call& call) -> AX_STATUS {
-            if (call.null(list, "list"))
-                return AX_STATUS_INVALID_ARGUMENT;
-            const Function* function = call.function(wwn);
-            if (!function)
-                return AX_STATUS_ILLEGAL_WWN;
-            const auto& ports = function->virtual_ports;
-            if (call.list_too_small(list->count, ports.size()))
-                return AX_STATUS_MORE_DATA;
-            std::copy(ports.begin(), ports.end(), list->entry);
-            return AX_STATUS_OK;
-        },
-        wwn);
-}
-
 } // namespace library
 } // namespace vlnsim

@@ -83,7 +83,7 @@ Dumps read_dumps(const Node& values);
 Fip read_fip(const Node& values);
 // The function's names have been read, and are the factory's unless the values tell others.
 void read_name_management(const Node& values, Function& function);
-std::vector<AX_VPort> read_virtual_ports(const Node& values);
+std::vector<Virtual_Port> read_virtual_ports(const Node& values);
 
 Diagnostics read_diagnostics(const Node& values);
 // One of its numbers; a name that none has is an error at value.

@@ -16,9 +16,9 @@ constexpr std::size_t max_identifier = 247; // of a descriptor, within a respons
 
 // Keys of a unit; at a target they hold for all its units.
 constexpr std::string_view unit_keys[] = {
-    "type",      "types",      "vendor",          "product", "revision",
-    "serial",    "identifier", "osDeviceName",    "lastLBA", "blockLength",
-    "responses", "silent",     "checkConditions", "fromCall"};
+    "type",      "types",      "vendor",          "product",  "revision",
+    "serial",    "identifier", "osDeviceName",    "lastLBA",  "blockLength",
+    "responses", "silent",     "checkConditions", "fromCall", "reported"};
 
 // A field of an inquiry: cut or filled with blanks.
 void put_padded(const std::string& text, std::size_t width, Bytes& bytes) {
@@ -141,6 +141,7 @@ Unit read_unit(const Node& values, std::uint64_t target, std::uint64_t lun) {
     unit.check_conditions = values.number32("checkConditions", 0);
     unit.silent = values.boolean("silent", false);
     unit.from_call = values.number32("fromCall", 1);
+    unit.reported = values.boolean("reported", true);
     override_responses(values, unit);
     return unit;
 }

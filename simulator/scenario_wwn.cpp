@@ -1,4 +1,4 @@
-// What can be done to a port's names, and the virtual ports that it carries.
+// What can be done to a port's names.
 #include "simulator/scenario.h"
 
 #include <algorithm>
@@ -6,8 +6,6 @@
 
 namespace vlnsim {
 namespace {
-
-constexpr std::uint64_t max_virtual_ports = 65536;
 
 constexpr std::string_view words[] = {"nonVolatile", "volatile", "reboot", "reset", "readOnly"};
 constexpr std::uint32_t bits[] = {AX_WWN_CAN_CHANGE_NON_VOLATILE, AX_WWN_CAN_CHANGE_VOLATILE,
@@ -48,27 +46,6 @@ void read_name_management(const Node& values, Function& function) {
     if (const auto node = values.member("volatile"))
         function.volatile_names = read_pair(*node, current);
     function.name_management = management;
-}
-
-std::vector<AX_VPort> read_virtual_ports(const Node& values) {
-    std::vector<AX_VPort> ports;
-    for (const Node& row : values.items()) {
-        row.expect_object({"count", "wwpn", "wwnn"});
-        const std::uint64_t count = row.number("count", 1, max_virtual_ports);
-        for (std::uint64_t i = 0; i < count; ++i) {
-            const Scope scope = row.scope().with("vport", ports.size());
-            const Node port(row.value(), scope);
-            const auto wwpn = port.member("wwpn");
-            if (!wwpn)
-                row.fail("\"wwpn\" is wanted: the port name, 16 hexadecimal digits");
-            const auto wwnn = port.member("wwnn");
-            AX_VPort entry{};
-            put_name(wwpn->wwn(), entry.wwpn.byte);
-            put_name((wwnn ? wwnn : wwpn)->wwn(), entry.wwnn.byte);
-            ports.push_back(entry);
-        }
-    }
-    return ports;
 }
 
 } // namespace vlnsim

@@ -48,6 +48,7 @@ typedef uint32_t AX_STATUS;
 #define AX_STATUS_ILLEGAL_WWN 5u /* AX_ValidateWwn: not a valid name */
 #define AX_STATUS_MORE_DATA 7u   /* lists: the count now holds what is needed */
 #define AX_STATUS_NO_MEMORY 8u
+#define AX_STATUS_CHECK_CONDITION 9u /* SCSI through a virtual port; assumed: as of the HBA API */
 #define AX_STATUS_DIAG_IN_PROGRESS 60u
 #define AX_STATUS_NO_DIAGNOSTICS 63u
 #define AX_STATUS_WWN_NOT_SUPPORTED 89u

@@ -75,6 +75,7 @@ TEST_F(Simulated, EveryKeyIsDocumented) {
         R"({"nameManagement": {"can": "?"}})",
         R"({"nameManagement": {"factory": {"?": 0}}})",
         R"({"virtualPorts": [{"?": 0}]})",
+        R"({"virtualPorts": [{"wwpn": "2000024500000001", "machine": {"?": 0}}]})",
         R"({"portConfig": {"?": 0}})",
         R"({"portConfig": {"flags": "?"}})",
         R"({"portConfig": {"ports": [{"?": 0}]}})",

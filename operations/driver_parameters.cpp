@@ -154,27 +154,14 @@ AX_STATUS VLN_MethodWrapper::GetOASLunList(const HBA_WWN* name, uint32 option,
     Operation_Frame frame("VLN_MethodWrapper::GetOASLunList");
     if (!frame.given(units))
         return frame.status();
-    units->clear();
-    Reply reply;
-    const AX_STATUS status = reply.fetch(
-        {.head = offsetof(AX_OASLunList, entry), .entry = sizeof(AX_OASLun), .first = FIRST_LIST},
-        {"Unable to allocate the memory for the list of units with priority"},
-        counted<AX_OASLunList>(
-            [&](AX_OASLunList* list) { return AX_GetOASLunList(wwnOf(name), option, list); }));
+    const AX_STATUS status = fetch_list<AX_OASLunList>(
+        units, FIRST_LIST, {"Unable to allocate the memory for the list of units with priority"},
+        [&](AX_OASLunList* list) { return AX_GetOASLunList(wwnOf(name), option, list); });
     if (status == AX_STATUS_NOT_SUPPORTED)
         VLN_LOG(VLN_DBG, "GetOASLunList failed. Unsupported Hardware");
     else if (status != AX_STATUS_OK)
         VLN_OPERATION_FAILED(status, "GetOASLunList exited with the error code %d", status);
-    if (status != AX_STATUS_OK)
-        return status;
-    try {
-        const auto* list = static_cast<const AX_OASLunList*>(reply.data());
-        units->assign(list->entry, list->entry + reply.count());
-    } catch (const std::bad_alloc&) {
-        VLN_LOG(VLN_ERR, "Unable to allocate the memory for the list of units with priority");
-        return AX_STATUS_ERROR;
-    }
-    return AX_STATUS_OK;
+    return status;
 }
 
 } // namespace cimple

@@ -46,6 +46,16 @@ struct VLN_NameServers {
     std::vector<AX_IPAddress> list;
 };
 
+// What a logical unit answered to a virtual port.
+struct VLN_VPortUnit {
+    uint32 deviceType = 0; // peripheral device type of SPC
+    std::string vendor;    // at most 8 bytes, 16 and 4; any bytes
+    std::string product;
+    std::string revision;
+    uint64 lastLBA = 0;
+    uint64 blockLength = 0; // bytes
+};
+
 class VLN_MethodWrapper : public VLN_Identifiers {
 public:
     // Bytes of the name of the host's system with its end mark.
@@ -208,6 +218,27 @@ public:
     static AX_STATUS GetVirtualFuncList(const HBA_WWN* name, std::vector<AX_NAME>* functions);
     static AX_STATUS GetVirtualFuncPropertyList(const HBA_WWN* name, const AX_NAME& function,
                                                 AX_VirtualFunctionProperties* properties);
+
+    // ---- Virtual ports (virtual_ports.cpp) ----
+    //
+    // Of the port name, and the virtual port that it carries.
+
+    static AX_STATUS ListVPorts(const HBA_WWN* name, std::vector<AX_VPort>* ports);
+    static AX_STATUS ListVPortAttributes(const HBA_WWN* name, const HBA_WWN* vport,
+                                         AX_VPortAttributes* attributes);
+    // What the host knows the virtual port to see: logical units, those of a target one by one.
+    static AX_STATUS ListVPortTargets(const HBA_WWN* name, const HBA_WWN* vport,
+                                      std::vector<AX_VPortTarget>* units);
+    // The numbers of the units that a target tells the virtual port of.
+    static AX_STATUS ListVPortLuns(const HBA_WWN* name, const HBA_WWN* vport, const AX_NAME& target,
+                                   std::vector<uint32>* luns);
+    // What a unit tells of itself. A check condition may be over with the next attempt; there are
+    // three.
+    static AX_STATUS VPortLunAttr(const HBA_WWN* name, const HBA_WWN* vport,
+                                  const AX_VPortTarget& unit, VLN_VPortUnit* answer);
+    // The name of the virtual machine that uses the virtual port; 251 for none.
+    static AX_STATUS ListVMfromVPort(const HBA_WWN* name, const HBA_WWN* vport,
+                                     std::string* machine);
 
     // ---- Driver parameters (driver_parameters.cpp) ----
 

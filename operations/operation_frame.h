@@ -26,8 +26,11 @@
 #include "foundation/log.h"
 #include "operations/method_wrapper.h"
 
+#include <cstddef>
 #include <cstdlib>
 #include <memory>
+#include <new>
+#include <vector>
 
 namespace cimple {
 
@@ -158,6 +161,27 @@ auto counted(Call call) {
         count = list->count;
         return status;
     };
+}
+
+// A list with its count at its head, copied to the caller: status as of Reply::fetch, without a
+// line for what the library refuses. first: entries of the first buffer.
+template <class List, class Entry, class Call>
+AX_STATUS fetch_list(std::vector<Entry>* entries, uint32 first, const No_Memory& noMemory,
+                     Call call, Place place = Place::current()) {
+    entries->clear();
+    Reply reply;
+    const AX_STATUS status = reply.fetch({offsetof(List, entry), sizeof(Entry), first}, noMemory,
+                                         counted<List>(call), place);
+    if (status != AX_STATUS_OK)
+        return status;
+    try {
+        const auto* list = static_cast<const List*>(reply.data());
+        entries->assign(list->entry, list->entry + reply.count());
+    } catch (const std::bad_alloc&) {
+        VLN_LOG(VLN_ERR, "%s", noMemory.line);
+        return noMemory.status;
+    }
+    return AX_STATUS_OK;
 }
 
 } // namespace cimple

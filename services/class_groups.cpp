@@ -20,6 +20,7 @@
 #include "services/phy/instances.h"
 #include "services/record_logs/driver_logs.h"
 #include "services/record_logs/instances.h"
+#include "services/virtual_ports/instances.h"
 #include "services/wwn/instances.h"
 
 namespace cimple {
@@ -94,6 +95,12 @@ constexpr Class_Group GROUPS[] = {
     {.place = FC_PORTS,
      .create = create_fcoe_bridging,
      .before = {VLN_DBG, "calling CreateCeeClasses for FCoE port"}},
+    {.place = FC_PORTS,
+     .create = create_virtual_ports,
+     .clear = ClearPortVirtualizationMaps,
+     .done = {VLN_DBG, "Port Virtualization classes are successfully created"},
+     .failed = {VLN_ERR, "Port Virtualization classes are not created"},
+     .thrown = {VLN_ERR, "Port Virtualization classes are not created"}},
     {.place = FC_PORTS, .create = create_lun_priorities}, // behind virtual ports, which it joins
     {.place = ISCSI_PORT, .create = create_ip_tables},
     {.place = ISCSI_PORTS,

@@ -95,10 +95,10 @@ Ref<VLNMPCA_FCPortStatistics> port_statistics_instance(const FC_Function& functi
 }
 
 Ref<VLNMPCA_SCSIProtocolInitiatorEndpoint>
-initiator_endpoint_instance(const FC_Function& function, const CIM_ComputerSystem& system) {
+initiator_endpoint_instance(const String& port_name, const CIM_ComputerSystem& system) {
     auto endpoint = make_instance<VLNMPCA_SCSIProtocolInitiatorEndpoint>();
     name_in_system(*endpoint, system);
-    endpoint->Name.set(format_text("Initiator:%s", function.name.c_str()));
+    endpoint->Name.set(format_text("Initiator:%s", port_name.c_str()));
     endpoint->ConnectionType.set(CONNECTION_TYPE_FCOE);
     endpoint->ProtocolIFType.set(IF_TYPE_FIBRE_CHANNEL);
     endpoint->Role.set(ROLE_INITIATOR);

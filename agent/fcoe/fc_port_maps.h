@@ -12,7 +12,7 @@ struct VLNMPCA_SCSIProtocolInitiatorEndpoint;
 Ref<VLNMPCA_FCPort> CreateFCPort(const FC_Function& function, const CIM_ComputerSystem& system);
 Ref<VLNMPCA_FCPortStatistics> port_statistics_instance(const FC_Function& function);
 Ref<VLNMPCA_SCSIProtocolInitiatorEndpoint>
-initiator_endpoint_instance(const FC_Function& function, const CIM_ComputerSystem& system);
+initiator_endpoint_instance(const String& port_name, const CIM_ComputerSystem& system);
 
 // Whether the adapter can throttle its priority flow control: one model, and one firmware on any.
 bool has_pfc_throttle(const FCoEAdapterAttributes& adapter);

@@ -88,7 +88,7 @@ bool FCoE_Map_Builder::joinWWNService(const FC_Function& function) {
 
 bool FCoE_Map_Builder::createInitiatorEndpoint(const FC_Function& function) {
     const auto* endpoint = insert_instance(_agent.m_VLNMPCA_SCSIProtocolInitiatorEndpoint_map,
-                                           initiator_endpoint_instance(function, *_system));
+                                           initiator_endpoint_instance(function.name, *_system));
     return endpoint &&
            associate(_agent.m_VLNMPCA_DeviceSAPImplementation_map, function.fc_port, endpoint) &&
            associate_as(

@@ -75,6 +75,13 @@ AX_WWN wwnOf(const HBA_WWN* name) {
     return name ? AX_WwnOf(name) : AX_WWN{};
 }
 
+AX_WWN wwnOf(const AX_NAME& name) {
+    AX_WWN wwn;
+    static_assert(sizeof wwn == sizeof name);
+    std::memcpy(&wwn, &name, sizeof wwn);
+    return wwn;
+}
+
 bool wwnOfName(const char* name, AX_WWN& wwn, int level) {
     HBA_WWN binary{};
     if (VLN_Identifiers::string2HBAName(&binary, name) != 1) {

@@ -19,6 +19,7 @@ struct VLN_IpInfo {
 // The name as the library takes it. A null pointer gives the null name, which is no adapter's and
 // which the library refuses.
 AX_WWN wwnOf(const HBA_WWN* name);
+AX_WWN wwnOf(const AX_NAME& name); // one of a record
 
 // A name of 16 hexadecimal digits as the library takes it. False, with a line at the level, for a
 // text that is none.

@@ -7,6 +7,7 @@
 #include "classes/VLNMPCA_DriverParameterService.h"
 #include "device/library/axapi.h"
 #include "services/driver_parameters/instances.h"
+#include "services/virtual_ports/instances.h"
 
 #include <iterator>
 
@@ -18,7 +19,6 @@ using Setting = VLNMPCA_DriverParameterSettingData;
 
 constexpr const char* OPTION_WORDS[] = {"Driver", "Config"}; // by AX_OAS_
 constexpr char CONFIGURATION[] = "Prio Via";
-constexpr char VIRTUAL_PORT_CLASS[] = "VLN_VirtualFCPort"; // as its instances name it
 
 String wwpn_text(const AX_NAME& name) {
     String text;

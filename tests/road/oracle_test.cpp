@@ -206,6 +206,7 @@ constexpr Scenario SCENARIOS[] = {
     {"IPTables", "ip-tables.json"},
     {"DriverParameters", "driver-parameters.json"},
     {"RecordLogs", "record-logs.json"},
+    {"VirtualPorts", "virtual-ports.json"},
 };
 
 class Oracle : public testing::TestWithParam<Scenario> {};

@@ -52,7 +52,8 @@ struct Group_Line {
 
 struct Class_Group {
     Group_Place place;
-    // Answers a Map_Status. END_PASS ends the pass, all others let it go on.
+    // Answers a Map_Status. END_PASS ends the pass, all others let it go on. One that leaves its
+    // work since scan_is_to_end asks for another adapter refresh: nobody is shown what it has made.
     uint32 (*create)(const Map_Scope& scope);
     // Empties what create fills: before it, and when it throws. Null where the pass has emptied it.
     void (*clear)(ProviderAgent& agent) = nullptr;

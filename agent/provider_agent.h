@@ -182,6 +182,7 @@ private:
     bool isSANPassWanted() const;
     void runAdapterPass();
     void rebuildAdapterData();
+    void leaveAdapterMaps();
     void rebuildAdapterMaps(const Platform_Objects& platform);
     void runSANPass();
     void rebuildSANMaps();

@@ -191,10 +191,17 @@ void ProviderAgent::rebuildAdapterData() {
     m_AdapterDataReadyCond.broadcast();
 }
 
+// A part of the maps is nobody's picture. Whoever came by the first gate now would wait at the
+// second, with the mutex that the next refresh needs: so the first one is shut as well.
+void ProviderAgent::leaveAdapterMaps() {
+    m_bAdapterRefreshRequested = true;
+    m_bIsAdapterDataReady = false;
+}
+
 void ProviderAgent::rebuildAdapterMaps(const Platform_Objects& platform) {
     Auto_Mutex gate(m_AdapterMapsReadyMutex);
     if (scan_is_to_end) {
-        m_bAdapterRefreshRequested = true;
+        leaveAdapterMaps();
         return;
     }
     m_bIsAdapterMapsBuilding = true;
@@ -203,8 +210,12 @@ void ProviderAgent::rebuildAdapterMaps(const Platform_Objects& platform) {
         Auto_Mutex data(m_DataMutex);
         guarded("updateAdapterMaps", [&] { updateAdapterMaps(platform); });
     }
-    m_bIsAdapterMapsReady = true;
     m_bIsAdapterMapsBuilding = false;
+    if (scan_is_to_end && m_bAdapterRefreshRequested) { // by a group that was cut short
+        leaveAdapterMaps();
+        return;
+    }
+    m_bIsAdapterMapsReady = true;
     m_AdapterMapsReadyCond.broadcast();
 }
 

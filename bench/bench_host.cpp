@@ -6,6 +6,8 @@
 //   bench_host memory FACTOR                 prints bytes taken per instance
 //   bench_host virtual FUNCTIONS             one refresh of another host: 16 ports with so many
 //                                            virtual functions each; prints instances made
+//   bench_host vports PORTS                  the same of an FC port with so many virtual ports,
+//                                            each of which sees 64 units
 //
 // FACTOR multiplies the cards. What callgrind is to count stands in functions of its own.
 #include "bench/bench_hooks.h"
@@ -45,6 +47,12 @@ std::string virtual_functions(unsigned count) {
         "functions": [{"use": "nic", "portAttributes": {"SRIOVState": 1},
                        "virtualFunctions": {"count": )" +
            std::to_string(count) + "}}]}]}";
+}
+
+std::string virtual_ports(unsigned count) {
+    return R"({"include": "parts/cna.json", "cards": [{"use": "cna", "functions": [{"use": "nic"},
+        {"use": "fcoe", "virtualPorts": [{"wwpn": "2001 0256 4C00 {vport:04X}", "count": )" +
+           std::to_string(count) + R"(, "targets": {"luns": 64}}]}]}]})";
 }
 
 bool refresh() {
@@ -147,10 +155,12 @@ int main(int argc, char** argv) {
     const std::string mode = argc > 1 ? argv[1] : "";
     if (argc != (mode == "walk" ? 4 : 3))
         fail("usage: bench_host walk names|instances FACTOR, or refresh|latency|memory FACTOR, or "
-             "virtual FUNCTIONS");
+             "virtual FUNCTIONS, or vports PORTS");
     mallopt(M_ARENA_MAX, 1); // all threads' memory in one count
     const auto number = static_cast<unsigned>(std::strtoul(argv[argc - 1], nullptr, 10));
-    simulate(mode == "virtual" ? virtual_functions(number) : scenario(number));
+    simulate(mode == "virtual"  ? virtual_functions(number)
+             : mode == "vports" ? virtual_ports(number)
+                                : scenario(number));
     host::Options options;
     options.strict = false;
     host::Manager manager(options);
@@ -168,7 +178,7 @@ int main(int argc, char** argv) {
         walk(manager, std::string(argv[2]) == "names");
     else if (mode == "refresh")
         time_refreshes();
-    else if (mode == "virtual")
+    else if (mode == "virtual" || mode == "vports")
         refresh_once();
     else if (mode == "latency")
         measure_latency(manager);

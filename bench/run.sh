@@ -114,18 +114,26 @@ printf 'An enumeration of VLNMPCA_EthernetPort while refreshes run: median %d us
     "$median" "$most" "$longest"
 printf 'memory: %d bytes per instance, the model of the devices included\n' "$("$host" memory 1)"
 
+# An adapter refresh of hosts with more and more of something.
+growth() { # BENCH_HOST'S MODE, WHAT GROWS, TEXTS AROUND A NUMBER OF IT, NUMBERS
+    local mode="$1" name="$2" before="$3" after="$4" former='' number own passes made
+    shift 4
+    printf '%9s %10s %14s %30s\n' "$name" instances instructions "to half the $name, at most 2.3"
+    for number in "$@"; do
+        read -r own passes <<<"$(refreshes "$mode" "$number")"
+        read -r made _ <"$work/result"
+        own=$((own / passes))
+        printf '%9s %10d %14d %30s\n' "$before$number$after" "$made" $own \
+            "$([ -z "$former" ] || awk "BEGIN { printf \"%.2f\", $own / $former }")"
+        former=$own
+    done
+}
 echo
 echo "An adapter refresh of 16 ports with virtual functions, of the module itself"
-printf '%9s %10s %14s %30s\n' 'functions' instances instructions 'to half the functions, at most 2.3'
-former=
-for functions in 16 32 64; do
-    read -r own passes <<<"$(refreshes virtual $functions)"
-    read -r made _ <"$work/result"
-    own=$((own / passes))
-    printf '%9s %10d %14d %30s\n' "16 x $functions" "$made" $own \
-        "$([ -z "$former" ] || awk "BEGIN { printf \"%.2f\", $own / $former }")"
-    former=$own
-done
+growth virtual functions "16 x " "" 16 32 64
+echo
+echo "An adapter refresh of an FC port with virtual ports, each of which sees 64 units, of the module itself"
+growth vports ports "" " x 64" 64 128 256
 
 san="$build/bin/bench_san"
 pass="--toggle-collect=cimple::ProviderAgent::runSANPass()
@@ -159,7 +167,7 @@ printf '%9s %14s %12s %30s\n' targets instructions 'per target' 'to half the tar
 former=
 for targets in 500 1000 2000; do
     own=$(count "$changes" "$san" iscsi $targets)
-    printf '%9d %14d %12d %30s\n' $targets $own $((own / targets)) \
+    printf '%9d %14d %12d %30s\n' $targets "$own" $((own / targets)) \
         "$([ -z "$former" ] || awk "BEGIN { printf \"%.2f\", $own / $former }")"
     former=$own
 done

@@ -178,12 +178,9 @@ void remove_initiators(ProviderAgent& agent) {
 
 uint32 create_virtual_ports(const Map_Scope& scope) {
     const uint32 status = VLN_PortVirtualization(scope).CreatePortVirtualizationClasses();
-    if (!scan_is_to_end)
-        return status;
-    // A part of them is nobody's picture.
-    ClearPortVirtualizationMaps(scope.agent);
-    scope.agent.m_bAdapterRefreshRequested = true;
-    return SKIP_DEVICE;
+    if (scan_is_to_end)
+        scope.agent.m_bAdapterRefreshRequested = true; // this one is left at a part of them
+    return status;
 }
 
 void ClearPortVirtualizationMaps(ProviderAgent& agent) {

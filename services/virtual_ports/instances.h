@@ -11,8 +11,8 @@ namespace cimple {
 inline constexpr char VIRTUAL_PORT_CLASS[] = "VLN_VirtualFCPort";
 
 // Those of all FC ports, which stand in their store. A virtual port, a target or a unit that cannot
-// be read is left out. Anything but MAP_OK when a pool could not be made, or when the refresh was
-// cut short: then there are none, and another refresh is asked for.
+// be read is left out. Anything but MAP_OK when a pool could not be made. When the refresh is to
+// end early, so does this: then another one is asked for.
 uint32 create_virtual_ports(const Map_Scope& scope);
 void ClearPortVirtualizationMaps(ProviderAgent& agent);
 

@@ -64,9 +64,9 @@ private:
 
 class Held_Road {
 public:
-    explicit Held_Road(bool log = false) {
+    explicit Held_Road(bool log = false, const std::string& scenario = SCENARIO) {
         const auto trace = [this](const std::string& line) { up_calls.trace(line); };
-        _road.emplace(road::Setup{.scenario = SCENARIO, .log = log, .trace = trace});
+        _road.emplace(road::Setup{.scenario = scenario, .log = log, .trace = trace});
     }
     ~Held_Road() {
         up_calls.let_go();
@@ -77,12 +77,13 @@ public:
 
     road::Road* operator->() { return &*_road; }
 
-    // A refresh that the class started stands in the SAN pass, and no client is inside.
-    void stand_in_san_pass(const char* class_name) {
+    // A refresh that the class started stands in the SAN pass, and no client is inside; or in
+    // another call.
+    void stand_in_san_pass(const char* class_name, const char* call = "HBA_SendReadCapacity") {
         (*this)->enumerate(class_name);
         (*this)->enumerate("VLNMPCA_StorageVolume");
         up_calls.start_refresh((*this)->manager(), class_name);
-        hold("HBA_SendReadCapacity");
+        hold(call);
         up_calls.let_go();
         wait_until_held();
     }

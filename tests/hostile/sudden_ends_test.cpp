@@ -72,6 +72,20 @@ TEST(SuddenEnds, AClassTakesItsRefreshAlongAndNobodyElses) {
     EXPECT_EQ(vlnsim_calls("AX_InitLib"), 1u);
 }
 
+// Virtual ports can have more units than an unload may wait for. A part of them is shown to nobody.
+TEST(SuddenEnds, AClassDoesNotWaitForTheUnitsOfVirtualPorts) {
+    Held_Road road(true, "virtual-ports.json");
+    road->enumerate("VLNMPCA_Product");
+    road.stand_in_san_pass("VLNMPCA_Card", "AX_VpScsiInquiry");
+    const unsigned long asked = vlnsim_calls("AX_VpScsiInquiry");
+    std::thread letting_go = road.let_go_after(ENDED_EARLY);
+    EXPECT_TRUE(road->manager().cleanup("VLNMPCA_Card", true).ok());
+    letting_go.join();
+    EXPECT_LE(vlnsim_calls("AX_VpScsiInquiry"), asked + 2) << "the next attempts at the same unit";
+    EXPECT_EQ(road->enumerate("VLNMPCA_VirtualStorageVolume").size(), 7u);
+    EXPECT_EQ(road->enumerate("VLNMPCA_SCSIProtocolInitiatorEndpoint").size(), 6u);
+}
+
 TEST(SuddenEnds, TheStatusThreadGoesWithThePortsAndComesBackWithThem) {
     road::Road road({.scenario = SCENARIO});
     road.enumerate("VLNMPCA_Card");

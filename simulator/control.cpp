@@ -1,7 +1,7 @@
 // The control interface: scenario, faults, counts, records.
 #include "simulator/call.h"
 #include "simulator/firmware_image.h"
-#include "simulator/host_logs.h"
+#include "simulator/host_files.h"
 #include "simulator/scenario.h"
 #include "simulator/state.h"
 
@@ -157,11 +157,17 @@ int vlnsim_act(const char* wwn, enum vlnsim_action action, char* error, size_t s
     });
 }
 
+const char* vlnsim_platform(void) {
+    Simulator& simulator = Simulator::instance();
+    std::lock_guard lock(simulator.mutex);
+    return simulator.host.platform.c_str();
+}
+
 void vlnsim_reboot(void) {
     Simulator& simulator = Simulator::instance();
     std::lock_guard lock(simulator.mutex);
     reboot(simulator.host);
-    log_start(simulator.host, false);
+    write_files(simulator.host, false);
 }
 
 int vlnsim_log(const char* line) {
@@ -184,7 +190,7 @@ void vlnsim_set_host_root(const char* folder) {
     }
     Simulator& simulator = Simulator::instance();
     std::lock_guard lock(simulator.mutex);
-    log_start(simulator.host, true);
+    write_files(simulator.host, true);
 }
 
 const char* vlnsim_host_root(void) {

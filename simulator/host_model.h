@@ -300,6 +300,12 @@ struct Host {
     iSCSI_Network iscsi_network;
     std::vector<Function> dead_ports;    // whose firmware has failed: no instances of the library
     std::vector<std::string> system_log; // the lines of a start of the host
+    struct File {
+        std::string path; // below the host root
+        std::vector<std::string> lines;
+    };
+    std::vector<File> files;
+    std::string platform; // the file with what is the platform's own, "" for none
     std::vector<Fault> faults;
 };
 

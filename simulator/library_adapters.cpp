@@ -1,6 +1,6 @@
 // The library itself and the enumeration of its instances.
 #include "simulator/call.h"
-#include "simulator/host_logs.h"
+#include "simulator/host_files.h"
 
 #include <algorithm>
 #include <cstring>

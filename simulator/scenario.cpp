@@ -19,6 +19,11 @@ constexpr std::size_t max_include_depth = 8;
 constexpr std::uint64_t max_cards = 256;
 constexpr std::uint64_t max_ports = 16;
 
+// A path that a file tells is meant from its own folder.
+std::string beside(const std::string& file, const std::string& path) {
+    return path.starts_with("/") ? path : file.substr(0, file.rfind('/') + 1) + path;
+}
+
 // The document with everything that it includes below it.
 Value with_includes(const std::string& text, const std::string& name, std::size_t depth) {
     const Value document = parse_source(text, name);
@@ -30,12 +35,10 @@ Value with_includes(const std::string& text, const std::string& name, std::size_
         return document;
     if (depth == max_include_depth)
         include->fail("files include one another too deeply");
-    const auto slash = name.rfind('/');
-    const std::string folder = slash == std::string::npos ? "" : name.substr(0, slash + 1);
     Value base;
     base.kind = Value::Kind::object;
     for (const Node& file : include->items_or_self()) {
-        const std::string path = file.text().starts_with("/") ? file.text() : folder + file.text();
+        const std::string path = beside(name, file.text());
         std::string content;
         try {
             content = read_file(path);
@@ -283,6 +286,21 @@ Fault read_fault(const Node& values) {
     return fault;
 }
 
+namespace {
+
+Host::File read_host_file(const Node& node) {
+    node.expect_object({"path", "lines"});
+    Host::File file{node.text("path", ""), {}};
+    if (!file.path.starts_with("/") || file.path.find("..") != std::string::npos)
+        node.fail("path is to begin with / and to have no ..");
+    if (const auto lines = node.member("lines"))
+        for (const Node& line : lines->items())
+            file.lines.push_back(line.text());
+    return file;
+}
+
+} // namespace
+
 std::string read_file(const std::string& path) {
     const std::unique_ptr<std::FILE, int (*)(std::FILE*)> file(std::fopen(path.c_str(), "rb"),
                                                                &std::fclose);
@@ -301,7 +319,7 @@ Host read_scenario(const std::string& text, const std::string& name) {
     const Scope scope;
     const Node top(document, scope);
     top.expect_object({"description", "include", "templates", "libraries", "server", "iscsiNetwork",
-                       "cards", "faults", "systemLog"});
+                       "cards", "faults", "systemLog", "files", "platform"});
     Host host;
     copy_text("simulated-host", host.server.hostName, sizeof host.server.hostName);
     copy_text("Linux 2.6 x86_64 RH", host.server.targetOS, sizeof host.server.targetOS);
@@ -319,6 +337,11 @@ Host read_scenario(const std::string& text, const std::string& name) {
     if (const auto lines = top.member("systemLog"))
         for (const Node& line : lines->items())
             host.system_log.push_back(line.text());
+    if (const auto files = top.member("files"))
+        for (const Node& file : files->items())
+            host.files.push_back(read_host_file(file));
+    if (const auto platform = top.member("platform"))
+        host.platform = beside(name, platform->text());
     if (const auto faults = top.member("faults"))
         for (const Node& fault : faults->items())
             host.faults.push_back(read_fault(fault));

@@ -1,6 +1,6 @@
 #include "simulator/simulator.h"
 
-#include "simulator/host_logs.h"
+#include "simulator/host_files.h"
 #include "simulator/scenario.h"
 
 #include <algorithm>
@@ -50,7 +50,7 @@ void Simulator::replace_host(Host fresh, std::string text, std::string name) {
     faults = host.faults;
     violations.clear();
     forget_calls();
-    log_start(host, true);
+    write_files(host, true);
 }
 
 void Simulator::forget_faults() {

@@ -67,6 +67,10 @@ VLNSIM_API int vlnsim_save_state(const char* path, char* error, size_t size);
  * path/in/json: what is wrong" in error, and then the host stays as it was. */
 VLNSIM_API int vlnsim_load_state(const char* path, char* error, size_t size);
 
+/* The file with what is the platform's own on the host, as its scenario names it, or "". Stays valid
+ * until another scenario is loaded. */
+VLNSIM_API const char* vlnsim_platform(void);
+
 /* Starts the host anew: what changes with a reboot, firmware on flash for one, comes into force.
  * The provider sees it with its next refresh. */
 VLNSIM_API void vlnsim_reboot(void);

@@ -164,4 +164,26 @@ TEST(MpcactlSession, AKeptHostGoesOnWhereItWas) {
     EXPECT_EQ(contents("kept/state.json"), state.substr(0, state.size() / 2)) << "left alone";
 }
 
+// Some only once something has been done there.
+TEST(MpcactlSession, OneHostShowsEveryClass) {
+    constexpr std::size_t CLASSES = 299;
+    write_text("everything",
+               contents(SOURCE_FOLDER "/simulator/scenarios/everything.run") + "census\n");
+    const Outcome result =
+        run_bare({"--simulate", "everything", "run", "--stop", "--quiet", "everything"});
+    ASSERT_EQ(result.status, 0) << result.err;
+    std::istringstream lines(result.out);
+    std::size_t classes = 0;
+    for (std::string line; std::getline(lines, line);) {
+        std::istringstream row(line);
+        std::string name;
+        std::size_t count = 0;
+        if (!line.starts_with("VLNMPCA_") || !(row >> name >> count))
+            continue;
+        ++classes;
+        EXPECT_NE(count, 0u) << name;
+    }
+    EXPECT_EQ(classes, CLASSES);
+}
+
 } // namespace

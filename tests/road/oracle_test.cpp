@@ -207,6 +207,7 @@ constexpr Scenario SCENARIOS[] = {
     {"DriverParameters", "driver-parameters.json"},
     {"RecordLogs", "record-logs.json"},
     {"VirtualPorts", "virtual-ports.json"},
+    {"Everything", "everything.json"},
 };
 
 class Oracle : public testing::TestWithParam<Scenario> {};

@@ -77,6 +77,7 @@ Road::Road(const Setup& setup) : _root(fresh_folder()) {
     options.trace = setup.trace;
     options.registration_path = VLN_REGISTRATION;
     options.class_defaults = setup.class_defaults;
+    options.platform_path = vlnsim_platform();
     if (!setup.platform.empty()) {
         options.platform_path = _root / "platform.json";
         std::ofstream(options.platform_path) << setup.platform;

@@ -43,13 +43,16 @@ Session::Session(const Session_Settings& settings, const std::string& name_space
             throw Usage_Error(std::string(name) + " goes with --simulate");
     if (!settings.host_root.empty() && !settings.keep.empty())
         throw Usage_Error("--keep has the host's files in DIR/root; leave out --host-root");
+    if (!settings.scenario.empty())
+        _simulation = std::make_unique<Simulation>(settings);
+    host::Options options = host_options(settings, name_space);
+    if (_simulation && options.platform_path.empty())
+        options.platform_path = _simulation->platform();
     try {
-        _manager = std::make_unique<host::Manager>(host_options(settings, name_space));
+        _manager = std::make_unique<host::Manager>(std::move(options));
     } catch (const host::Setup_Error& error) {
         throw Usage_Error(error.what());
     }
-    if (!settings.scenario.empty())
-        _simulation = std::make_unique<Simulation>(settings);
     if (const host::Status status = _manager->load(module_path(settings)); !status.ok())
         throw Usage_Error("the module cannot be loaded: " + status.message);
 }

@@ -148,6 +148,10 @@ void Simulation::set_value(const std::string& port, const std::string& table,
         throw Usage_Error(error);
 }
 
+std::string Simulation::platform() const {
+    return function<decltype(vlnsim_platform)>("vlnsim_platform")();
+}
+
 void Simulation::reboot() {
     function<decltype(vlnsim_reboot)>("vlnsim_reboot")();
 }

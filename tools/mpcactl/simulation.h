@@ -25,6 +25,8 @@ public:
     // The module that is built for simulation.
     static std::string module_path();
 
+    // The file with what is the platform's own; "" for none.
+    std::string platform() const;
     // Changes a value of the hardware; a value that is neither null nor a JSON object is a text,
     // which numbers may be as well. Throws Usage_Error.
     void set_value(const std::string& port, const std::string& table, const std::string& name,

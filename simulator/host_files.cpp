@@ -1,4 +1,4 @@
-#include "simulator/host_logs.h"
+#include "simulator/host_files.h"
 
 #include "simulator/vlnsim.h"
 
@@ -22,11 +22,21 @@ bool append_lines(const char* file, const std::vector<std::string>& lines) {
     return log.flush().good();
 }
 
-void log_start(const Host& host, bool first) {
+namespace {
+
+bool host_has(const std::string& file) {
     std::error_code error;
-    if (!host.system_log.empty() &&
-        !(first && fs::exists(vlnsim_host_root() + std::string(system_log), error)))
+    return fs::exists(vlnsim_host_root() + file, error);
+}
+
+} // namespace
+
+void write_files(const Host& host, bool first) {
+    if (!host.system_log.empty() && !(first && host_has(system_log)))
         append_lines(system_log, host.system_log);
+    for (const Host::File& file : host.files)
+        if (!host_has(file.path))
+            append_lines(file.path.c_str(), file.lines);
 }
 
 } // namespace vlnsim

@@ -1,4 +1,5 @@
-// Logs of the simulated host: files below its root that grow by a line at a time.
+// Files of the simulated host below its root: those that its scenario tells, and logs that grow by
+// a line at a time.
 #ifndef VLNSIM_HOST_LOGS_H
 #define VLNSIM_HOST_LOGS_H
 
@@ -13,8 +14,9 @@ inline constexpr const char* nima_log = "/tmp/nima2d.log";
 // root: the machine's own logs are no simulated host's.
 bool append_lines(const char* file, const std::vector<std::string>& lines);
 
-// What the drivers say at a start of the host. With `first` only if there is no log yet.
-void log_start(const Host& host, bool first);
+// What the drivers say at a start of the host, with `first` only if there is no log yet; and those
+// of the host's files that are missing.
+void write_files(const Host& host, bool first);
 
 } // namespace vlnsim
 

@@ -178,7 +178,7 @@ private:
     static void* DataFetch_Handler(void* agent);
     bool isCacheTimedOut();
     bool claimRefresh(Pending_Requests requests);
-    void keepSANMaps();
+    void openGates();
     bool isSANPassWanted() const;
     void runAdapterPass();
     void rebuildAdapterData();

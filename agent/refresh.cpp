@@ -92,7 +92,7 @@ int ProviderAgent::BuildCimpleInfo(Pending_Requests requests) {
     if (const int error = m_DataFetchThread.start(DataFetch_Handler, this)) {
         m_bRefreshAtWork = false;
         VLN_LOG(VLN_ERR, "Error : DataFetch_Handler thread could not be started (%d)", error);
-        keepSANMaps();
+        openGates();
     }
     VLN_LOG(VLN_DBG, "PERF: ---Created DataFetch_Handler thread -- BuildCimpleInfo END---");
     return 0;
@@ -109,14 +109,18 @@ void ProviderAgent::requestSANRefresh() {
         m_bIsSANMapsReady = true;
 }
 
-// Where no refresh will come, the stores of the last one are what there is.
-void ProviderAgent::keepSANMaps() {
+// Where no refresh will come, the stores as they stand are what there is, empty ones included:
+// nobody waits for more.
+void ProviderAgent::openGates() {
     m_bNoMoreRefreshes = true;
-    if (m_LoadedTime == Datetime())
-        return;
-    Auto_Mutex gate(m_SANMapsReadyMutex);
-    m_bIsSANMapsReady = true;
-    m_SANMapsReadyCond.broadcast();
+    const auto open = [](Mutex& mutex, Cond& cond, auto& ready) {
+        Auto_Mutex gate(mutex);
+        ready = true;
+        cond.broadcast();
+    };
+    open(m_AdapterDataReadyMutex, m_AdapterDataReadyCond, m_bIsAdapterDataReady);
+    open(m_AdapterMapsReadyMutex, m_AdapterMapsReadyCond, m_bIsAdapterMapsReady);
+    open(m_SANMapsReadyMutex, m_SANMapsReadyCond, m_bIsSANMapsReady);
 }
 
 // The refresh's own thread, in a request that an up-call leads to, would wait for itself.

@@ -125,7 +125,7 @@ bool all_members(const Meta_Feature*) {
 
 template <class Carrier, class Wanted>
 void fill(const Source& source, const Instance* instance, Carrier carrier, Wanted wanted);
-void fill_keys(const Source& source, const Instance* instance, CMPIObjectPath* path);
+bool fill_keys(const Source& source, const Instance* instance, CMPIObjectPath* path);
 
 // One value of a property's type, or one element of an array of them.
 inline bool scalar_value(const Source& source, const void* from, uint32 type, CMPIValue& value) {
@@ -207,7 +207,8 @@ bool instance_value(const Source& source, const Instance* instance, bool embedde
         CIMPLE_WARN("CMNewObjectPath() failed");
         return false;
     }
-    fill_keys(own, instance, path.get());
+    if (!fill_keys(own, instance, path.get()))
+        return false;
     if (!embedded) {
         value.ref = path.keep();
         return true;
@@ -310,9 +311,9 @@ bool pass_reference(const Source& source, const Instance* instance, const Meta_R
     return hand_over(carrier, feature, converted, value, type);
 }
 
-// Hands one member to the carrier unless it is null.
+// Hands one member to the carrier unless it is null; false if it is not taken.
 template <class Carrier>
-inline void pass_member(const Source& source, const Instance* instance, const Meta_Feature* feature,
+inline bool pass_member(const Source& source, const Instance* instance, const Meta_Feature* feature,
                         Carrier& carrier) {
     bool passed;
     if (feature->flags & FLAG_PROPERTY) {
@@ -320,16 +321,17 @@ inline void pass_member(const Source& source, const Instance* instance, const Me
         const auto* from = static_cast<const uint8*>(member(instance, property->offset));
         // Most members of most instances are null: their flags are read here, without a call.
         if (from[property->subscript ? sizeof(Array_Base) : TYPES[property->type].size])
-            return;
+            return true;
         passed = pass_property(source, from, property, carrier);
     } else if ((feature->flags & FLAG_REFERENCE) && !is_null(instance, feature)) {
         passed =
             pass_reference(source, instance, static_cast<const Meta_Reference*>(feature), carrier);
     } else {
-        return;
+        return true;
     }
     if (!passed)
         CIMPLE_WARN("conversion error: %s.%s", instance->__meta_class->name, feature->name);
+    return passed;
 }
 
 // Hands the members that are wanted and not null to the carrier.
@@ -352,8 +354,9 @@ int fill_args(const Source& source, const Instance* method, uint32 flag, const T
     return CMPI_RC_OK;
 }
 
-// The keys only. They are few and mostly first, so the walk ends with the last of them.
-void fill_keys(const Source& source, const Instance* instance, CMPIObjectPath* path) {
+// The keys only. They are few and mostly first, so the walk ends with the last of them. False if
+// one is missing for want of the broker's help: the path would name nothing.
+bool fill_keys(const Source& source, const Instance* instance, CMPIObjectPath* path) {
     const Meta_Class* meta = instance->__meta_class;
     To_Path carrier{path};
     uint32 left = meta->num_keys;
@@ -362,8 +365,10 @@ void fill_keys(const Source& source, const Instance* instance, CMPIObjectPath* p
         if (!(feature->flags & FLAG_KEY))
             continue;
         left--;
-        pass_member(source, instance, feature, carrier);
+        if (!pass_member(source, instance, feature, carrier))
+            return false;
     }
+    return true;
 }
 
 // One broker needs the key names beside the list, or it would filter the keys out.
@@ -423,7 +428,10 @@ int make_cmpi_object_path(const CMPIBroker* broker, const Instance* instance,
         CIMPLE_WARN("CMNewObjectPath() failed");
         return CMPI_RC_ERR_FAILED;
     }
-    fill_keys({broker, name_space, ends}, instance, path);
+    if (!fill_keys({broker, name_space, ends}, instance, path)) {
+        cmpi::release(path);
+        return CMPI_RC_ERR_FAILED;
+    }
     out = path;
     return CMPI_RC_OK;
 }

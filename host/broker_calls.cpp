@@ -22,6 +22,7 @@ struct Up_Call {
     Core* core = nullptr;
     ObjectPath path;
     Status status;
+    bool is_silent = false; // fails without a status
 
     Up_Call(const CMPIBroker* broker, const CMPIContext* context, const CMPIObjectPath* op,
             const char* name) {
@@ -36,6 +37,11 @@ struct Up_Call {
         path = body->path;
         ++core->up_calls;
         core->trace("up-call " + std::string(name) + " " + path_to_text(path, ""));
+        CMPIrc code = CMPI_RC_OK;
+        if (core->refuses(true, name, code)) {
+            is_silent = code == CMPI_RC_OK;
+            status = {is_silent ? CMPI_RC_ERR_FAILED : code, ""};
+        }
     }
 
     bool ok() const { return core && status.ok(); }
@@ -44,7 +50,7 @@ struct Up_Call {
     }
     void put(CMPIStatus* out) const {
         if (out)
-            *out = answer();
+            *out = is_silent ? CMPIStatus{CMPI_RC_OK, nullptr} : answer();
     }
 };
 

@@ -14,7 +14,10 @@ namespace {
 
 Core* use(const CMPIBroker* broker, const char* function, CMPIStatus* status) {
     Core* core = core_of_broker(broker, function);
-    put(status, core ? CMPI_RC_OK : CMPI_RC_ERR_INVALID_HANDLE);
+    CMPIrc code = core ? CMPI_RC_OK : CMPI_RC_ERR_INVALID_HANDLE;
+    if (core && core->refuses(false, function, code))
+        core = nullptr;
+    put(status, code);
     return core;
 }
 

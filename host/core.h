@@ -56,6 +56,10 @@ public:
         if (options.trace)
             options.trace(line);
     }
+    // See Options::refuse.
+    bool refuses(bool is_up_call, const char* function, CMPIrc& code) const {
+        return options.refuse && options.refuse(is_up_call, function, code);
+    }
     bool is_provider_name_space(std::string_view name_space) const;
     // Whether the platform answers for a class that no provider of the module serves.
     Status check_platform(const Class& known, const std::string& name_space) const;

@@ -45,6 +45,10 @@ struct Options {
     std::size_t answer_limit = 10'000'000;
     // Microseconds since the epoch, for new datetimes; empty: the system's clock.
     std::function<std::uint64_t()> clock;
+    // Asked at each call from the provider to its broker or to an object, and at each up-call, on
+    // the thread that makes it. True: the call does nothing and answers null, with the status in
+    // code, CMPI_RC_OK included; a call of an object fails with its own.
+    std::function<bool(bool is_up_call, const char* function, CMPIrc& code)> refuse;
     // Gets a line for each call into the provider and each up-call, on the thread that makes it.
     std::function<void(const std::string&)> trace;
 };

@@ -51,7 +51,8 @@ Object* examine_use(const void* pointer, Kind kind, const char* use) {
                         : std::string(" that is a ") + to_string(object->kind)));
         return nullptr;
     }
-    return object;
+    CMPIrc code = CMPI_RC_OK; // the caller's own is answered
+    return core_of(object).refuses(false, use, code) ? nullptr : object;
 }
 
 CMPIStatus release_object(void* pointer, Kind kind) noexcept {

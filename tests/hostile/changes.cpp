@@ -5,6 +5,7 @@
 #include <algorithm>
 #include <fstream>
 #include <sstream>
+#include <utility>
 
 namespace hostile {
 
@@ -34,7 +35,7 @@ std::string filled_in(road::Road& road, const std::string& text) {
 } // namespace
 
 std::vector<Change> read_changes() {
-    std::vector<Change> changes;
+    std::vector<Change> changes, before;
     std::ifstream file(VLN_CHANGES);
     for (std::string line; std::getline(file, line);) {
         std::istringstream fields(line);
@@ -43,12 +44,19 @@ std::vector<Change> read_changes() {
         std::getline(fields, change.what, '\t');
         for (std::string value; std::getline(fields, value, '\t');)
             change.values.push_back(value);
-        changes.push_back(std::move(change));
+        const bool is_first_step = change.what.starts_with('&');
+        if (is_first_step)
+            change.what.erase(0, 1);
+        else
+            change.before = std::exchange(before, {});
+        (is_first_step ? before : changes).push_back(std::move(change));
     }
     return changes;
 }
 
 Prepared_Change::Prepared_Change(road::Road& road, const Change& change) : _road(road) {
+    for (const Change& step : change.before)
+        _before.emplace_back(road, step);
     constexpr std::size_t SMALL = 1000; // bytes
     char error[256] = "";
     EXPECT_EQ(vlnsim_write_firmware((road.root() / "new.img").c_str(), "VMC-2210", "10.4.255.3",
@@ -78,8 +86,13 @@ Prepared_Change::Prepared_Change(road::Road& road, const Change& change) : _road
     _values = mpcactl::read_inputs(classes, *method, values, "root/vorlan");
 }
 
+void Prepared_Change::make_ready() const {
+    for (const Prepared_Change& change : _before)
+        EXPECT_EQ(change.make(), "CMPI_RC_OK 0");
+}
+
 std::string Prepared_Change::make() const {
-    if (!is_method())
+    if (_method.empty())
         return make_of_instance();
     const auto reply = _road.manager().invoke(_instance.path, _method, _values);
     return host::rc_name(reply.status.rc) +

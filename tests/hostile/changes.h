@@ -16,6 +16,8 @@ struct Change {
     // As mpcactl takes them, where <CLASS> stands for the path of the first instance of a class,
     // and <> for the folder of the host's root, in which the image new.img lies.
     std::vector<std::string> values;
+    // What each try of it begins with: the rows before it whose `what` stands behind "&".
+    std::vector<Change> before = {};
 };
 
 // All lines of changes.tsv: scenario, what and values between tabs.
@@ -27,9 +29,9 @@ class Prepared_Change {
 public:
     Prepared_Change(road::Road& road, const Change& change);
 
+    void make_ready() const; // makes what stands before it
     // As "OK 0" or "CMPI_RC_ERR_FAILED": the status, and what a method returned.
     std::string make() const;
-    bool is_method() const { return !_method.empty(); }
 
 private:
     std::string make_of_instance() const; // all but a method
@@ -39,6 +41,7 @@ private:
     std::string _method;
     host::Instance _instance;
     host::Named_Values _values;
+    std::vector<Prepared_Change> _before;
 };
 
 } // namespace hostile

@@ -75,6 +75,7 @@ Road::Road(const Setup& setup) : _root(fresh_folder()) {
     host::Options options;
     options.elements_marked_null = setup.elements_marked_null;
     options.trace = setup.trace;
+    options.refuse = setup.refuse;
     options.registration_path = VLN_REGISTRATION;
     options.class_defaults = setup.class_defaults;
     options.platform_path = vlnsim_platform();

@@ -27,6 +27,7 @@ struct Setup {
     // As host::Options has it; off, so that a test sees what the provider itself gave.
     bool class_defaults = false;
     std::function<void(const std::string&)> trace = {}; // see host::Options
+    decltype(host::Options::refuse) refuse = {};        // see host::Options
 };
 
 class Road {

@@ -49,7 +49,9 @@ const Up_Call CHASSIS_CALL = {
 Ref<Instance> first_match(Instance_Enumerator& enumerator, const Up_Call& call) {
     for (; enumerator.more(); enumerator.next()) {
         const Ref<Instance> candidate = enumerator.get();
-        if (!candidate || !is_subclass(call.wanted, candidate->__meta_class))
+        // Without a key, which the object manager may fail to hand out, it names nothing.
+        if (!candidate || !is_subclass(call.wanted, candidate->__meta_class) ||
+            !keys_all_set(candidate.get()))
             continue;
         VLN_LOG(VLN_DBG, "%s", call.found);
         Ref<Instance> copy(clone(candidate.get()));

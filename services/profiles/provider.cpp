@@ -46,7 +46,7 @@ Ref<PG_RegisteredProfile> base_server_profile() {
         return {};
     for (; enumerator.more(); enumerator.next()) {
         Ref<PG_RegisteredProfile> profile(enumerator.get().release());
-        if (!is_base_server(profile.get()))
+        if (!is_base_server(profile.get()) || !keys_all_set(profile.get()))
             continue;
         profile->__name_space = INTEROP_NAME_SPACE;
         return profile;

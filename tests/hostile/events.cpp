@@ -2,10 +2,10 @@
 // over our own functions, so that each block that is read or written is an event.
 #include "tests/hostile/events.h"
 
+#include <algorithm>
 #include <cerrno>
 #include <cstdarg>
 #include <cstdio>
-#include <map>
 #include <mutex>
 #include <new>
 
@@ -20,9 +20,20 @@ namespace {
 
 Events events;
 
-// Never destroyed: the log is closed late.
-std::mutex& files_mutex = *new std::mutex;
-std::map<std::FILE*, std::FILE*>& files = *new std::map<std::FILE*, std::FILE*>; // by stream
+// The open streams and the files below them, without an allocation: it would be an event.
+struct Open_File {
+    std::FILE* stream;
+    std::FILE* file;
+};
+constinit std::mutex files_mutex;
+Open_File files[64];
+
+// The entry of a stream, or a free one for null; null if there is none.
+Open_File* find_open(const std::FILE* stream) {
+    const auto found = std::find_if(std::begin(files), std::end(files),
+                                    [&](const Open_File& one) { return one.stream == stream; });
+    return found == std::end(files) ? nullptr : found;
+}
 
 int descriptor(void* file) {
     return fileno(static_cast<std::FILE*>(file));
@@ -52,7 +63,9 @@ int seek(void* file, off64_t* offset, int whence) {
 int close_file(void* file) {
     {
         const std::lock_guard lock(files_mutex);
-        std::erase_if(files, [&](const auto& row) { return row.second == file; });
+        for (Open_File& one : files)
+            if (one.file == file)
+                one = {};
     }
     return std::fclose(static_cast<std::FILE*>(file));
 }
@@ -122,15 +135,16 @@ std::FILE* __wrap_fopen64(const char* path, const char* mode) {
         return nullptr;
     std::FILE* stream = fopencookie(file, mode, {read_block, write_block, seek, close_file});
     const std::lock_guard lock(files_mutex);
-    files[stream] = file;
+    if (Open_File* entry = find_open(nullptr))
+        *entry = {stream, file};
     return stream;
 }
 
 int __real_fileno(std::FILE* stream);
 int __wrap_fileno(std::FILE* stream) {
     const std::lock_guard lock(files_mutex);
-    const auto row = files.find(stream);
-    return __real_fileno(row == files.end() ? stream : row->second);
+    const Open_File* entry = find_open(stream);
+    return __real_fileno(entry ? entry->file : stream);
 }
 
 int __real_open64(const char* path, int flags, ...);

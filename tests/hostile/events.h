@@ -6,6 +6,8 @@
 #include <atomic>
 #include <cstddef>
 
+#include <execinfo.h>
+
 namespace sweep {
 
 enum Kind {
@@ -24,7 +26,12 @@ enum Kind {
 // Counts over all threads. The harness counts BROKER and UP_CALL here as well.
 struct Events {
     // One more of the kind; true if it is the one that is to fail.
-    bool fails(Kind kind) { return ++made[kind] == refused[kind]; }
+    bool fails(Kind kind) {
+        if (++made[kind] != refused[kind])
+            return false;
+        depth = backtrace(stack, MOST_FRAMES);
+        return true;
+    }
     // From now on, counting anew, the event of that number fails; 0: none.
     void refuse(Kind kind, unsigned long number) {
         refused[kind] = 0;
@@ -34,6 +41,10 @@ struct Events {
 
     std::atomic<unsigned long> made[KINDS]{};
     std::atomic<unsigned long> refused[KINDS]{};
+    // Where the last one failed.
+    static constexpr int MOST_FRAMES = 32;
+    void* stack[MOST_FRAMES]{};
+    int depth = 0;
 };
 
 } // namespace sweep

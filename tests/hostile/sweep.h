@@ -17,7 +17,7 @@
 //     next child goes on behind it. A watchdog prints the stacks of all threads of a hang.
 //  6. The suite takes a sample, the same each time: environment variable VLN_SWEEP_SEED gives
 //     another, VLN_SWEEP=all takes all points, VLN_SWEEP=100 so many of each kind and operation,
-//     VLN_SWEEP_OPERATIONS those of some operations.
+//     VLN_SWEEP_OPERATIONS those of some operations, VLN_SWEEP_POINT="allocation 7" one of each.
 #ifndef TESTS_HOSTILE_SWEEP_H
 #define TESTS_HOSTILE_SWEEP_H
 
@@ -37,9 +37,10 @@ Events& events_of_module();
 
 struct Operation {
     std::string name;
-    std::string scenario;                    // a file of the scenarios, or a JSON text
-    bool log = false;                        // with the provider's log at its most talkative
-    std::string class_name = {};             // of a look
+    std::string scenario;        // a file of the scenarios, or a JSON text
+    bool log = false;            // with the provider's log at its most talkative
+    bool is_judged = false;      // what a failed call costs it; the scenario is WITH_TARGETS
+    std::string class_name = {}; // of a look
     std::optional<hostile::Change> row = {}; // of a change
     bool is_refresh() const { return class_name.empty() && !row; }
 };
@@ -56,17 +57,23 @@ struct Point {
     unsigned call = 0;
     vlnsim_fault_kind fault = VLNSIM_STATUS;
     std::uint64_t value = 0;
+    std::string line = {}; // the call as a healthy run makes it
 
     std::string text() const;
 };
 
 using Counts = std::array<unsigned long, KINDS>;
 
+extern const std::string WITH_TARGETS;
+// What the failure has cost that it must not; "" for nothing. Both are looks at all.
+std::string judged(const Point& point, const std::string& healthy, const std::string& shown);
+
 // What the points of an operation are taken by.
 inline constexpr std::size_t ALL = ~std::size_t(0);
 struct Choice {
     std::size_t most = 0; // points of one kind and operation; 0: the suite's sample
     unsigned seed = 1;
+    std::string text = {}; // of the only point to be taken; "": any
 };
 
 // A host in this process, and the operations on it.

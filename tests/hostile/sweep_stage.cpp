@@ -77,6 +77,16 @@ std::size_t settled(std::size_t expected, Count count) {
     return count();
 }
 
+std::string open_files() {
+    std::string text;
+    for (const auto& file : fs::directory_iterator("/proc/self/fd")) {
+        std::error_code gone; // as the list itself
+        text += file.path().filename().string() + " " +
+                fs::read_symlink(file.path(), gone).string() + "\n";
+    }
+    return text;
+}
+
 // After these the product uses the HBA API although it cannot be used, and that is meant: nobody
 // looks whether it could be loaded, and an absent open answers the handle 1. Its other calls fail,
 // as do those into a library that is not initialised for want of the semaphore.
@@ -88,8 +98,10 @@ bool goes_on_blindly(const Point& point) {
 std::vector<Point> points_of_calls(const std::vector<std::string>& lines) {
     std::vector<Point> points;
     std::map<std::string, unsigned> calls;
+    std::set<std::uint64_t> identifiers;
     for (const std::string& line : lines) {
-        Point point{.kind = CALL, .number = 0, .function = line.substr(0, line.find('('))};
+        Point point{
+            .kind = CALL, .number = 0, .function = line.substr(0, line.find('(')), .line = line};
         point.call = ++calls[point.function];
         if (point.call == 1) {
             point.fault = VLNSIM_ABSENT;
@@ -98,6 +110,13 @@ std::vector<Point> points_of_calls(const std::vector<std::string>& lines) {
         if (point.function == "AX_GetAttributeValue") {
             point.fault = VLNSIM_MISSING;
             points.push_back(point);
+            // And everywhere: the identifier is the first argument.
+            const std::uint64_t identifier = std::stoul(line.substr(line.find('(') + 1));
+            if (identifiers.insert(identifier).second) {
+                points.push_back(point);
+                points.back().call = VLNSIM_EVERY;
+                points.back().value = identifier;
+            }
         }
         for (const std::uint64_t status : statuses_of(point.function)) {
             point.fault = status == TOO_SMALL ? VLNSIM_TOO_SMALL : VLNSIM_STATUS;
@@ -121,6 +140,10 @@ std::vector<Point> points_of_events(Kind kind, unsigned long count) {
 // Spread evenly, from a place that name and seed give.
 std::vector<Point> chosen(std::vector<Point> points, const Choice& choice, const std::string& name,
                           Kind kind) {
+    if (!choice.text.empty()) {
+        std::erase_if(points, [&](const Point& one) { return one.text() != choice.text; });
+        return points;
+    }
     const std::size_t most = choice.most ? choice.most : SAMPLES[kind];
     if (choice.most == ALL || points.size() <= most)
         return points;
@@ -161,7 +184,7 @@ std::string Point::text() const {
                (code == CMPI_RC_OK ? " without a status" : "");
     constexpr const char* FAULTS[] = {"status", "", "too small", "missing", "absent"};
     return function + " call " + std::to_string(call) + " " + FAULTS[fault] +
-           (fault == VLNSIM_STATUS ? " " + std::to_string(value) : "");
+           (fault == VLNSIM_STATUS || value ? " " + std::to_string(value) : "");
 }
 
 Stage::Stage(const std::string& scenario, bool log)
@@ -213,7 +236,7 @@ void Stage::end_life(const Point* point) {
         ADD_FAILURE() << "a breach of the library's contract: " << breach;
     if (_threads) {
         EXPECT_EQ(settled(_threads, [] { return entries("/proc/self/task"); }), _threads);
-        EXPECT_EQ(entries("/proc/self/fd"), _descriptors);
+        EXPECT_EQ(entries("/proc/self/fd"), _descriptors) << open_files();
     }
 }
 
@@ -349,8 +372,11 @@ void Stage::run(const Operation& operation, const Point& point) {
         _change->make_ready();
     }
     arm(point);
-    perform(operation);
+    const std::string answer = perform(operation);
     disarm();
+    if (operation.is_judged) {
+        EXPECT_EQ(judged(point, _whole, answer), "") << point.line;
+    }
     // Of a change the same agent, of a refresh another one, which ends at once.
     for (const char* name : {"VLNMPCA_EthernetPort", "VLNMPCA_StorageVolume", "VLNMPCA_Card"})
         _road.manager().enumerate(name);

@@ -21,6 +21,7 @@ TEST(Sweep, EachEventOfEachOperationFails) {
     sweep::Choice choice;
     if (const std::string most = variable("VLN_SWEEP"); !most.empty())
         choice.most = most == "all" ? sweep::ALL : std::stoul(most);
+    choice.text = variable("VLN_SWEEP_POINT");
     if (const std::string seed = variable("VLN_SWEEP_SEED"); !seed.empty())
         choice.seed = static_cast<unsigned>(std::stoul(seed));
     const auto operations = sweep::all_operations(words);

@@ -8,6 +8,7 @@
 #include <cstring>
 #include <fstream>
 #include <thread>
+#include <utility>
 
 #include <execinfo.h>
 #include <fcntl.h>
@@ -90,15 +91,28 @@ std::vector<Group> groups_of(const std::vector<Operation>& operations) {
 
 int stacks = -1; // the file
 
+Events* events = nullptr; // of the module, once it is loaded
+
+void write_frames(const char* head, void* const* frames, int count) {
+    if (write(stacks, head, std::strlen(head)) > 0)
+        backtrace_symbols_fd(frames, count, stacks);
+}
+
+// Where the event failed, unless it was told before.
+void write_event() {
+    if (events && events->depth > 0)
+        write_frames("the event\n", events->stack, std::exchange(events->depth, 0));
+}
+
 // backtrace needs nothing that a signal handler lacks once it was called.
 void write_stack(int signal) {
     void* frames[64];
     const int count = backtrace(frames, 64);
     char head[64];
-    const int length = std::snprintf(head, sizeof head, "thread %ld, signal %d\n",
-                                     static_cast<long>(syscall(SYS_gettid)), signal);
-    if (write(stacks, head, static_cast<std::size_t>(length)) == length)
-        backtrace_symbols_fd(frames, count, stacks);
+    std::snprintf(head, sizeof head, "thread %ld, signal %d\n",
+                  static_cast<long>(syscall(SYS_gettid)), signal);
+    write_event();
+    write_frames(head, frames, count);
 }
 
 void end_by(int signal) {
@@ -130,6 +144,7 @@ public:
         try {
             const Operation& first = _operations[operation];
             Stage stage(first.scenario, first.log);
+            events = &events_of_module();
             check();
             for (; operation < end; ++operation, point = 0)
                 run_one(stage, operation, point);
@@ -155,6 +170,7 @@ private:
         for (std::size_t i = from; i < points.size(); ++i) {
             _slot.begin(number, i, points[i].text());
             ++tally.tried[points[i].kind];
+            events->depth = 0;
             stage.run(operation, points[i]);
             check();
         }
@@ -162,6 +178,7 @@ private:
     void check() {
         if (!testing::Test::HasFailure())
             return;
+        write_event();
         std::fflush(nullptr);
         std::_Exit(1);
     }
@@ -185,14 +202,22 @@ std::string output_of(const std::string& command) {
     return text;
 }
 
-// "module(symbol+0x12) [0x34]", with the place in the source where addr2line knows it.
+std::string before(const std::string& offset) {
+    char text[32];
+    std::snprintf(text, sizeof text, "0x%lx", std::stoul(offset, nullptr, 16) - 1);
+    return text;
+}
+
+// "module(+0x12) [0x34]", with the place in the source where addr2line knows it: that of the byte
+// before, which belongs to the call.
 std::string explained(const std::string& line) {
     const std::size_t open = line.find('('), close = line.find(')');
     if (open == std::string::npos || close == std::string::npos || line[open + 1] != '+')
         return line;
-    const std::string place = output_of("addr2line -Cfpse " + line.substr(0, open) + " " +
-                                        line.substr(open + 1, close - open - 1) + " 2>/dev/null");
-    return place.empty() ? line : place.substr(0, place.find('\n'));
+    const std::string place =
+        output_of("addr2line -Cfpse " + line.substr(0, open) + " " +
+                  before(line.substr(open + 1, close - open - 1)) + " 2>/dev/null");
+    return place.empty() || place[0] == '?' ? line : place.substr(0, place.find('\n'));
 }
 
 void print_stacks() {

@@ -100,13 +100,15 @@ TEST(Refused, AThreadThatCannotBeStarted) {
     sweep::Events& events = sweep::events_of_module();
     events.refuse(sweep::THREAD, 1);
     EXPECT_EQ(road.enumerate("VLNMPCA_Product").size(), 0u);
-    EXPECT_EQ(road.count_in_log("DataFetch_Handler thread could not be started"), 1u);
+    EXPECT_EQ(road.count_in_log("[VLN_ERR] Error : DataFetch_Handler thread could not be started"),
+              1u);
     EXPECT_TRUE(road.manager().cleanup(true).ok());
 
     EXPECT_EQ(road.enumerate("VLNMPCA_Product").size(), 1u);
     events.refuse(sweep::THREAD, 1);
     EXPECT_EQ(road.enumerate("VLNMPCA_EthernetPort").size(), 2u);
-    EXPECT_EQ(road.count_in_log("PERF: Thread DynamicDataFetch_Handler Creation failed"), 1u);
+    EXPECT_EQ(road.count_in_log("[VLN_ERR] PERF: Thread DynamicDataFetch_Handler Creation failed"),
+              1u);
     EXPECT_EQ(vlnsim_paused(), 0u);
     vlnsim_advance(11ull * 1000000);
     EXPECT_EQ(road.enumerate("VLNMPCA_EthernetPort").size(), 2u);

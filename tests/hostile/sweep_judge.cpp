@@ -11,13 +11,17 @@
 
 namespace sweep {
 
-// The two-port card with two units behind each FCoE and each iSCSI port.
+// The two-port card with two units behind each FCoE and each iSCSI port, and behind a virtual port.
 const std::string WITH_TARGETS = R"({"include": ")" VLN_SCENARIOS R"(/parts/cna.json",
     "cards": [{"use": "cna", "features": {"Feature10GBaseT": 1, "Counters10GBaseT": 1},
         "ports": 2, "functions": [{"use": "nic"},
         {"use": "iscsi", "iscsiTargets": {"name": "iqn.2010-04.com.example:t-{port}", "luns": 2,
             "sessions": {"targetPortal": "198.51.100.20{port}"}}},
-        {"use": "fcoe", "targets": {"luns": 2, "wwpn": "50:25:64:C{port}:00:00:00:{target:02X}"}}]}]})";
+        {"use": "fcoe", "targets": {"luns": 2, "wwpn": "50:25:64:C{port}:00:00:00:{target:02X}"},
+            "virtualPorts": [{"wwpn": "10:00:02:56:4C:00:{port:02X}:F0", "machine": {"name": "guest"},
+                              "targets": {"luns": 2, "wwpn": "50:25:64:C{port}:00:00:00:00"}}],
+            "unitPriorities": [{"initiator": "10:00:02:56:4C:00:{port:02X}:F0",
+                                "target": "50:25:64:C{port}:00:00:00:00"}]}]}]})";
 
 namespace {
 
@@ -36,6 +40,7 @@ const Texts ADAPTER_TEXTS = {"100002564C",
                              "com.example:t-",
                              "vlniscsi",
                              "vlnfcoe",
+                             "Driver Record",
                              "VLNMPCA_SCSIProtocolController",
                              "VLNMPCA_DriverParameter",
                              "VLNMPCA_FCWWNService",

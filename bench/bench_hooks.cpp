@@ -47,6 +47,8 @@ void vln_bench_direct_calls() {
 
 namespace {
 
+constexpr uint64 HOUR = 3600ull * 1000000; // more than the data may be old
+
 bool refresh_running(ProviderAgent& agent) {
     Auto_Mutex lock(agent.m_DataFetchMutex);
     return agent.m_bDataFetchRunning;
@@ -60,7 +62,6 @@ void wait_for_refresh(ProviderAgent& agent) {
 } // namespace
 
 bool vln_bench_refresh() {
-    constexpr uint64 HOUR = 3600ull * 1000000; // more than the data may be old
     ProviderAgent* agent = ProviderAgent::current();
     wait_for_refresh(*agent);
     agent->m_bRefreshSANData = false;
@@ -77,6 +78,31 @@ void vln_bench_san_refresh() {
     agent->m_bSANRefreshRequested = true;
     agent->BuildCimpleInfo();
     wait_for_refresh(*agent);
+}
+
+void vln_bench_settle() {
+    ProviderAgent::current()->m_DataFetchThread.join();
+}
+
+bool vln_bench_whole_refresh() {
+    ProviderAgent* agent = ProviderAgent::current();
+    const Datetime last = agent->m_LoadedTime;
+    vlnsim_advance(HOUR);
+    agent->BuildCimpleInfo();
+    vln_bench_settle();
+    return !(agent->m_LoadedTime == last);
+}
+
+// A second later, so that the time tells whether there was one.
+bool vln_bench_san_pass() {
+    constexpr uint64 SECOND = 1000000;
+    ProviderAgent* agent = ProviderAgent::current();
+    const Datetime last = agent->m_LoadedTime;
+    vlnsim_advance(SECOND);
+    agent->m_bSANRefreshRequested = true;
+    agent->BuildCimpleInfo();
+    vln_bench_settle();
+    return !(agent->m_LoadedTime == last);
 }
 
 unsigned vln_bench_instances(bool san) {

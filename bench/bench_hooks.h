@@ -21,6 +21,14 @@ VLN_BENCH_HOOK bool vln_bench_refresh();
 // One SAN pass, without a scan of the adapters.
 VLN_BENCH_HOOK void vln_bench_san_refresh();
 
+// For one client alone, and counted to the instruction: nobody looks again and again whether it is
+// over. What the last call has started has ended when it returns.
+VLN_BENCH_HOOK void vln_bench_settle();
+// A refresh of all, an hour of the virtual clock after the last; a SAN pass alone. False when none
+// was made.
+VLN_BENCH_HOOK bool vln_bench_whole_refresh();
+VLN_BENCH_HOOK bool vln_bench_san_pass();
+
 // Instances in all stores, or in all but those that a SAN pass fills.
 VLN_BENCH_HOOK unsigned vln_bench_instances(bool san);
 

@@ -49,10 +49,31 @@ std::string read_scenario(const char* name) {
     return content.str();
 }
 
+bool has_scenario(const char* name) {
+    return std::filesystem::exists(std::string(VLN_SCENARIOS "/") + name);
+}
+
+std::string changed_scenario(const char* name, const std::string& as_it_is,
+                             const std::string& wanted) {
+    std::string text = read_scenario(name);
+    const std::size_t at = text.find(as_it_is);
+    if (at == std::string::npos)
+        fail("the scenario has another form than expected");
+    return text.replace(at, as_it_is.size(), wanted);
+}
+
 std::string one_target(unsigned volumes) {
     return R"({"include": "parts/cna.json", "cards": [{"use": "cna", "functions": [{"use": "nic"},
         {"use": "fcoe", "targets": {"luns": )" +
            std::to_string(volumes) + R"(, "wwpn": "50:25:64:C0:00:00:00:01"}}]}]})";
+}
+
+std::string san_of(unsigned units) {
+    constexpr unsigned TARGETS = 16; // in the scenario, of 256 units each
+    if (units % TARGETS != 0)
+        fail("the scenario has targets of equal size");
+    return changed_scenario("san-4096-luns.json", "\"luns\": 256,",
+                            "\"luns\": " + std::to_string(units / TARGETS) + ",");
 }
 
 void simulate(const std::string& scenario_text) {
@@ -71,6 +92,15 @@ unsigned long resident_kilobytes() {
     unsigned long resident = 0;
     std::ifstream("/proc/self/statm") >> size >> resident;
     return resident * static_cast<unsigned long>(sysconf(_SC_PAGESIZE)) / 1024;
+}
+
+unsigned long resident_anonymous_kilobytes() {
+    const std::string field = "RssAnon:";
+    std::ifstream status("/proc/self/status");
+    for (std::string word; status >> word;)
+        if (unsigned long size = 0; word == field && status >> size)
+            return size;
+    fail("the system does not tell " + field);
 }
 
 void* find_hook(const char* name) {

@@ -19,30 +19,12 @@
 
 namespace {
 
-constexpr const char* SCENARIO = "san-4096-luns.json";
 constexpr const char* ISCSI_SCENARIO = "iscsi-empty.json";
 constexpr const char* VOLUME = "VLNMPCA_StorageVolume";
-constexpr unsigned TARGETS = 16; // in the scenario, of 256 units each
-
-// A scenario with another text at one place.
-std::string changed(const char* scenario, const std::string& as_it_is, const std::string& wanted) {
-    std::string text = read_scenario(scenario);
-    const std::size_t at = text.find(as_it_is);
-    if (at == std::string::npos)
-        fail("the scenario has another form than expected");
-    return text.replace(at, as_it_is.size(), wanted);
-}
-
-std::string san_of(unsigned units) {
-    if (units % TARGETS != 0)
-        fail("the scenario has targets of equal size");
-    return changed(SCENARIO, "\"luns\": 256,",
-                   "\"luns\": " + std::to_string(units / TARGETS) + ",");
-}
 
 std::string iscsi_san_of(unsigned targets) {
-    return changed(ISCSI_SCENARIO, "{\"count\": 2,",
-                   "{\"count\": " + std::to_string(targets) + ",");
+    return changed_scenario(ISCSI_SCENARIO, "{\"count\": 2,",
+                            "{\"count\": " + std::to_string(targets) + ",");
 }
 
 } // namespace

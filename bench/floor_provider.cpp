@@ -3,9 +3,9 @@
 // They answer VLNMPCA_EthernetPort and VLNMPCA_StorageVolume from constant data, as a careful
 // programmer would by hand: one object path and one instance each, a broker call per property,
 // texts as plain characters, an instance found by its key at once, nothing else. They have the
-// shape of the instances that the library makes of the simulated hosts; only DeviceID differs from
-// one instance to the next. VLN_FLOOR_INSTANCES says how many there are. And an association class
-// that has nothing to say.
+// shape of the first instance that the library makes of the simulated hosts, which a test compares;
+// only DeviceID differs from one instance to the next. VLN_FLOOR_INSTANCES says how many there are.
+// And an association class that has nothing to say.
 #include "cmpi/cmpi.h"
 
 #include <strings.h>
@@ -21,7 +21,7 @@ namespace {
 struct Property_Row {
     const char* name;
     CMPIType type;    // CMPI_uint64 stands for all unsigned numbers of `number`
-    const char* text; // strings: the value; arrays of strings: up to three, separated by '|'
+    const char* text; // strings: the value; arrays of strings: the elements, separated by '|'
     CMPIUint64 number;
 };
 
@@ -36,11 +36,15 @@ constexpr Property_Row PORT[] = {
     {"EnabledState", CMPI_uint16, nullptr, 2},
     {"RequestedState", CMPI_uint16, nullptr, 12},
     {"SystemCreationClassName", CMPI_string, "CIM_ComputerSystem", 0},
-    {"SystemName", CMPI_string, "server.example", 0},
+    {"SystemName", CMPI_string, "simulated-host", 0},
     {"CreationClassName", CMPI_string, "VLNMPCA_EthernetPort", 0},
-    {"OtherIdentifyingInfo", CMPI_stringA, "VR10420117:00|VR10420117:0|VR10420117", 0},
+    {"OtherIdentifyingInfo", CMPI_stringA, "VR10420117:00|VR10420117:0|VR10420117|0|NotSupported",
+     0},
     {"IdentifyingDescriptions", CMPI_stringA,
-     "SerialNumber + Sub-AdapterID|SerialNumber:PhysicalPortNumber|SerialNumber", 0},
+     "SerialNumber + Sub-AdapterID|SerialNumber:PhysicalPortNumber|SerialNumber|"
+     "PhysicalPortNumber|VirtualPortNumber",
+     0},
+    {"LocationIndicator", CMPI_uint16, nullptr, 3},
     {"Speed", CMPI_uint64, nullptr, 10000000000ull},
     {"MaxSpeed", CMPI_uint64, nullptr, 10000000000ull},
     {"PortType", CMPI_uint16, nullptr, 0},
@@ -56,6 +60,7 @@ constexpr Property_Row PORT[] = {
     {"FunctionalQosMinBandwidth", CMPI_string, "1 Gbps", 0},
     {"PCIBusNumber", CMPI_uint32, nullptr, 16},
     {"FunctionalPortSpeed", CMPI_string, "10 Gbps", 0},
+    {"SRIOVState", CMPI_uint16, nullptr, 2},
 };
 
 constexpr Property_Row VOLUME[] = {
@@ -74,7 +79,7 @@ constexpr Property_Row VOLUME[] = {
     {"NameNamespace", CMPI_uint16, nullptr, 2},
     {"Capacity", CMPI_uint64, nullptr, 1073741824},
     {"CapacityUnit", CMPI_string, "Byte", 0},
-    {"DeviceType", CMPI_uint32, nullptr, 0},
+    {"DeviceType", CMPI_uint16, nullptr, 0},
 };
 
 // A class, with what makes its keys.
@@ -86,9 +91,9 @@ struct Floor_Class {
     std::unordered_map<std::string, unsigned> numbers = {}; // by DeviceID
 };
 
-Floor_Class ports = {"VLNMPCA_EthernetPort", "server.example",
+Floor_Class ports = {"VLNMPCA_EthernetPort", "simulated-host",
                      [](char (&text)[128], unsigned number) {
-                         std::snprintf(text, sizeof text, "10000090FA%06X", number);
+                         std::snprintf(text, sizeof text, "100002564C%06X", number);
                      },
                      PORT};
 // The simulator's names of the units of one target.
@@ -160,6 +165,8 @@ void set_property(CMPIInstance* instance, const Property_Row& row) {
     else
         value.uint64 = row.number; // little-endian: the narrower members read its low bytes
     instance->ft->setProperty(instance, row.name, &value, row.type);
+    if (row.type & CMPI_ARRAY)
+        value.array->ft->release(value.array); // the elements go with it
 }
 
 CMPIObjectPath* new_path(const Floor_Class& floor, const char* name_space, const char* device_id) {

@@ -1,9 +1,9 @@
 // Comparing instances: by their keys, by everything, and the hash that goes with the keys.
 #include "cimple/instance.h"
 
-#include "cimple/fold.h"
 #include "cimple/instance_detail.h"
 
+#include <algorithm>
 #include <cstring>
 #include <functional>
 #include <string_view>
@@ -81,6 +81,26 @@ constexpr uint64 mix(uint64 x) {
     return x ^ (x >> 31);
 }
 
+// The same for names that differ in case only, eight characters at a time: names are long, and each
+// key of each instance has one. It takes a few other characters for equal as well, as a hash may.
+uint64 key_name_hash(const char* name) {
+    constexpr uint64 LOWER = 0x2020202020202020u;
+    uint64 hash = 0;
+    for (std::size_t left = std::strlen(name); left != 0;) {
+        uint64 word = 0;
+        const std::size_t taken = std::min(left, sizeof word);
+        if (taken == sizeof word)
+            std::memcpy(&word, name, sizeof word);
+        else
+            std::memcpy(&word, name, taken);
+        hash = (hash ^ (word | LOWER)) * 0x9E3779B97F4A7C15u;
+        hash ^= hash >> 32;
+        name += taken;
+        left -= taken;
+    }
+    return hash;
+}
+
 uint64 hash_bytes(const void* bytes, std::size_t size) {
     return std::hash<std::string_view>{}({static_cast<const char*>(bytes), size});
 }
@@ -147,7 +167,7 @@ bool equal_values(const Instance* a, const Meta_Property* in_a, const Instance* 
 Key_Signature key_signature(const Instance* instance) {
     Key_Signature sum{};
     all_keys(instance, [&](const Meta_Feature* key, std::size_t) {
-        const uint64 name = name_hash(key->name);
+        const uint64 name = key_name_hash(key->name);
         uint64 kind;
         uint64 value = 0;
         if (key->flags & FLAG_PROPERTY) {

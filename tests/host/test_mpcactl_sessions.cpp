@@ -167,10 +167,10 @@ TEST(MpcactlSession, AKeptHostGoesOnWhereItWas) {
 // Some only once something has been done there.
 TEST(MpcactlSession, OneHostShowsEveryClass) {
     constexpr std::size_t CLASSES = 299;
-    write_text("everything",
+    write_text("all.run",
                contents(SOURCE_FOLDER "/simulator/scenarios/everything.run") + "census\n");
     const Outcome result =
-        run_bare({"--simulate", "everything", "run", "--stop", "--quiet", "everything"});
+        run_bare({"--simulate", "everything", "run", "--stop", "--quiet", "all.run"});
     ASSERT_EQ(result.status, 0) << result.err;
     std::istringstream lines(result.out);
     std::size_t classes = 0;

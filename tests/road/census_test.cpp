@@ -93,7 +93,7 @@ TEST(Census, SettingsAndCapabilitiesHaveNames) {
 // Lines at the highest level are for faults: an administrator who looks for one finds no others.
 TEST(Census, AHealthyHostLogsNothingAtLevelOne) {
     for (const auto& file : std::filesystem::directory_iterator(VLN_SCENARIOS)) {
-        if (!file.is_regular_file() || file.path().stem() == "flaky")
+        if (file.path().extension() != ".json" || file.path().stem() == "flaky")
             continue;
         Road road({.scenario = file.path().filename(), .log = true});
         road.census();

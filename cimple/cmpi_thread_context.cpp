@@ -100,10 +100,13 @@ Thread_Context* CMPI_Thread_Context::thread_create_hook(void*) {
     return child;
 }
 
-void CMPI_Thread_Context::thread_start_hook() {
-    _prepared = nullptr; // the broker frees it when the thread detaches
-    if (!cmpi::good(_broker->bft->attachThread(_broker, _context)))
+bool CMPI_Thread_Context::thread_start_hook() {
+    if (!cmpi::good(_broker->bft->attachThread(_broker, _context))) {
         CIMPLE_ERR("CBAttachThread() failed");
+        return false;
+    }
+    _prepared = nullptr; // the broker frees it when the thread detaches
+    return true;
 }
 
 void CMPI_Thread_Context::thread_exit_hook() {

@@ -26,7 +26,7 @@ public:
     const void* provider() const override { return _adapter; }
 
     Thread_Context* thread_create_hook(void* argument) override;
-    void thread_start_hook() override;
+    bool thread_start_hook() override;
     void thread_exit_hook() override;
 
     Instance_Enumerator_Rep* start_enum(const char* name_space, const Instance* model) override;

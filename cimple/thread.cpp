@@ -175,10 +175,13 @@ void* _thread_proc(void* start_record) {
     started_here = true;
 
     Thread_Context* context = start.context;
+    if (context && !context->thread_start_hook()) {
+        delete context;
+        context = nullptr;
+    }
     const Context_Holder holder(context);
     void* value;
     if (context) {
-        context->thread_start_hook();
         value = call_guarded(start.proc, start.argument);
         context->thread_exit_hook();
     } else {

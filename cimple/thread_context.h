@@ -23,7 +23,9 @@ public:
 
     // A context for a thread about to start, made on the parent; null if that fails.
     virtual Thread_Context* thread_create_hook(void* argument) = 0;
-    virtual void thread_start_hook() = 0; // first on the new thread
+    // First on the new thread. False: the object manager does not know the thread, and is not
+    // called on it.
+    virtual bool thread_start_hook() = 0;
     virtual void thread_exit_hook() = 0;  // last on the new thread
 
     // Null on any failure; the caller gives the result to destroy_enum.

@@ -26,7 +26,11 @@ constexpr const char* PLATFORM = R"({
   ]})";
 
 // Points of one kind and operation in the suite's sample.
+#if defined(__SANITIZE_ADDRESS__) || defined(__SANITIZE_THREAD__)
+constexpr std::array<std::size_t, KINDS> SAMPLES = {2, 2, 1, 1, 1, 1, 1, 2, 1}; // a life is long
+#else
 constexpr std::array<std::size_t, KINDS> SAMPLES = {8, 5, 2, 2, 2, 2, 2, 4, 2};
+#endif
 
 constexpr std::uint64_t TOO_SMALL = ~0ull; // beside the statuses
 

@@ -26,7 +26,7 @@ public:
     // First on the new thread. False: the object manager does not know the thread, and is not
     // called on it.
     virtual bool thread_start_hook() = 0;
-    virtual void thread_exit_hook() = 0;  // last on the new thread
+    virtual void thread_exit_hook() = 0; // last on the new thread
 
     // Null on any failure; the caller gives the result to destroy_enum.
     virtual Instance_Enumerator_Rep* start_enum(const char* name_space, const Instance* model) = 0;

@@ -90,6 +90,7 @@ private:
     std::string look(); // all paths of all classes
     std::string perform(const Operation& operation);
     std::string look_at(const std::string& class_name);
+    std::filesystem::path saved_settings() const;
     void begin_life();
     void end_life(const Point* point = nullptr);
     void arm(const Point& point);

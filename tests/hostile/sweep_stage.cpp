@@ -203,6 +203,8 @@ Stage::Stage(const std::string& scenario, bool log)
     begin_life();
     _whole = look();
     end_life();
+    fs::remove_all(saved_settings());
+    fs::copy(_road.root() / "etc", saved_settings(), fs::copy_options::recursive);
     _threads = entries("/proc/self/task");
     _descriptors = entries("/proc/self/fd");
     begin_life();
@@ -219,10 +221,19 @@ bool Stage::refuses(bool is_up_call, const char* function, CMPIrc& code) {
     return true;
 }
 
+// As the first agent left them: what a change writes there is for its own life.
+fs::path Stage::saved_settings() const {
+    return _road.root() / "etc.saved";
+}
+
 void Stage::begin_life() {
     if (_lives)
         return;
     vlnsim_restart();
+    if (fs::exists(saved_settings())) {
+        fs::remove_all(_road.root() / "etc");
+        fs::copy(saved_settings(), _road.root() / "etc", fs::copy_options::recursive);
+    }
     _lives = true;
 }
 

@@ -181,8 +181,8 @@ Key_Signature key_signature(const Instance* instance) {
         } else {
             kind = UINT64_MAX;
         }
-        sum.shape += mix(name ^ mix(kind));
-        sum.hash += mix(name ^ mix(value));
+        sum.shape += mix(name ^ kind);
+        sum.hash += mix(name ^ value);
         return true;
     });
     return sum;

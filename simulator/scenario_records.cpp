@@ -6,6 +6,7 @@
 #include <algorithm>
 #include <arpa/inet.h>
 #include <cstring>
+#include <type_traits>
 
 namespace vlnsim {
 namespace {
@@ -18,19 +19,14 @@ struct Field {
     std::size_t count;
 };
 
-template <class Element, std::size_t size>
-constexpr std::size_t element_width(const Element (&)[size]) {
-    return sizeof(Element);
-}
-template <class Element>
-constexpr std::size_t element_width(const Element&) {
-    return sizeof(Element);
-}
+// By its type alone: a field of a packed record may not be referred to.
+template <class Type>
+constexpr std::size_t element_width = sizeof(std::remove_extent_t<Type>);
 
 #define FIELD(record, field)                                                                       \
     Field {                                                                                        \
-#field, offsetof(record, field), element_width(record{}.field),                            \
-            sizeof(record{}.field) / element_width(record{}.field)                                 \
+#field, offsetof(record, field), element_width<decltype(record::field)>,                   \
+            sizeof(record::field) / element_width<decltype(record::field)>                         \
     }
 
 #define PCI(field) FIELD(AX_PCIRegisters, field)

@@ -135,8 +135,8 @@ const char* result_text(uint32 code) {
         "Error: Echo test not supported",
         "Error: Echo Failed",
         "Error: Target Unreachable",
-        "Error: HBA temperature exceeded operational range. Adapter stopped.\n\nPlease see the "
-        "product documentation",
+        ("Error: HBA temperature exceeded operational range. Adapter stopped.\n\nPlease see the "
+         "product documentation"),
         "Error: Failed to allocate resource",
         "Error: Another diagnostic test is running. Please try again",
         "Error: Sequence Timeout",

@@ -16,7 +16,7 @@ if [ ! -f "$build/build.ninja" ]; then
         -DCMAKE_BUILD_TYPE=Release -DCMAKE_C_FLAGS_RELEASE="-O1 -g1" \
         -DCMAKE_CXX_FLAGS_RELEASE="-O1 -g1" -DVLN_FUZZ=ON \
         -DVLN_SANITIZE=fuzzer-no-link,address,undefined \
-        -DVLN_ROOMS="cimple;schema;foundation;device;operations;fuzz" >&2
+        -DVLN_ROOMS="cimple;schema;foundation;device;operations;agent;services;derivedObjects;module;simulator;host;fuzz" >&2
 fi
 NINJA_STATUS="[fuzz %f/%t] " cmake --build "$build" --target vln_fuzzers -j "$(nproc)" >&2
 

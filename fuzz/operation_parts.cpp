@@ -184,6 +184,8 @@ void Operations::read_change(const std::string& line) {
     for (std::string value; std::getline(fields, value, '\t');)
         assignments.push_back(filled_in(value));
     Change change{'=', "", {}, {}};
+    if (what.starts_with('&')) // what the next row needs done before
+        what.erase(0, 1);
     if (what.starts_with('+') || what.starts_with('-')) {
         change.kind = what[0];
         what.erase(0, 1);
@@ -366,5 +368,5 @@ extern "C" int LLVMFuzzerInitialize(int*, char***) {
 // The search for leaks stops all threads, and those of the module do not bear it. What an input
 // leaves of the broker's is counted; the test suite searches for the rest.
 extern "C" const char* __asan_default_options() {
-    return "detect_leaks=0";
+    return "detect_leaks=0:malloc_context_size=4";
 }

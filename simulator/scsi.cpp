@@ -132,7 +132,7 @@ HBA_STATUS report_luns(Call& call, const std::vector<Target>& targets, std::uint
                     sizeof unit.fcp_lun);
     }
     const std::size_t length = response.size() - head;
-    for (int i = 0; i < 4; ++i)
+    for (std::size_t i = 0; i < 4; ++i)
         response[i] = static_cast<std::uint8_t>(length >> (24 - 8 * i));
     return respond(response, buffers);
 }

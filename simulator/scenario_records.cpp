@@ -6,7 +6,6 @@
 #include <algorithm>
 #include <arpa/inet.h>
 #include <cstring>
-#include <type_traits>
 
 namespace vlnsim {
 namespace {
@@ -19,14 +18,20 @@ struct Field {
     std::size_t count;
 };
 
-// By its type alone: a field of a packed record may not be referred to.
-template <class Type>
-constexpr std::size_t element_width = sizeof(std::remove_extent_t<Type>);
+// By a pointer to the member: a field of a packed record may not be referred to.
+template <class Record, class Element, std::size_t size>
+constexpr std::size_t element_width(Element (Record::*)[size]) {
+    return sizeof(Element);
+}
+template <class Record, class Element>
+constexpr std::size_t element_width(Element Record::*) {
+    return sizeof(Element);
+}
 
 #define FIELD(record, field)                                                                       \
     Field {                                                                                        \
-#field, offsetof(record, field), element_width<decltype(record::field)>,                   \
-            sizeof(record::field) / element_width<decltype(record::field)>                         \
+#field, offsetof(record, field), element_width(&record::field),                            \
+            sizeof(record::field) / element_width(&record::field)                                  \
     }
 
 #define PCI(field) FIELD(AX_PCIRegisters, field)

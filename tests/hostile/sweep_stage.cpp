@@ -152,7 +152,7 @@ std::vector<Point> chosen(std::vector<Point> points, const Choice& choice, const
     if (choice.most == ALL || points.size() <= most)
         return points;
     const std::size_t step = points.size() / most;
-    std::size_t at = scattered(name + kind_name(kind), choice.seed) % step;
+    auto at = static_cast<std::size_t>(scattered(name + kind_name(kind), choice.seed) % step);
     std::vector<Point> some;
     for (; some.size() < most; at += step)
         some.push_back(std::move(points[at]));

@@ -368,5 +368,5 @@ extern "C" int LLVMFuzzerInitialize(int*, char***) {
 // The search for leaks stops all threads, and those of the module do not bear it. What an input
 // leaves of the broker's is counted; the test suite searches for the rest.
 extern "C" const char* __asan_default_options() {
-    return "detect_leaks=0:malloc_context_size=4";
+    return "detect_leaks=0:malloc_context_size=4:max_malloc_fill_size=0:quarantine_size_mb=32";
 }

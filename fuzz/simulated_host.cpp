@@ -26,14 +26,19 @@ host::Options options() {
     std::abort();
 }
 
-// What the library answers to, and what changes nothing.
-bool is_question(std::string_view function) {
-    for (const std::string_view part :
-         {"Get", "Read", "List", "Status", "Version", "InitLib", "ExitLib", "Valid", "IsLocal",
-          "Open", "Close", "Load", "Send", "Inquiry", "Refresh", "Number", "DebugTraces"})
-        if (function.find(part) != std::string_view::npos)
-            return function.find("Download") == std::string_view::npos;
+bool has_any(std::string_view text, std::initializer_list<std::string_view> parts) {
+    for (const std::string_view part : parts)
+        if (text.find(part) != std::string_view::npos)
+            return true;
     return false;
+}
+
+// A function that changes nothing, by its name.
+bool is_question(std::string_view function) {
+    return !has_any(function, {"Set", "Add", "Remove", "Delete", "Create"}) &&
+           has_any(function,
+                   {"Get", "Read", "List", "Status", "Version", "InitLib", "ExitLib", "Valid",
+                    "IsLocal", "Open", "Close", "LoadLib", "Send", "Inquiry", "Refresh", "Traces"});
 }
 
 // A modification answers with the path that the client gave, whatever else stands in it.
@@ -44,11 +49,7 @@ bool is_echo(const host::Fault& fault) {
 
 // What no answer of the library excuses.
 bool is_plain_breach(std::string_view text) {
-    for (const std::string_view part :
-         {" is null", "has no end", "not zeroed", "reserved", "too long"})
-        if (text.find(part) != std::string_view::npos)
-            return true;
-    return false;
+    return has_any(text, {" is null", "has no end", "not zeroed", "reserved", "too long"});
 }
 
 void load(const std::string& scenario, const std::string& root) {

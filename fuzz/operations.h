@@ -27,9 +27,6 @@ public:
 
     // Makes those that the input tells, as many as that; at most one refresh.
     void make(Input& input, unsigned count);
-    // A line for each operation goes to standard error.
-    void be_loud() { _loud = true; }
-
 private:
     struct Method {
         const host::Class* known;
@@ -80,7 +77,7 @@ private:
     std::vector<std::string> _texts;
     bool _refreshed = false;
     unsigned _depth = 0; // of values in values
-    bool _loud = false;
+    const bool _loud = std::getenv("VLN_FUZZ_LOUD") != nullptr; // each operation is told
 };
 
 } // namespace fuzz

@@ -27,6 +27,7 @@ public:
 
     // Makes those that the input tells, as many as that; at most one refresh.
     void make(Input& input, unsigned count);
+
 private:
     struct Method {
         const host::Class* known;
@@ -76,7 +77,7 @@ private:
     std::map<std::string, std::vector<host::Value>> _values; // by the name of their slot
     std::vector<std::string> _texts;
     bool _refreshed = false;
-    unsigned _depth = 0; // of values in values
+    unsigned _depth = 0;                                        // of values in values
     const bool _loud = std::getenv("VLN_FUZZ_LOUD") != nullptr; // each operation is told
 };
 

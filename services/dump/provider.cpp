@@ -227,6 +227,7 @@ sint32 Dump_Service_Provider::GenerateExtFATDump(const Service* self, Target_Por
 
 sint32 Dump_Service_Provider::GetDumpFileNames(const Service* self, Target_Port target,
                                                Property<Array<String>>* files, Result* result) {
+    files->clear(); // it goes in as well, and any bytes of a client would come back
     return run(self, target, result, [&](Dump_Call& call) {
         if (!call.check_call() || !call.check_port() || !call.convert())
             return;

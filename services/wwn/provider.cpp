@@ -132,6 +132,8 @@ sint32 WWN_Service_Provider::ReadWWN(const Service* self, Target_Port target,
     static constexpr const char* TYPES[] = {"Reading Volatile WWNs.", "Reading Non-Volatile WWNs.",
                                             "Reading Factory Default WWNs.",
                                             "Reading current WWNs.", "Reading configured WWNs."};
+    wwpn->clear(); // these go in as well, and any bytes of a client would come back
+    wwnn->clear();
     return run(self, target, result, "ReadWWN", [&](const WWN_Call& call) -> uint32 {
         if (!check_type("ReadWWN", *type, TYPES))
             return METHOD_INVALID_TARGET;

@@ -163,15 +163,6 @@ TEST_F(Channels, EachMethodWantsItsServiceAndItsTarget) {
     }
 }
 
-TEST_F(Channels, APortTellsWhichChannelItIs) {
-    const auto shown = [&](const char* id) {
-        const host::Instance port = ethernet_port(id);
-        return text_of(port, "OtherPortType") + " of " + text_of(port, "OtherIdentifyingInfo");
-    };
-    EXPECT_EQ(shown("100002564C010000"), "vNIC of {VR10420118:00, VR10420118:0, VR10420118, 0, 0}");
-    EXPECT_EQ(shown("100002564C000001"), "vNIC of {VR10420117:00, VR10420117:0, VR10420117, 0, 1}");
-}
-
 TEST_F(Channels, ModesAreSetForTheNextStart) {
     expect_each(
         "SetCMMode",
@@ -309,6 +300,20 @@ TEST_F(Channels, TheAggregatorOfAPortIsSwitched) {
     EXPECT_EQ(text_of(ethernet_port("100002564C090000"), "VEPAState"), "1");
     host::set(service.keys, "Name", Value::text("another"));
     expect(method, on, 33068, "Invalid instance of VLNMPCA_ChannelMgmtService");
+}
+
+// A channel is found by its ASIC and its function.
+TEST(Channels_Of_Ports, EachPortTellsWhichItIs) {
+    const auto expect = [](const char* scenario, const char* id, const char* type,
+                           const char* identities) {
+        Road road({.scenario = scenario});
+        expect_properties(find(road, "VLNMPCA_EthernetPort", "DeviceID", id),
+                          {{"OtherPortType", type}, {"OtherIdentifyingInfo", identities}});
+    };
+    expect("split-cards.json", "100002564C000000", "-",
+           "{VR10420117:00, VR10420117:0, VR10420117, 0, NotSupported}");
+    expect("split-cards.json", "100002564C010101", "vNIC",
+           "{VR10420118:00, VR10420118:1, VR10420118, 1, 1}");
 }
 
 } // namespace

@@ -181,20 +181,11 @@ AX_STATUS VLN_MethodWrapper::GetDeadNICPorts(std::vector<AX_DeadNicPort>* ports)
     Operation_Frame frame("VLN_MethodWrapper::GetDeadNICPorts");
     if (!frame.given(ports))
         return frame.status();
-    ports->clear();
-    Reply reply;
     const AX_STATUS status =
-        reply.fetch({offsetof(AX_DeadNicPortList, entry), sizeof(AX_DeadNicPort), FIRST_DEAD_PORTS},
-                    {NO_MEMORY}, counted<AX_DeadNicPortList>(AX_ListDeadNicPorts));
+        fetch_list<AX_DeadNicPortList>(ports, FIRST_DEAD_PORTS, {NO_MEMORY}, AX_ListDeadNicPorts);
     if (status != AX_STATUS_OK) {
         VLN_OPERATION_FAILED(status, "GetDeadNICPorts exited with the error code %d", status);
         return status;
-    }
-    try {
-        const auto* list = static_cast<const AX_DeadNicPortList*>(reply.data());
-        ports->assign(list->entry, list->entry + reply.count());
-    } catch (const std::bad_alloc&) {
-        return outOfMemory(NO_MEMORY);
     }
     for (const AX_DeadNicPort& port : *ports) {
         const uint8(&mac)[6] = port.mac;

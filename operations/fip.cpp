@@ -224,24 +224,13 @@ AX_STATUS VLN_MethodWrapper::GetFcfList(const HBA_WWN* name, std::vector<AX_Fcf>
     Operation_Frame frame("VLN_MethodWrapper::GetFcfList");
     if (!frame.given(forwarders))
         return frame.status();
-    forwarders->clear();
-    Reply reply;
     const AX_STATUS status =
-        reply.fetch({offsetof(AX_FcfList, entry), sizeof(AX_Fcf), FIRST_FORWARDERS}, {NO_MEMORY},
-                    counted<AX_FcfList>([&](AX_FcfList* list) {
-                        return AX_CNA_FCOE_GetFcfList(wwnOf(name), list);
-                    }));
-    if (status != AX_STATUS_OK) {
+        fetch_list<AX_FcfList>(forwarders, FIRST_FORWARDERS, {NO_MEMORY}, [&](AX_FcfList* list) {
+            return AX_CNA_FCOE_GetFcfList(wwnOf(name), list);
+        });
+    if (status != AX_STATUS_OK)
         VLN_OPERATION_FAILED(status, "Unable to get FCF info, returned with statuscode %d", status);
-        return status;
-    }
-    try {
-        const auto* list = static_cast<const AX_FcfList*>(reply.data());
-        forwarders->assign(list->entry, list->entry + reply.count());
-    } catch (const std::bad_alloc&) {
-        return failed(AX_STATUS_ERROR, NO_MEMORY);
-    }
-    return AX_STATUS_OK;
+    return status;
 }
 
 } // namespace cimple

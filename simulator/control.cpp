@@ -18,11 +18,11 @@ int fail(const std::string& what, char* error, std::size_t size) {
     return 1;
 }
 
-int load(std::string text, std::string name, char* error, std::size_t size) {
+int load(const std::string& text, std::string name, char* error, std::size_t size) {
     Host host = read_scenario(text, name);
     Simulator& simulator = Simulator::instance();
     std::lock_guard lock(simulator.mutex);
-    simulator.replace_host(std::move(host), std::move(text), std::move(name));
+    simulator.replace_host(std::move(host), std::move(name));
     if (error)
         copy_text("", error, size);
     return 0;
@@ -88,17 +88,17 @@ int vlnsim_load_scenario_text(const char* text, const char* name, char* error, s
 }
 
 void vlnsim_restart(void) {
-    Simulator& simulator = Simulator::instance();
-    std::string text, name;
-    {
-        std::lock_guard lock(simulator.mutex);
-        text = simulator.source;
-        name = simulator.source_name;
-    }
-    if (text.empty())
-        guarded(nullptr, 0, [&] { return load("{}", "nothing", nullptr, 0); });
-    else
-        guarded(nullptr, 0, [&] { return load(std::move(text), std::move(name), nullptr, 0); });
+    guarded(nullptr, 0, [] {
+        Simulator& simulator = Simulator::instance();
+        {
+            std::lock_guard lock(simulator.mutex);
+            if (!simulator.scenario_name.empty()) {
+                simulator.restart();
+                return 0;
+            }
+        }
+        return load("{}", "nothing", nullptr, 0);
+    });
 }
 
 void vlnsim_reset(void) {
@@ -106,7 +106,7 @@ void vlnsim_reset(void) {
     vlnsim_set_host_root(nullptr);
     Simulator& simulator = Simulator::instance();
     std::lock_guard lock(simulator.mutex);
-    simulator.replace_host(Host{}, "", "");
+    simulator.replace_host(Host{}, "");
     simulator.scenario_chosen = false;
     simulator.trace = nullptr;
     simulator.recording = false;
@@ -116,8 +116,8 @@ int vlnsim_save_state(const char* path, char* error, size_t size) {
     return guarded(error, size, [&] {
         Simulator& simulator = Simulator::instance();
         std::lock_guard lock(simulator.mutex);
-        const Host described = read_scenario(simulator.source, simulator.source_name);
-        write_file(path, state_text(simulator.host, described, simulator.source_name));
+        write_file(path,
+                   state_text(simulator.host, simulator.described, simulator.scenario_name));
         return 0;
     });
 }
@@ -128,7 +128,7 @@ int vlnsim_load_state(const char* path, char* error, size_t size) {
         Simulator& simulator = Simulator::instance();
         std::lock_guard lock(simulator.mutex);
         Host changed = simulator.host;
-        apply_state(changed, text, path, simulator.source_name);
+        apply_state(changed, text, path, simulator.scenario_name);
         simulator.host = std::move(changed);
         return 0;
     });

@@ -27,20 +27,22 @@ void Simulator::choose_scenario() {
     if (!path || !*path)
         return;
     try {
-        std::string text = read_file(path);
-        Host fresh = read_scenario(text, path);
-        replace_host(std::move(fresh), std::move(text), path);
+        replace_host(read_scenario(read_file(path), path), path);
     } catch (const std::exception& e) {
         std::fprintf(stderr, "%s\n", e.what());
         host.initialisation = AX_STATUS_ERROR;
     }
 }
 
-void Simulator::replace_host(Host fresh, std::string text, std::string name) {
-    host = std::move(fresh);
-    source = std::move(text);
-    source_name = std::move(name);
+void Simulator::replace_host(Host fresh, std::string name) {
+    described = std::move(fresh);
+    scenario_name = std::move(name);
     scenario_chosen = true;
+    restart();
+}
+
+void Simulator::restart() {
+    host = described;
     initialised = false;
     hba_loaded = false;
     handles.clear();

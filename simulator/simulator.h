@@ -25,8 +25,8 @@ struct Simulator {
     std::mutex mutex;
 
     Host host;
-    std::string source; // the scenario's text and name, for a restart
-    std::string source_name;
+    Host described; // as the scenario has it, for a restart
+    std::string scenario_name;
     bool scenario_chosen = false; // loaded, or looked for in the environment
 
     bool initialised = false;                     // AX_InitLib
@@ -52,7 +52,9 @@ struct Simulator {
     // Loads the scenario that the environment names, unless one was chosen before. A bad one is
     // told on standard error, and AX_InitLib fails from then on.
     void choose_scenario();
-    void replace_host(Host fresh, std::string text, std::string name);
+    // With a host that nobody has called yet.
+    void replace_host(Host fresh, std::string name);
+    void restart();
     void forget_calls();
     void forget_faults();
     // Without the mutex meanwhile.

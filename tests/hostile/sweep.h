@@ -1,7 +1,8 @@
 // One sweep for all: an operation is repeated with its n-th event failing, for every n.
 //
-//  1. An operation is a refresh of a scenario, a look at a class in every way (names, instances,
-//     get, association walks), or a change of changes.tsv. A class or service joins by its census
+//  1. An operation is a refresh of a scenario (the load of all classes, what the first clients wait
+//     for, and the end), a look at a class in every way (names, instances, get, association
+//     walks), or a change of changes.tsv. A class or service joins by its census
 //     or its row.
 //  2. A healthy run counts its events, of nine kinds (events.h). Each becomes a point, or several:
 //     a library call fails with each status that it is known for (statuses.tsv), with 1, with two
@@ -12,7 +13,8 @@
 //     or breach of the libraries' contract is left. Only looks share an agent: a look
 //     changes nothing.
 //  4. The next life shows the whole host, or the look after it the whole class: whatever a failure
-//     spoils shows there. A lock that is still held shows as a hang.
+//     spoils shows there. A lock that is still held shows as a hang. Where a refresh has many
+//     points, the whole host is looked at after every eighth.
 //  5. Lives run in forked children. One that crashes, hangs or finds something costs its point; the
 //     next child goes on behind it. A watchdog prints the stacks of all threads of a hang.
 //  6. The suite takes a sample, the same each time: environment variable VLN_SWEEP_SEED gives
@@ -35,11 +37,14 @@ const char* kind_name(Kind kind);
 // Of the module, which must be loaded.
 Events& events_of_module();
 
+inline constexpr std::size_t ALL = ~std::size_t(0);
+
 struct Operation {
     std::string name;
     std::string scenario;        // a file of the scenarios, or a JSON text
     bool log = false;            // with the provider's log at its most talkative
     bool is_judged = false;      // what a failed call costs it; the scenario is WITH_TARGETS
+    std::size_t most = ALL;      // points of one kind that are worth their time
     std::string class_name = {}; // of a look
     std::optional<hostile::Change> row = {}; // of a change
     bool is_refresh() const { return class_name.empty() && !row; }
@@ -69,7 +74,6 @@ extern const std::string WITH_TARGETS;
 std::string judged(const Point& point, const std::string& healthy, const std::string& shown);
 
 // What the points of an operation are taken by.
-inline constexpr std::size_t ALL = ~std::size_t(0);
 struct Choice {
     std::size_t most = 0; // points of one kind and operation; 0: the suite's sample
     unsigned seed = 1;
@@ -83,11 +87,13 @@ public:
 
     // Runs it healthy, and answers its points: all of them in found, those chosen as a result.
     std::vector<Point> prepare(const Operation& operation, const Choice& choice, Counts& found);
-    void run(const Operation& operation, const Point& point);
+    // whole: the next agent is looked at too, as it always is after a change.
+    void run(const Operation& operation, const Point& point, bool whole);
     void close();
 
 private:
     std::string look(); // all paths of all classes
+    void fetch();
     std::string perform(const Operation& operation);
     std::string look_at(const std::string& class_name);
     std::filesystem::path saved_settings() const;

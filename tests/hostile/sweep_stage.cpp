@@ -1,6 +1,8 @@
 // What happens in one process: the points of an operation, and the lives that they run in.
 #include "tests/hostile/sweep.h"
 
+#include "host/core.h"
+
 #include <algorithm>
 #include <fstream>
 #include <sstream>
@@ -31,6 +33,10 @@ constexpr std::array<std::size_t, KINDS> SAMPLES = {2, 2, 1, 1, 1, 1, 1, 2, 1}; 
 #else
 constexpr std::array<std::size_t, KINDS> SAMPLES = {8, 5, 2, 2, 2, 2, 2, 4, 2};
 #endif
+
+// They wait for the first pass, start the status thread, and wait for the pass over the SAN.
+constexpr const char* FIRST_CLASSES[] = {"VLNMPCA_Card", "VLNMPCA_EthernetPort",
+                                         "VLNMPCA_StorageVolume"};
 
 constexpr std::uint64_t TOO_SMALL = ~0ull; // beside the statuses
 
@@ -142,17 +148,18 @@ std::vector<Point> points_of_events(Kind kind, unsigned long count) {
 }
 
 // Spread evenly, from a place that name and seed give.
-std::vector<Point> chosen(std::vector<Point> points, const Choice& choice, const std::string& name,
-                          Kind kind) {
+std::vector<Point> chosen(std::vector<Point> points, const Choice& choice,
+                          const Operation& operation, Kind kind) {
     if (!choice.text.empty()) {
         std::erase_if(points, [&](const Point& one) { return one.text() != choice.text; });
         return points;
     }
-    const std::size_t most = choice.most ? choice.most : SAMPLES[kind];
-    if (choice.most == ALL || points.size() <= most)
+    const std::size_t most = std::min(choice.most ? choice.most : SAMPLES[kind], operation.most);
+    if (points.size() <= most)
         return points;
     const std::size_t step = points.size() / most;
-    auto at = static_cast<std::size_t>(scattered(name + kind_name(kind), choice.seed) % step);
+    auto at =
+        static_cast<std::size_t>(scattered(operation.name + kind_name(kind), choice.seed) % step);
     std::vector<Point> some;
     for (; some.size() < most; at += step)
         some.push_back(std::move(points[at]));
@@ -296,9 +303,21 @@ std::string Stage::look_at(const std::string& class_name) {
     return text.str();
 }
 
+// Loads all classes, and asks those that wait for a pass or begin something at their first call.
+// How each class delivers what there is then is the point of the looks.
+void Stage::fetch() {
+    host::Core& core = *host::Core::any();
+    host::Status status;
+    for (const host::Class* known : _road.manager().provider_classes())
+        core.module.instance(core, *known, status);
+    for (const char* name : FIRST_CLASSES)
+        _road.manager().enumerate_names(name);
+}
+
 std::string Stage::perform(const Operation& operation) {
     if (operation.is_refresh()) {
-        const std::string answer = look();
+        fetch();
+        const std::string answer = operation.is_judged ? look() : "";
         _road.manager().cleanup(true);
         return answer;
     }
@@ -346,7 +365,7 @@ std::vector<Point> Stage::prepare(const Operation& operation, const Choice& choi
         std::vector<Point> all = kind == CALL ? points_of_calls(recorded_calls())
                                               : points_of_events(kind, _events->made[kind]);
         found[kind] = all.size();
-        for (Point& point : chosen(std::move(all), choice, operation.name, kind))
+        for (Point& point : chosen(std::move(all), choice, operation, kind))
             points.push_back(std::move(point));
     }
     if (operation.class_name.empty())
@@ -369,7 +388,7 @@ void Stage::disarm() {
     vlnsim_clear_faults();
 }
 
-void Stage::run(const Operation& operation, const Point& point) {
+void Stage::run(const Operation& operation, const Point& point, bool whole) {
     if (!operation.class_name.empty()) {
         begin_life();
         arm(point);
@@ -392,11 +411,12 @@ void Stage::run(const Operation& operation, const Point& point) {
     if (operation.is_judged) {
         EXPECT_EQ(judged(point, _whole, answer), "") << point.line;
     }
-    // Of a change the same agent, of a refresh another one, which ends at once.
-    for (const char* name : {"VLNMPCA_EthernetPort", "VLNMPCA_StorageVolume", "VLNMPCA_Card"})
-        _road.manager().enumerate(name);
+    if (operation.row) { // the same agent goes on
+        for (const char* name : FIRST_CLASSES)
+            _road.manager().enumerate(name);
+    }
     end_life(&point);
-    if (operation.is_refresh()) {
+    if (operation.is_refresh() && whole) {
         begin_life();
         EXPECT_EQ(look(), _whole) << "the next agent";
         end_life();

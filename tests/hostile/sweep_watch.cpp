@@ -28,9 +28,10 @@ constexpr bool IS_SANITIZED = true;
 constexpr bool IS_SANITIZED = false;
 #endif
 
-constexpr std::uint64_t TOO_LONG = 60000;   // milliseconds for one point
-constexpr unsigned MOST_FINDINGS = 5;       // of one operation; those after them are alike
-constexpr std::size_t MOST_OPERATIONS = 24; // of one child
+constexpr std::uint64_t TOO_LONG = 60000;           // milliseconds for one point
+constexpr unsigned MOST_FINDINGS = 5;               // of one operation; those after them are alike
+constexpr std::size_t MOST_OPERATIONS = 24;         // of one child
+constexpr std::size_t FEW_POINTS = 100, EIGHTH = 8; // see Stage::run
 constexpr std::size_t PREPARING = ~std::size_t(0);
 constexpr const char* STACKS = "stacks.txt";
 
@@ -171,7 +172,8 @@ private:
             _slot.begin(number, i, points[i].text());
             ++tally.tried[points[i].kind];
             events->depth = 0;
-            stage.run(operation, points[i]);
+            stage.run(operation, points[i],
+                      points.size() <= FEW_POINTS || i % EIGHTH == 0 || i + 1 == points.size());
             check();
         }
     }

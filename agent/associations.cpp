@@ -38,8 +38,7 @@ bool set_ends(Instance* association, Association_Ends ends) {
 
 Instance* make_instance(const Meta_Class* meta_class) {
     static const String name_space(VORLAN_NAME_SPACE);
-    Instance* instance = create(meta_class);
-    nullify(instance, true, true);
+    Instance* instance = create_null(meta_class);
     instance->__name_space = name_space;
     return instance;
 }

@@ -2,6 +2,7 @@
 #include "cimple/conversion.h"
 
 #include "cimple/cmpi_call.h"
+#include "cimple/instance_detail.h"
 #include "cimple/log.h"
 
 #include <cstdlib>
@@ -448,15 +449,11 @@ Ref<Instance> make_instance(const Converter& converter, const Meta_Class* meta_c
 // to be asked for. False, and something of the instance may be set, for any other path.
 bool read_keys_by_name(const Converter& converter, const Meta_Class* meta_class,
                        const CMPIObjectPath* path, Instance* out) {
-    CMPICount left = meta_class->num_keys;
     CMPICount count = 0;
-    if (!path || !From_Path{path}.count(count) || count != left)
+    if (!path || !From_Path{path}.count(count) || count != meta_class->num_keys)
         return false;
-    for (uint32 i = 0; i < meta_class->num_meta_features && left > 0; i++) {
-        const Meta_Feature* key = meta_class->meta_features[i];
-        if (!(key->flags & FLAG_KEY))
-            continue;
-        --left;
+    return detail::each_key(meta_class, [&](const Meta_Key& listed) {
+        const Meta_Feature* key = meta_class->meta_features[listed.feature];
         CMPIStatus status = cmpi::GOOD_STATUS;
         CMPIData data = path->ft->getKey(path, key->name, &status);
         if (!cmpi::good(status) || (data.state & CMPI_notFound))
@@ -464,16 +461,15 @@ bool read_keys_by_name(const Converter& converter, const Meta_Class* meta_class,
         From_Path::adjust(data, expected_type(key));
         if (!assign(converter, meta_class, key, data, out))
             CIMPLE_WARN("conversion error: %s.%s", meta_class->name, key->name);
-    }
-    return true;
+        return true;
+    });
 }
 
 // ---- Entry points ----
 
 Ref<Instance> make_cimple_reference(const Converter& converter, const Meta_Class* meta_class,
                                     const CMPIObjectPath* path) {
-    Ref<Instance> instance(create(meta_class));
-    nullify(instance.get(), true, true);
+    Ref<Instance> instance(create_null(meta_class));
     if (!read_keys_by_name(converter, meta_class, path, instance.get()))
         return make_instance(converter, meta_class, FLAG_KEY, From_Path{path});
     set_name_space_recursive(instance.get(), converter.name_space.c_str(), false);

@@ -2,6 +2,7 @@
 #include "cimple/conversion.h"
 
 #include "cimple/cmpi_call.h"
+#include "cimple/instance_detail.h"
 #include "cimple/log.h"
 
 #include <cstring>
@@ -354,21 +355,14 @@ int fill_args(const Source& source, const Instance* method, uint32 flag, const T
     return CMPI_RC_OK;
 }
 
-// The keys only. They are few and mostly first, so the walk ends with the last of them. False if
-// one is missing for want of the broker's help: the path would name nothing.
+// The keys only. False if one is missing for want of the broker's help: the path would name
+// nothing.
 bool fill_keys(const Source& source, const Instance* instance, CMPIObjectPath* path) {
     const Meta_Class* meta = instance->__meta_class;
     To_Path carrier{path};
-    uint32 left = meta->num_keys;
-    for (uint32 i = 0; i < meta->num_meta_features && left > 0; i++) {
-        const Meta_Feature* feature = meta->meta_features[i];
-        if (!(feature->flags & FLAG_KEY))
-            continue;
-        left--;
-        if (!pass_member(source, instance, feature, carrier))
-            return false;
-    }
-    return true;
+    return detail::each_key(meta, [&](const Meta_Key& key) {
+        return pass_member(source, instance, meta->meta_features[key.feature], carrier);
+    });
 }
 
 // One broker needs the key names beside the list, or it would filter the keys out.

@@ -60,10 +60,12 @@ void release(Instance* instance, std::size_t count) noexcept {
 }
 
 // What is more than zeroed memory in an empty member.
-void construct_member(Instance* instance, const Meta_Feature* feature) noexcept {
+void construct_member(Instance* instance, const Meta_Feature* feature, bool null) noexcept {
     if (feature->flags & FLAG_PROPERTY) {
         const Meta_Property* p = as_property(feature);
         void* value = member(instance, p->offset);
+        if (null)
+            *null_flag(instance, p) = 1;
         if (p->subscript != 0)
             new (value) Array_Base(array_traits(p->type));
         else if (p->type == TYPE_STRING)
@@ -72,7 +74,19 @@ void construct_member(Instance* instance, const Meta_Feature* feature) noexcept 
             new (value) Datetime();
     } else if ((feature->flags & FLAG_REFERENCE) && as_reference(feature)->subscript != 0) {
         new (member(instance, as_reference(feature)->offset)) Array<Instance*>();
+        if (null)
+            *null_flag(instance, feature) = 1;
     }
+}
+
+Instance* create_empty(const Meta_Class* meta_class, bool null) {
+    void* block = allocate(meta_class);
+    std::memset(block, 0, meta_class->size);
+    ref(meta_class);
+    Instance* instance = construct_head(block, meta_class);
+    for (const Meta_Feature* feature : features(instance))
+        construct_member(instance, feature, null);
+    return instance;
 }
 
 // ---- Defaults ----
@@ -164,12 +178,7 @@ void unref_all(Array<Instance*>& instances) noexcept {
 } // namespace detail
 
 Instance* create(const Meta_Class* meta_class, bool defaults) {
-    void* block = allocate(meta_class);
-    std::memset(block, 0, meta_class->size);
-    ref(meta_class);
-    Instance* instance = construct_head(block, meta_class);
-    for (const Meta_Feature* feature : features(instance))
-        construct_member(instance, feature);
+    Instance* instance = create_empty(meta_class, false);
     if (!defaults)
         return instance;
     try {
@@ -182,6 +191,10 @@ Instance* create(const Meta_Class* meta_class, bool defaults) {
         throw;
     }
     return instance;
+}
+
+Instance* create_null(const Meta_Class* meta_class) {
+    return create_empty(meta_class, true);
 }
 
 Instance* clone(const Instance* instance) {

@@ -67,6 +67,8 @@ struct Instance {
 // A new instance. Without defaults every member is zero or empty and not null; with defaults a
 // property takes its default, and is null without one. Counts the class. Throws std::bad_alloc.
 Instance* create(const Meta_Class* meta_class, bool defaults = false);
+// The same, with every member null.
+Instance* create_null(const Meta_Class* meta_class);
 // Deep copy with a count of its own; references are cloned, nulls stay null. Counts the class.
 // Throws std::bad_alloc.
 Instance* clone(const Instance* instance);
@@ -184,9 +186,7 @@ Instance* reference(const Instance* instance, const Meta_Reference* feature);
 
 template <class T>
 T* create_null() {
-    T* instance = create<T>();
-    nullify(instance, true, true);
-    return instance;
+    return static_cast<T*>(create_null(&T::static_meta_class));
 }
 
 // A counted pointer, to a const class where the instance is not to be written. Made from a raw

@@ -174,8 +174,7 @@ int filter_properties(Instance* instance, const char* const* names, bool keep_ke
 }
 
 Instance* create_model(const Meta_Class* meta_class, const Instance* source) {
-    Ref<Instance> model(create(meta_class));
-    nullify(model.get(), true, true);
+    Ref<Instance> model(create_null(meta_class));
     if (source)
         copy_keys(model.get(), source);
     return model.release();

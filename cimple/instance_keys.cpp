@@ -24,13 +24,6 @@ bool is_reference_array(const Meta_Feature* feature) {
     return (feature->flags & FLAG_REFERENCE) && as_reference(feature)->subscript != 0;
 }
 
-// Number of keys still to be met on a walk, so that it ends with the last one: keys come early.
-// Only a class knows it; a method instance is walked to its end.
-uint32 count_keys(const Instance* instance) {
-    const Meta_Class* meta_class = instance->__meta_class;
-    return meta_class->flags & FLAG_METHOD ? UINT32_MAX : meta_class->num_keys;
-}
-
 // The key of b's class with the name, kind and type of a's key, or null. Classes that are related
 // have it at the same index, which spares the search.
 const Meta_Feature* matching_key(const Meta_Feature* key, std::size_t index, const Instance* b) {
@@ -49,19 +42,23 @@ const Meta_Feature* matching_key(const Meta_Feature* key, std::size_t index, con
     return is_reference_array(found) ? nullptr : found;
 }
 
-// Calls visit(key, index) for each key that key_eq compares, until one answers false.
+struct Key {
+    const Meta_Feature* feature;
+    std::size_t index;
+    uint64 name_hash;
+};
+
+// Calls visit(key) for each key that key_eq compares, until one answers false. A method instance
+// has none.
 template <class Visit>
 bool all_keys(const Instance* instance, Visit visit) {
+    if (instance->__meta_class->flags & FLAG_METHOD)
+        return true;
     const auto all = features(instance);
-    uint32 left = count_keys(instance);
-    for (std::size_t i = 0; i < all.size() && left > 0; ++i) {
-        if (!is_key(all[i]) || (all[i]->flags & FLAG_METHOD))
-            continue;
-        --left;
-        if (!is_reference_array(all[i]) && !visit(all[i], i))
-            return false;
-    }
-    return true;
+    return each_key(instance->__meta_class, [&](const Meta_Key& key) {
+        const Meta_Feature* feature = all[key.feature];
+        return is_reference_array(feature) || visit(Key{feature, key.feature, key.name_hash});
+    });
 }
 
 bool equal_key_references(const Instance* a, const Instance* b) {
@@ -79,26 +76,6 @@ constexpr uint64 mix(uint64 x) {
     x ^= x >> 27;
     x *= 0x94D049BB133111EBu;
     return x ^ (x >> 31);
-}
-
-// The same for names that differ in case only, eight characters at a time: names are long, and each
-// key of each instance has one. It takes a few other characters for equal as well, as a hash may.
-uint64 key_name_hash(const char* name) {
-    constexpr uint64 LOWER = 0x2020202020202020u;
-    uint64 hash = 0;
-    for (std::size_t left = std::strlen(name); left != 0;) {
-        uint64 word = 0;
-        const std::size_t taken = std::min(left, sizeof word);
-        if (taken == sizeof word)
-            std::memcpy(&word, name, sizeof word);
-        else
-            std::memcpy(&word, name, taken);
-        hash = (hash ^ (word | LOWER)) * 0x9E3779B97F4A7C15u;
-        hash ^= hash >> 32;
-        name += taken;
-        left -= taken;
-    }
-    return hash;
 }
 
 uint64 hash_bytes(const void* bytes, std::size_t size) {
@@ -166,36 +143,35 @@ bool equal_values(const Instance* a, const Meta_Property* in_a, const Instance* 
 // The keys' contributions are added up, so their order plays no part.
 Key_Signature key_signature(const Instance* instance) {
     Key_Signature sum{};
-    all_keys(instance, [&](const Meta_Feature* key, std::size_t) {
-        const uint64 name = key_name_hash(key->name);
+    all_keys(instance, [&](const Key& key) {
         uint64 kind;
         uint64 value = 0;
-        if (key->flags & FLAG_PROPERTY) {
-            const Meta_Property* p = as_property(key);
+        if (key.feature->flags & FLAG_PROPERTY) {
+            const Meta_Property* p = as_property(key.feature);
             kind = (uint64{p->type} << 16) + static_cast<uint16>(p->subscript);
             value = hash_value(instance, p);
-        } else if (const Instance* target = reference(instance, as_reference(key))) {
+        } else if (const Instance* target = reference(instance, as_reference(key.feature))) {
             const Key_Signature inner = key_signature(target);
             kind = mix(inner.shape + 1);
             value = inner.hash;
         } else {
             kind = UINT64_MAX;
         }
-        sum.shape += mix(name ^ kind);
-        sum.hash += mix(name ^ value);
+        sum.shape += mix(key.name_hash ^ kind);
+        sum.hash += mix(key.name_hash ^ value);
         return true;
     });
     return sum;
 }
 
 bool keys_embed(const Instance* a, const Instance* b) {
-    return all_keys(a, [&](const Meta_Feature* key, std::size_t index) {
-        const Meta_Feature* other = matching_key(key, index, b);
+    return all_keys(a, [&](const Key& key) {
+        const Meta_Feature* other = matching_key(key.feature, key.index, b);
         if (!other)
             return false;
-        if (key->flags & FLAG_PROPERTY)
+        if (key.feature->flags & FLAG_PROPERTY)
             return true;
-        const Instance* ra = reference(a, as_reference(key));
+        const Instance* ra = reference(a, as_reference(key.feature));
         const Instance* rb = reference(b, as_reference(other));
         return ra && rb ? keys_embed(ra, rb) : ra == rb;
     });
@@ -204,20 +180,19 @@ bool keys_embed(const Instance* a, const Instance* b) {
 } // namespace detail
 
 bool keys_all_set(const Instance* instance) {
-    return all_keys(instance,
-                    [&](const Meta_Feature* key, std::size_t) { return !is_null(instance, key); });
+    return all_keys(instance, [&](const Key& key) { return !is_null(instance, key.feature); });
 }
 
 bool key_eq(const Instance* a, const Instance* b) {
     if (a == b)
         return true;
-    return all_keys(a, [&](const Meta_Feature* key, std::size_t index) {
-        const Meta_Feature* other = matching_key(key, index, b);
+    return all_keys(a, [&](const Key& key) {
+        const Meta_Feature* other = matching_key(key.feature, key.index, b);
         if (!other)
             return false;
-        if (key->flags & FLAG_PROPERTY)
-            return equal_values(a, as_property(key), b, as_property(other));
-        return equal_key_references(reference(a, as_reference(key)),
+        if (key.feature->flags & FLAG_PROPERTY)
+            return equal_values(a, as_property(key.feature), b, as_property(other));
+        return equal_key_references(reference(a, as_reference(key.feature)),
                                     reference(b, as_reference(other)));
     });
 }

@@ -123,11 +123,33 @@ struct Meta_Method : Meta_Features {
     uint16 return_type;
 };
 
+// Of a key name, without regard to case: eight characters at a time, since names are long. It takes
+// a few other characters for equal as well, as a hash may.
+constexpr uint64 key_name_hash(const char* name) {
+    constexpr uint64 LOWER = 0x2020202020202020u;
+    uint64 hash = 0;
+    while (*name) {
+        uint64 word = 0;
+        for (unsigned shift = 0; shift < 64 && *name; shift += 8)
+            word |= uint64{static_cast<uint8>(*name++)} << shift;
+        hash = (hash ^ (word | LOWER)) * 0x9E3779B97F4A7C15u;
+        hash ^= hash >> 32;
+    }
+    return hash;
+}
+
+// Where a key stands among the features of its class.
+struct Meta_Key {
+    uint64 name_hash; // key_name_hash of its name
+    uint32 feature;
+};
+
 struct Meta_Class : Meta_Features {
     const uint8* locals; // one per feature: 1 where this class declares or overrides it
     const Meta_Class* super_meta_class; // null at a root
     uint32 num_keys;
     const Meta_Repository* meta_repository;
+    const Meta_Key* keys = nullptr; // num_keys of them, ascending; null: nobody has listed them
 };
 
 // The classes, with a table that finds them by name: name_slot tells where a name stands, unless

@@ -283,6 +283,7 @@ void free_class(const Meta_Class* meta_class) {
 void derive(Meta_Class* to, const Meta_Class* base) {
     copy_features(to, base);
     to->num_keys = base->num_keys;
+    to->keys = base->keys;
     to->meta_repository = base->meta_repository;
     to->super_meta_class = base;
     ref(base);

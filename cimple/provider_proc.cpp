@@ -35,9 +35,8 @@ public:
     In_Class(const Meta_Class* meta_class, Instance* instance) : _instance(instance) {
         if (!instance || is_subclass(meta_class, instance->__meta_class))
             return;
-        _converted.reset(create(meta_class));
+        _converted.reset(create_null(meta_class));
         _instance = _converted.get();
-        nullify(_instance, true, true);
         _instance->__name_space = instance->__name_space;
         for (uint32 i = 0; i < meta_class->num_meta_features; i++)
             copy_common(meta_class->meta_features[i], instance);

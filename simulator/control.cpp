@@ -116,8 +116,7 @@ int vlnsim_save_state(const char* path, char* error, size_t size) {
     return guarded(error, size, [&] {
         Simulator& simulator = Simulator::instance();
         std::lock_guard lock(simulator.mutex);
-        write_file(path,
-                   state_text(simulator.host, simulator.described, simulator.scenario_name));
+        write_file(path, state_text(simulator.host, simulator.described, simulator.scenario_name));
         return 0;
     });
 }

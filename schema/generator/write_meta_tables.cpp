@@ -94,6 +94,7 @@ public:
             this->method(*method->feature, feature_flags(*method));
         feature_list();
         locals();
+        key_list();
         class_record();
     }
 
@@ -105,6 +106,7 @@ private:
     void parameters(const mof::Feature& method, const std::string& structure);
     void feature_list();
     void locals();
+    void key_list();
     void class_record();
 
     void property_record(const mof::Declaration& declaration, const std::string& flags,
@@ -232,6 +234,16 @@ void Table::locals() {
     _out << "\n};\n";
 }
 
+void Table::key_list() {
+    if (_class.num_keys == 0)
+        return;
+    _out << "constexpr Meta_Key " << _name << "_keys[] = {\n";
+    for (std::size_t i = 0; i < _class.features.size(); ++i)
+        if (_class.features[i].key)
+            _out << "    {key_name_hash(\"" << _class.features[i].name() << "\"), " << i << "},\n";
+    _out << "};\n";
+}
+
 void Table::class_record() {
     bool empty = _class.features.empty();
     _out << "constinit const Meta_Class " << _name << "::static_meta_class = {\n    {"
@@ -240,7 +252,8 @@ void Table::class_record() {
          << (empty ? "nullptr" : _name + "_locals") << ", "
          << (_class.superclass ? "&" + _class.superclass->name() + "::static_meta_class"
                                : std::string("nullptr"))
-         << ", " << _class.num_keys << ", &meta_repository};\n\n";
+         << ", " << _class.num_keys << ", &meta_repository, "
+         << (_class.num_keys == 0 ? "nullptr" : _name + "_keys") << "};\n\n";
 }
 
 // Headers that the table of a class needs: its own (which brings its ancestors') and its targets'.

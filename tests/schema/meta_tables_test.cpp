@@ -100,7 +100,11 @@ TEST(MetaTables, EveryClassIsConsistent) {
         for (uint32 j = 0; j < meta_class.num_meta_features; j++) {
             const Meta_Feature* feature = meta_class.meta_features[j];
             EXPECT_EQ(find_feature(&meta_class, feature->name, FLAG_FEATURE), feature);
-            keys += (feature->flags & FLAG_KEY) != 0;
+            if (feature->flags & FLAG_KEY) {
+                ASSERT_LT(keys, meta_class.num_keys) << meta_class.name;
+                EXPECT_EQ(meta_class.keys[keys].feature, j) << meta_class.name;
+                EXPECT_EQ(meta_class.keys[keys++].name_hash, key_name_hash(feature->name));
+            }
             if (feature->flags & FLAG_METHOD)
                 check_method(*static_cast<const Meta_Method*>(feature));
         }

@@ -17,27 +17,10 @@ Ref<T> own(T* instance) {
     return Ref<T>(instance);
 }
 
-Test_Leaf* make_leaf(const char* name) {
-    auto* leaf = create_null<Test_Leaf>();
-    leaf->Name.set(name);
-    return leaf;
-}
-
-Test_Link* make_link(Instance* left, Test_Base* right) {
-    auto* link = create_null<Test_Link>();
-    link->Left = left;
-    link->Right = right;
-    return link;
-}
-
 TEST(Keys, EqualAcrossClassesWithTheSameKeys) {
     const Ref<Test_Base> base(make_base("a", 1));
-    const auto sub = own(create_null<Test_Sub>());
-    sub->Id.set("a");
-    sub->Slot.set(1);
-    const auto stranger = own(create_null<Test_Stranger>());
-    stranger->ID.set("a");
-    stranger->SLOT.set(1);
+    const auto sub = own(make_base<Test_Sub>("a", 1));
+    const auto stranger = own(make_stranger("a", 1));
     for (const Instance* other :
          {static_cast<const Instance*>(sub.get()), static_cast<const Instance*>(stranger.get())}) {
         EXPECT_TRUE(key_eq(base.get(), other));
@@ -74,10 +57,7 @@ TEST(Keys, ReferencesCompareByTheirKeys) {
     EXPECT_FALSE(key_eq(null.get(), a.get()));
     EXPECT_TRUE(key_eq(null.get(), own(make_link(make_leaf("l"), nullptr)).get()));
     // Same keys, unrelated class.
-    auto* stranger = create_null<Test_Stranger>();
-    stranger->ID.set("r");
-    stranger->SLOT.set(1);
-    const auto c = own(make_link(stranger, make_base("r", 1)));
+    const auto c = own(make_link(make_stranger("r", 1), make_base("r", 1)));
     const auto d = own(make_link(make_base("r", 1), make_base("r", 1)));
     EXPECT_FALSE(key_eq(c.get(), d.get()));
 }
@@ -232,17 +212,11 @@ TEST(InstanceMapDeathTest, AWriteToASharedInstanceEndsTheProcess) {
 
 TEST(InstanceMap, SubclassMatchesBaseKey) {
     Instance_Map<Test_Base> map;
-    auto* sub = create_null<Test_Sub>();
-    sub->Id.set("a");
-    sub->Slot.set(1);
-    EXPECT_EQ(map.insert(sub), 0);
+    EXPECT_EQ(map.insert(make_base<Test_Sub>("a", 1)), 0);
     const auto base = own(make_base("a", 1));
     EXPECT_EQ(map.find(base.get()), 0);
     EXPECT_EQ(map.create_instance(base.get()), CREATE_INSTANCE_DUPLICATE);
-    const auto stranger = own(create_null<Test_Stranger>());
-    stranger->ID.set("a");
-    stranger->SLOT.set(1);
-    EXPECT_EQ(map.find(stranger.get()), 0);
+    EXPECT_EQ(map.find(own(make_stranger("a", 1)).get()), 0);
 }
 
 // Members whose keys are of several shapes: an index by hash alone would miss the one-way matches.

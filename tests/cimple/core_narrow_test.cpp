@@ -106,10 +106,8 @@ TEST(Narrowing, KeepsWhatAWalkFindsThroughEveryChange) {
 TEST(Narrowing, ASingleEndIsFoundAmongMany) {
     Instance_Map<Test_Link> store;
     for (uint32 i = 0; i < 1000; ++i) {
-        auto* link = create_null<Test_Link>();
-        link->Left = make_base("left", i);
-        link->Right = make_base("right", i / 2);
-        ASSERT_EQ(store.insert(link), static_cast<sint32>(i));
+        ASSERT_EQ(store.insert(make_link(make_base("left", i), make_base("right", i / 2))),
+                  static_cast<sint32>(i));
     }
     const Ref<Instance> end(make_base("right", 7));
     EXPECT_EQ(store.narrow({Enumeration_Focus::REFERENCES_TO, end.get()}), (Positions{14, 15}));

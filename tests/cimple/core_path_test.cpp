@@ -45,11 +45,8 @@ TEST(Path, WritesAndReadsAllTypes) {
 
 TEST(Path, NestsQuotedPaths) {
     Ref<Test_Chain> chain(create_null<Test_Chain>());
-    chain->Link = create_null<Test_Link>();
-    auto* leaf = create_null<Test_Leaf>();
-    leaf->Name.set("say \"hi\" \\ bye\\");
-    chain->Link->Left = leaf;
-    chain->Link->Right = make_base("r", 31);
+    chain->Link = make_link(make_leaf("say \"hi\" \\ bye\\"), make_base("r", 31));
+    chain->End = make_base("end", 0);
     EXPECT_EQ(path_of(chain->Link->Right), "Test_Base.Id=\"r\",Slot=31");
     const std::string path = path_of(chain.get());
     const Ref<Test_Chain> read_back(

@@ -18,23 +18,12 @@ public:
     // An end of any class that a reference of the schema accepts, a null now and then.
     Instance* end(bool null_too = true) {
         switch (below(null_too ? 6 : 5)) {
-        case 0: {
-            auto* sub = create_null<Test_Sub>();
-            fill(sub);
-            sub->State.set(static_cast<uint16>(below(9)));
-            return sub;
-        }
-        case 1: {
-            auto* leaf = create_null<Test_Leaf>();
-            leaf->Name.set(name());
-            return leaf;
-        }
-        case 2: {
-            auto* stranger = create_null<Test_Stranger>();
-            stranger->ID.set(name());
-            stranger->SLOT.set(below(3));
-            return stranger;
-        }
+        case 0:
+            return base(false);
+        case 1:
+            return make_leaf(name());
+        case 2:
+            return make_stranger(name(), below(3));
         case 5:
             return nullptr;
         default:
@@ -44,14 +33,16 @@ public:
     Test_Base* base(bool null_too = true) {
         if (null_too && below(6) == 0)
             return nullptr;
-        Test_Base* made = below(2) ? create_null<Test_Base>() : create_null<Test_Sub>();
-        fill(made);
+        const char* id = name();
+        Test_Base* made = below(2) ? make_base(id, below(3)) : make_base<Test_Sub>(id, below(3));
+        if (below(8) == 0)
+            made->Id.null = 1; // a flag that no comparison looks at
+        made->Caption.set(below(2) ? "x" : "y");
         return made;
     }
     Test_Link* link() {
-        auto* made = create_null<Test_Link>();
-        made->Left = end();
-        made->Right = base();
+        Instance* left = end();
+        auto* made = make_link(left, base());
         made->Weight.set(below(100));
         return made;
     }
@@ -69,14 +60,6 @@ private:
         static const char* const names[] = {"a", "b", "c", "d", "A", ""};
         return names[below(6)];
     }
-    void fill(Test_Base* made) {
-        made->Id.set(name());
-        made->Slot.set(below(3));
-        if (below(8) == 0)
-            made->Id.null = 1; // a flag that no comparison looks at
-        made->Caption.set(below(2) ? "x" : "y");
-    }
-
     std::minstd_rand _random;
 };
 

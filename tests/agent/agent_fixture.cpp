@@ -3,41 +3,10 @@
 #include "derivedObjects/pattern.h"
 #include "device/library/axapi.h"
 #include "device/library/runtime_loader.h"
-#include "foundation/host_paths.h"
 
 #include <cstring>
-#include <filesystem>
-#include <fstream>
 
 namespace cimple {
-
-const char* host_root() {
-    return "host";
-}
-
-// ---- Log ----
-
-Log_Capture::Log_Capture() {
-    CLogger::instance().set_enabled();
-    CLogger::instance().add_logger(this);
-}
-
-Log_Capture::~Log_Capture() {
-    CLogger::instance().remove_logger(this);
-}
-
-void Log_Capture::log(sint32 level, const char*, uint32, const char* text) {
-    std::lock_guard guard(_lock);
-    _lines.emplace_back(level, text);
-}
-
-int Log_Capture::count(sint32 level, const std::string& text) const {
-    std::lock_guard guard(_lock);
-    int found = 0;
-    for (const auto& line : _lines)
-        found += line.first == level && line.second == text;
-    return found;
-}
 
 // ---- Library ----
 
@@ -101,21 +70,14 @@ constexpr Time::Clock STANDING_CLOCK = {
     [](uint64 usec) { present_time += usec; },
 };
 
-void make_host() {
-    namespace fs = std::filesystem;
-    fs::remove_all(host_root());
-    for (const char* folder : {"/etc", "/proc", "/var/log", "/opt/ibm/platform/log"})
-        fs::create_directories(std::string(host_root()) + folder);
-    std::ofstream(host_path(Host_File::KERNEL_VERSION)) << "Linux version 6.1.0\n";
-    std::ofstream(host_path(Host_File::DISTRIBUTION)) << "Debian GNU/Linux 12\n";
-}
-
 } // namespace
 
 // ---- Agent ----
 
 void Agent_Test::SetUp() {
-    make_host();
+    Foundation_Test::SetUp();
+    write(Host_File::KERNEL_VERSION, "Linux version 6.1.0\n");
+    write(Host_File::DISTRIBUTION, "Debian GNU/Linux 12\n");
     present_time = START;
     Time::replace_clock(&STANDING_CLOCK);
     Fake_Library::present = true;
@@ -126,7 +88,7 @@ void Agent_Test::SetUp() {
 void Agent_Test::TearDown() {
     EXPECT_EQ(ProviderAgent::current(), nullptr) << "the test leaves an agent behind";
     VLN_Runtime_Loader::setCalls(nullptr);
-    Time::replace_clock(nullptr);
+    Foundation_Test::TearDown();
 }
 
 void Agent_Test::advance(uint64 usec) {
@@ -146,7 +108,7 @@ void Agent_Test::settle(ProviderAgent& agent) {
 
 int Agent_Test::refreshes_started(ProviderAgent& agent) {
     settle(agent);
-    Log_Capture log;
+    Agent_Log log;
     agent.BuildCimpleInfo();
     settle(agent);
     return log.count(VLN_DBG, "PERF: DataFetch_Handler Thread BEGIN");

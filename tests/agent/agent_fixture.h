@@ -1,42 +1,22 @@
-// What the tests of the agent stand on: a host in a folder, a clock that stands still, a management
-// library without adapters, and the log's lines.
+// What the tests of the agent stand on, beside a host in a folder: a clock that stands still till
+// it is set, and a management library without adapters.
 #ifndef TESTS_AGENT_AGENT_FIXTURE_H
 #define TESTS_AGENT_AGENT_FIXTURE_H
 
 #include "agent/provider_agent.h"
 #include "cimple/registration.h"
 #include "derivedObjects/pattern.h"
-#include "foundation/logger.h"
-
-#include <gtest/gtest.h>
+#include "tests/foundation/foundation_fixture.h"
 
 #include <atomic>
 #include <future>
-#include <mutex>
-#include <string>
 #include <thread>
-#include <utility>
-#include <vector>
 
 namespace cimple {
 
-// Keeps what is logged while it lives.
-class Log_Capture : public VLN_LoggerInterface {
-public:
-    Log_Capture();
-    ~Log_Capture() override;
-
-    void log(sint32 level, const char* file, uint32 line, const char* text) override;
-    void open() override {}
-    void close() override {}
-    void clear() override {}
-
-    // How often the text was logged at the level, as the whole line.
-    int count(sint32 level, const std::string& text) const;
-
-private:
-    mutable std::mutex _lock; // a refresh may still be logging while a test counts
-    std::vector<std::pair<sint32, std::string>> _lines;
+// Keeps what the agent's logger gets while it lives, whatever its settings.
+struct Agent_Log : Log_Capture {
+    Agent_Log() { CLogger::instance().set_enabled(); }
 };
 
 // The management library that the loader finds: it initialises, and lists no adapters.
@@ -46,7 +26,7 @@ struct Fake_Library {
     static uint32 kept_dumps;      // what AX_SetDumpRetentionCount was told last
 };
 
-class Agent_Test : public ::testing::Test {
+class Agent_Test : public Foundation_Test {
 protected:
     static constexpr uint64 START = 1700000000ull * 1000000;
     static constexpr uint64 MINUTE = 60000000;

@@ -28,7 +28,7 @@ TEST(Associations, MissingOrWrongEndMakesNothing) {
     Instance_Map<VLNMPCA_Container> store;
     auto whole = card("S1");
     auto part = connector("P1");
-    Log_Capture log;
+    Agent_Log log;
     EXPECT_EQ(associate(store, nullptr, part.get()), nullptr);
     EXPECT_EQ(associate(store, whole.get(), nullptr), nullptr);
     EXPECT_EQ(associate(store, whole.get(), whole.get()), nullptr);
@@ -42,7 +42,7 @@ TEST(Associations, DuplicateIsLoggedAndDropped) {
     auto part = connector("P1");
     ASSERT_NE(associate(store, whole.get(), part.get()), nullptr);
     EXPECT_TRUE(is_shared(whole.get()) && is_shared(part.get())) << "ends are not copied";
-    Log_Capture log;
+    Agent_Log log;
     EXPECT_EQ(associate(store, whole.get(), part.get(), "Insert Failed (CNA): VLNMPCA_Container"),
               nullptr);
     EXPECT_EQ(associate(store, whole.get(), part.get(), {"quiet", VLN_DBG}), nullptr);

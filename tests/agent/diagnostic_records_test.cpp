@@ -65,7 +65,7 @@ TEST_F(Records_Test, AJobGoesAtOnceWhereItIsToAndTheRecordsStay) {
 }
 
 TEST_F(Records_Test, ARunLeavesAllOrNothing) {
-    Log_Capture log;
+    Agent_Log log;
     EXPECT_FALSE(record_run(*run, {})) << "nothing to join the record with";
     EXPECT_EQ(left(**agent), "0000000");
     add_log();

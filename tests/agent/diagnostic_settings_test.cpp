@@ -14,7 +14,7 @@ using Setting = VLNMPCA_DiagnosticSettingData;
 
 TEST_F(Diagnostic_Settings_Test, TheDumpTestSetsHowManyDumpsTheAdaptersKeep) {
     Loaded_Agent agent;
-    Log_Capture log;
+    Agent_Log log;
     Diagnostic_Settings_Provider provider;
     refreshes_started(*agent);
     settle(*agent);

@@ -3,11 +3,8 @@
 #include "classes/VLNMPCA_Product.h"
 #include "classes/VLNMPCA_StorageVolume.h"
 #include "derivedObjects/pattern.h"
-#include "foundation/host_paths.h"
 #include "tests/agent/agent_fixture.h"
 
-#include <filesystem>
-#include <fstream>
 #include <thread>
 
 namespace cimple {
@@ -16,17 +13,12 @@ namespace {
 
 using Lifecycle_Test = Agent_Test;
 
-std::string contents(Host_File file) {
-    std::ifstream stream(host_path(file));
-    return {std::istreambuf_iterator<char>(stream), {}};
-}
-
 } // namespace
 
 TEST_F(Lifecycle_Test, LoadFailsWithoutLibrariesAndNobodyHangs) {
     Fake_Library::present = false;
     {
-        Log_Capture log;
+        Agent_Log log;
         EXPECT_EQ(pattern_load(pattern_table[0]), 30);
         EXPECT_EQ(log.count(VLN_ERR, "Vorlan CIM Provider load failure"), 1);
     }
@@ -36,7 +28,7 @@ TEST_F(Lifecycle_Test, LoadFailsWithoutLibrariesAndNobodyHangs) {
     EXPECT_EQ(ProviderAgent::instance(), agent);
     EXPECT_FALSE(agent->m_bLibraryLoaded);
 
-    Log_Capture log;
+    Agent_Log log;
     EXPECT_EQ(count_instances(VLNMPCA_Card::static_meta_class), 0);
     EXPECT_EQ(log.count(VLN_DBG, "AX Init failed for VLNMPCA_Card_Provider.cpp"), 1);
     EXPECT_EQ(log.count(VLN_INFO, " Entering BuildCimpleInfo()"), 0);
@@ -54,22 +46,22 @@ TEST_F(Lifecycle_Test, LoadFailsWithoutLibrariesAndNobodyHangs) {
 
 TEST_F(Lifecycle_Test, LogSettingsAreSavedOnlyIfThereWereSome) {
     { Loaded_Agent agent; }
-    EXPECT_FALSE(std::filesystem::exists(host_path(Host_File::LOG_SETTINGS)));
-    EXPECT_TRUE(std::filesystem::exists(host_path(Host_File::FFDC_LOG)));
+    EXPECT_FALSE(exists(Host_File::LOG_SETTINGS));
+    EXPECT_TRUE(exists(Host_File::FFDC_LOG));
 
-    std::ofstream(host_path(Host_File::LOG_SETTINGS)) << "1,3,1\n";
+    write(Host_File::LOG_SETTINGS, "1,3,1\n");
     {
         Loaded_Agent agent;
         EXPECT_EQ(CLogger::instance().get_mode(), LOG_MODE_RING);
         CLogger::instance().set_level(5);
     }
-    EXPECT_EQ(contents(Host_File::LOG_SETTINGS).rfind("1,5,1\n", 0), 0u);
+    EXPECT_EQ(read(Host_File::LOG_SETTINGS).rfind("1,5,1\n", 0), 0u);
 }
 
 TEST_F(Lifecycle_Test, DestructionWaitsForARefreshAndStopsItsBuilding) {
     ASSERT_EQ(pattern_load(pattern_table[0]), 0);
     ProviderAgent* agent = ProviderAgent::current();
-    Log_Capture log;
+    Agent_Log log;
     Long_Operation operation(*agent); // the refresh comes as far as this
     agent->BuildCimpleInfo();
     std::thread releaser([agent] { pattern_unload(pattern_table[0]); });

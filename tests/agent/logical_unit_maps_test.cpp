@@ -40,7 +40,7 @@ TEST_F(Logical_Units_Test, APathNeedsItsEndsAndStandsOnce) {
     const auto device = maps.findOrMake(unit);
     Instance_Map_Base& paths = agent->store(STORE_VLNMPCA_SCSIInitiatorTargetTapeDrivePath);
 
-    Log_Capture log;
+    Agent_Log log;
     const auto join = [&](const Instance* from, const Instance* to) {
         return maps.joinPath({Unit_Transport::FC, from, to, "I:T"}, unit, device);
     };

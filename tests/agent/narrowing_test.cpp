@@ -126,7 +126,7 @@ TEST_F(Narrowing_Test, EverythingButTheCopyIsAsBefore) {
     const Enumeration_Focus focus = {Enumeration_Focus::KEYS, volume.get()};
     Receiver receiver = {focus};
     agent->m_bIsSANMapsReady = true; // a gate that is down would wait for a refresh
-    Log_Capture log;
+    Agent_Log log;
     pattern_enum_instances(pattern_table[PATTERN_VLNMPCA_StorageVolume],
                            {&Receiver::take, &receiver, &focus});
     EXPECT_EQ(log.count(VLN_DBG, "VLNMPCA_StorageVolume_Provider::enum_instances()"), 1);
@@ -152,7 +152,7 @@ TEST_F(Narrowing_Test, EqualKeysEmptyNarrowAnswersToo) {
         store.insert(physical<VLNMPCA_Card>(tag).release());
     change(store, 1, [](VLNMPCA_Card& card) { card.Tag.set("a"); });
     const auto wanted = physical<VLNMPCA_Card>("c");
-    Log_Capture log;
+    Agent_Log log;
     EXPECT_EQ(compare(PATTERN_VLNMPCA_Card, Enumeration_Focus::KEYS, wanted.get()), 0);
     EXPECT_EQ(log.count(VLN_CRIT, "Insert failed for 1"), 2) << "once for each enumeration";
 }

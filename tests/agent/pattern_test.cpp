@@ -127,7 +127,7 @@ TEST_F(Pattern_Test, ExceptionsEndInTheGuardOfTheShape) {
         {pattern_id<VLNMPCA_Card>, "Exception in Active CIM Provider Enumeration - do nothing"},
     };
     for (const auto& row : rows) {
-        Log_Capture log;
+        Agent_Log log;
         EXPECT_EQ(pattern_enum_instances(pattern_table[row.id], {&refuse, nullptr}), 0);
         EXPECT_EQ(log.count(VLN_CRIT, row.line), 1);
         EXPECT_EQ(count_instances(*pattern_table[row.id].meta_class), 1) << "a lock is still held";

@@ -55,8 +55,9 @@ bool Foundation_Test::exists(Host_File file) {
     return std::filesystem::exists(host_path(file));
 }
 
-bool Log_Capture::has(sint32 level, const std::string& text) const {
-    return std::find(lines.begin(), lines.end(), std::make_pair(level, text)) != lines.end();
+int Log_Capture::count(sint32 level, const std::string& text) const {
+    const std::lock_guard guard(_lock);
+    return static_cast<int>(std::count(lines.begin(), lines.end(), std::make_pair(level, text)));
 }
 
 } // namespace cimple

@@ -6,6 +6,7 @@
 #include "foundation/logger.h"
 
 #include <gtest/gtest.h>
+#include <mutex>
 #include <string>
 #include <utility>
 #include <vector>
@@ -31,17 +32,23 @@ public:
     ~Log_Capture() override { CLogger::instance().remove_logger(this); }
 
     void log(sint32 level, const char*, uint32, const char* text) override {
+        const std::lock_guard guard(_lock);
         lines.emplace_back(level, text);
     }
     void open() override { ++opened; }
     void close() override { ++closed; }
     void clear() override { lines.clear(); }
 
-    bool has(sint32 level, const std::string& text) const;
+    // How often the text was logged at the level, as the whole line.
+    int count(sint32 level, const std::string& text) const;
+    bool has(sint32 level, const std::string& text) const { return count(level, text) > 0; }
 
     std::vector<std::pair<sint32, std::string>> lines;
     int opened = 0;
     int closed = 0;
+
+private:
+    mutable std::mutex _lock; // others may still be logging while a test counts
 };
 
 } // namespace cimple

@@ -1,62 +1,21 @@
-// The generated tables as the engine sees them, over every class of the catalogue.
+// How the generated tables hang together, over every class of the catalogue. What is in them, the
+// table of the catalogue tells.
 #include "cimple/instance.h"
-#include "classes/VLNMPCA_Card.h"
-#include "classes/VLNMPCA_ConcreteJob.h"
 #include "meta_repository.h"
 
 #include <gtest/gtest.h>
 
-#include <cstring>
-#include <map>
-#include <string>
-
 using namespace cimple;
 
 namespace {
-
-// Bytes of a feature's member, 0 for a method, which has none.
-uint32 member_size(const Meta_Feature* feature) {
-    if (feature->flags & FLAG_METHOD)
-        return 0;
-    if (feature->flags & FLAG_REFERENCE) {
-        const bool array = static_cast<const Meta_Reference*>(feature)->subscript != 0;
-        return static_cast<uint32>(array ? sizeof(void*) + 1 : sizeof(void*));
-    }
-    const auto* property = static_cast<const Meta_Property*>(feature);
-    return (property->subscript ? static_cast<uint32>(sizeof(void*)) : type_size(property->type)) +
-           1;
-}
 
 uint32 member_offset(const Meta_Feature* feature) {
     return feature->flags & FLAG_REFERENCE ? static_cast<const Meta_Reference*>(feature)->offset
                                            : static_cast<const Meta_Property*>(feature)->offset;
 }
 
-// Members lie behind the head, inside the structure, and apart from one another.
-void check_layout(const Meta_Features& owner, const std::string& name) {
-    EXPECT_EQ(owner.refs.load(), 0u) << name;
-    std::map<uint32, uint32> members;
-    for (uint32 i = 0; i < owner.num_meta_features; i++) {
-        const Meta_Feature* feature = owner.meta_features[i];
-        const uint32 kind = feature->flags & FLAG_FEATURE;
-        ASSERT_TRUE(kind && (kind & (kind - 1)) == 0) << name << "." << feature->name;
-        EXPECT_EQ(feature->refs.load(), 0u);
-        if (kind == FLAG_METHOD)
-            continue;
-        EXPECT_TRUE(members.emplace(member_offset(feature), member_size(feature)).second)
-            << name << "." << feature->name;
-    }
-    uint32 end = sizeof(Instance);
-    for (const auto& [offset, size] : members) {
-        EXPECT_GE(offset, end) << name;
-        end = offset + size;
-    }
-    EXPECT_LE(end, owner.size) << name;
-}
-
 void check_method(const Meta_Method& method) {
     ASSERT_GT(method.num_meta_features, 0u) << method.name;
-    check_layout(method, method.name);
     const Meta_Feature* last = method.meta_features[method.num_meta_features - 1];
     EXPECT_STREQ(last->name, "return_value");
     EXPECT_EQ(last->flags, FLAG_PROPERTY | FLAG_OUT);
@@ -94,7 +53,6 @@ TEST(MetaTables, EveryClassIsConsistent) {
         EXPECT_EQ(meta_class.meta_repository, &meta_repository);
         EXPECT_EQ(!(meta_class.flags & FLAG_CLASS), !!(meta_class.flags & FLAG_ASSOCIATION))
             << meta_class.name;
-        check_layout(meta_class, meta_class.name);
         check_inheritance(meta_class);
         uint32 keys = 0;
         for (uint32 j = 0; j < meta_class.num_meta_features; j++) {
@@ -110,41 +68,6 @@ TEST(MetaTables, EveryClassIsConsistent) {
         }
         EXPECT_EQ(keys, meta_class.num_keys) << meta_class.name;
     }
-}
-
-TEST(MetaTables, EveryClassLivesADay) {
-    for (uint32 i = 0; i < meta_repository.num_meta_classes; i++) {
-        const Meta_Class* meta_class = meta_repository.meta_classes[i];
-        for (bool defaults : {false, true}) {
-            Instance* instance = create(meta_class, defaults);
-            ASSERT_NE(instance, nullptr) << meta_class->name;
-            Instance* copy = clone(instance);
-            EXPECT_TRUE(identical(instance, copy)) << meta_class->name;
-            destroy(instance);
-            destroy(copy);
-        }
-        for (uint32 j = 0; j < meta_class->num_meta_features; j++) {
-            const Meta_Feature* feature = meta_class->meta_features[j];
-            if (!(feature->flags & FLAG_METHOD))
-                continue;
-            // A method instance is made as a class instance is.
-            const auto* method = static_cast<const Meta_Method*>(feature);
-            destroy(create(reinterpret_cast<const Meta_Class*>(method), true));
-        }
-    }
-}
-
-// The table of the catalogue tells what the records say; this, that a structure's members are where
-// they say.
-TEST(MetaTables, StructuresAndRecordsAgree) {
-    const Meta_Property* temperature =
-        find_property(&VLNMPCA_Card::static_meta_class, "boardtemperature");
-    ASSERT_NE(temperature, nullptr);
-    Ref<VLNMPCA_Card> card(create<VLNMPCA_Card>());
-    card->BoardTemperature.set(-7);
-    EXPECT_EQ(*static_cast<const sint32*>(member(card.get(), temperature->offset)), -7);
-    Ref<VLNMPCA_ConcreteJob> job(create<VLNMPCA_ConcreteJob>(true));
-    EXPECT_STREQ(job->TimeBeforeRemoval.value.ascii().c_str(), "00000000000500.000000:000");
 }
 
 } // namespace

@@ -2,37 +2,11 @@
 
 #include "tools/mpcactl/assignment.h"
 
-#include <algorithm>
 #include <fstream>
 #include <sstream>
 #include <utility>
 
 namespace hostile {
-
-namespace {
-
-// The instance that CLASS or CLASS#NUMBER names.
-host::Instance find_instance(road::Road& road, const std::string& text) {
-    const std::size_t mark = std::min(text.find('#'), text.size());
-    const std::size_t number = mark < text.size() ? std::stoul(text.substr(mark + 1)) : 1;
-    std::vector<host::Instance> all = road.enumerate(text.substr(0, mark));
-    return number > all.size() ? throw std::runtime_error("no " + text)
-                               : std::move(all[number - 1]);
-}
-
-// With what stands for <CLASS> and for <>.
-std::string filled_in(road::Road& road, const std::string& text) {
-    const std::size_t begin = text.find('<'), end = text.find('>');
-    if (begin == std::string::npos || end == std::string::npos)
-        return text;
-    const std::string name = text.substr(begin + 1, end - begin - 1);
-    return text.substr(0, begin) +
-           (name.empty() ? road.root().string()
-                         : host::path_to_text(find_instance(road, name).path, "")) +
-           text.substr(end + 1);
-}
-
-} // namespace
 
 std::vector<Change> read_changes() {
     std::vector<Change> changes, before;
@@ -69,12 +43,12 @@ Prepared_Change::Prepared_Change(road::Road& road, const Change& change) : _road
     if (_kind == '+')
         _instance.path.class_name = what;
     else
-        _instance = find_instance(road, what.substr(0, dot));
+        _instance = road::instance_of(road, what.substr(0, dot));
     const host::ClassRepository& classes = road.manager().classes();
     const host::Class* known = classes.find(_instance.path.class_name);
     std::vector<std::string> values;
     for (const std::string& value : change.values)
-        values.push_back(filled_in(road, value));
+        values.push_back(road::filled_in(road, value));
     if (dot == std::string::npos) {
         _values = mpcactl::read_properties(classes, *known, values, "root/vorlan");
         return;

@@ -3,6 +3,7 @@
 #include "host/path_text.h"
 
 #include <fstream>
+#include <regex>
 #include <sstream>
 #include <thread>
 
@@ -179,6 +180,34 @@ std::string text_of(const host::Instance& instance, const std::string& property)
                                             : host::scalar_to_text(element, "root/vorlan");
     }
     return text + "}";
+}
+
+host::Instance instance_of(Road& road, const std::string& text) {
+    static const std::regex form(R"((\w+)(#(\d+))?(\[(\w+)=([^\]]*)\])?(!(\w+)=(.*))?)");
+    std::smatch parts;
+    if (!std::regex_match(text, parts, form))
+        throw std::runtime_error("no name of an instance: " + text);
+    std::size_t number = parts[3].matched ? std::stoul(parts[3]) : 1;
+    for (host::Instance& instance : road.enumerate(parts[1])) {
+        if ((parts[4].matched && text_of(instance, parts[5]) != parts[6]) || --number != 0)
+            continue;
+        if (parts[7].matched)
+            for (host::Named_Values* values : {&instance.path.keys, &instance.properties})
+                host::set(*values, parts[8].str(), host::Value::text(parts[9]));
+        return std::move(instance);
+    }
+    throw std::runtime_error("no " + text);
+}
+
+std::string filled_in(Road& road, const std::string& text) {
+    const std::size_t begin = text.find('<'), end = text.find('>', begin);
+    if (begin == std::string::npos || end == std::string::npos)
+        return text;
+    const std::string name = text.substr(begin + 1, end - begin - 1);
+    return text.substr(0, begin) +
+           (name.empty() ? road.root().string()
+                         : host::path_to_text(instance_of(road, name).path, "")) +
+           text.substr(end + 1);
 }
 
 } // namespace road

@@ -60,6 +60,14 @@ private:
 // A property as text: numbers in decimal, arrays in braces, "-" for null or not set.
 std::string text_of(const host::Instance& instance, const std::string& property);
 
+// The instance that a text names: the first of "CLASS", the second of "CLASS#2", the first whose
+// property is so, as text_of gives it, of "CLASS[PROPERTY=TEXT]"; and each of them under another
+// name, "CLASS!KEY=TEXT". Throws if there is none.
+host::Instance instance_of(Road& road, const std::string& text);
+// The text with the path of the instance that "<CLASS...>" names, and the folder of the host's root
+// for "<>".
+std::string filled_in(Road& road, const std::string& text);
+
 } // namespace road
 
 #endif // TESTS_ROAD_ROAD_H

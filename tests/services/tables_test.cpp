@@ -1,0 +1,266 @@
+// Plays the tables of the services: each test is a client that does one row after the other to a
+// host of its own, and compares what it is answered, what the log says meanwhile and what is shown.
+//
+//     call INSTANCE METHOD INPUT=VALUE... -> 32968 OUTPUT=TEXT   returns 0 without an arrow
+//     change INSTANCE PROPERTY=VALUE... -> FAILED                OK without an arrow; of the
+//     create CLASS PROPERTY=VALUE... -> FAILED                       names of statuses, what
+//     delete INSTANCE -> NOT_FOUND                                   tells them apart
+//     refresh                       the data are too old: new ones
+//     show INSTANCE PROPERTY=TEXT   what is shown, as text_of gives it
+//     list CLASS PROPERTY -> TEXTS  of all instances
+//     count CLASS -> 3              instances
+//     walk INSTANCE ASSOCIATION -> 2
+//     log -> 1 | LINE               as often in the whole log
+//     calls FUNCTION -> 1           of the library
+//     set WWN TABLE NAME VALUE      of the running host
+//     fault FUNCTION STATUS [NTH]   from now on, until "clear"
+//     advance SECONDS, reboot, forget (the calls that were counted)
+//
+// Behind the first five, lines stand that are logged meanwhile; "~ " before one: that are not, and
+// "> ": that tell a call of the library. Among their words, !FUNCTION=STATUS has the function's
+// next call fail, !FUNCTION=STATUS@2 the one after it. Values are as on mpcactl's command line,
+// and instances as road::instance_of has them.
+#include "tests/road/properties.h"
+#include "tests/services/table_text.h"
+#include "tools/mpcactl/assignment.h"
+
+#include <cmath>
+
+using road::Road;
+using services::Row;
+using services::Table;
+
+namespace {
+
+constexpr std::uint64_t STALE = 11ull * 60 * 1000000; // beyond the cache time-out
+
+std::string joined(const std::vector<std::string>& words) {
+    std::string text;
+    for (const std::string& word : words)
+        text += (text.empty() ? "" : " ") + word;
+    return text;
+}
+
+// "CMPI_RC_ERR_FAILED" is FAILED.
+std::string word_of(const host::Status& status) {
+    const std::string name = host::rc_name(status.rc).substr(std::string("CMPI_RC_").size());
+    return name.starts_with("ERR_") ? name.substr(4) : name;
+}
+
+class Player {
+public:
+    explicit Player(const std::string& host) : _road({.scenario = host, .log = true}) {}
+
+    void play(const Row& row) {
+        SCOPED_TRACE(row.place + ": " + row.verb + " " + joined(row.words));
+        try {
+            if (!prepare(row))
+                look(row);
+        } catch (const std::exception& error) {
+            ADD_FAILURE() << error.what();
+        }
+    }
+
+private:
+    const std::string& word(const Row& row, std::size_t i) { return row.words.at(i); }
+
+    // What begins before the host's first look at its adapters, and what it needs not be asked for.
+    bool prepare(const Row& row) {
+        if (row.verb == "set") {
+            road::set_value(word(row, 0).c_str(), word(row, 1).c_str(), word(row, 2).c_str(),
+                            word(row, 3).c_str());
+            return true;
+        }
+        if (row.verb == "fault") {
+            vlnsim_fault(word(row, 0).c_str(),
+                         row.words.size() > 2 ? static_cast<unsigned>(std::stoul(word(row, 2))) : 0,
+                         VLNSIM_STATUS, std::stoul(word(row, 1)));
+            return true;
+        }
+        if (_refreshes == 0) {
+            _road.enumerate("VLNMPCA_Card");
+            _road.wait_for_refreshes(++_refreshes);
+        }
+        if (row.verb == "clear")
+            vlnsim_clear_faults();
+        else if (row.verb == "reboot")
+            vlnsim_reboot();
+        else if (row.verb == "forget")
+            vlnsim_clear_calls();
+        else if (row.verb == "advance")
+            vlnsim_advance(static_cast<std::uint64_t>(std::llround(std::stod(word(row, 0)) * 1e6)));
+        else
+            return false;
+        return true;
+    }
+
+    void look(const Row& row) {
+        const std::string answer = joined(row.answer);
+        if (row.verb == "show")
+            expect_properties(road::instance_of(_road, word(row, 0)), row.words, 1);
+        else if (row.verb == "count")
+            EXPECT_EQ(std::to_string(_road.enumerate(word(row, 0)).size()), answer);
+        else if (row.verb == "list")
+            EXPECT_EQ(texts_of(word(row, 0), word(row, 1)), answer);
+        else if (row.verb == "walk")
+            EXPECT_EQ(std::to_string(road::walk(_road, road::instance_of(_road, word(row, 0)),
+                                                word(row, 1).c_str())
+                                         .size()),
+                      answer);
+        else if (row.verb == "log")
+            EXPECT_EQ(std::to_string(_road.count_in_log(row.lines.at(0))), answer)
+                << row.lines.at(0);
+        else if (row.verb == "calls")
+            EXPECT_EQ(std::to_string(vlnsim_calls(word(row, 0).c_str())), answer);
+        else
+            operate(row);
+    }
+
+    static void expect_properties(const host::Instance& instance,
+                                  const std::vector<std::string>& texts, std::size_t from) {
+        for (std::size_t i = from; i < texts.size(); ++i) {
+            const std::size_t equals = texts[i].find('=');
+            EXPECT_EQ(road::text_of(instance, texts[i].substr(0, equals)),
+                      texts[i].substr(equals + 1))
+                << texts[i];
+        }
+    }
+
+    std::string texts_of(const std::string& class_name, const std::string& property) {
+        std::vector<std::string> texts;
+        for (const host::Instance& each : _road.enumerate(class_name))
+            texts.push_back(road::text_of(each, property));
+        return joined(texts);
+    }
+
+    // ---- What changes something, or may ----
+
+    void operate(const Row& row) {
+        const std::function<std::string()> make = operation(row);
+        const bool is_recorded = !row.lines.empty() && row.lines.back().starts_with("> ");
+        arm(row);
+        const std::size_t before = _road.log_text().size();
+        vlnsim_record_calls(is_recorded);
+        const std::string answer = make();
+        vlnsim_record_calls(0);
+        const std::string log = _road.log_text().substr(before);
+        if (row.verb != "refresh") {
+            EXPECT_EQ(answer, row.is_answered      ? row.answer.at(0)
+                              : row.verb == "call" ? "0"
+                                                   : "OK")
+                << log;
+            expect_properties(_outputs, row.answer, row.is_answered);
+        }
+        for (const std::string& line : row.lines)
+            expect_line(line, log);
+        if (_is_armed)
+            vlnsim_clear_faults();
+        if (is_recorded)
+            vlnsim_clear_calls();
+    }
+
+    // The words that give a value.
+    std::vector<std::string> values_of(const Row& row, std::size_t from) {
+        std::vector<std::string> values;
+        for (std::size_t i = from; i < row.words.size(); ++i)
+            if (!row.words[i].starts_with('!'))
+                values.push_back(road::filled_in(_road, row.words[i]));
+        return values;
+    }
+
+    void arm(const Row& row) {
+        _is_armed = false;
+        for (const std::string& each : row.words) {
+            if (!each.starts_with('!'))
+                continue;
+            const std::size_t equals = each.find('='), at = each.find('@');
+            const unsigned long nth = at == each.npos ? 1 : std::stoul(each.substr(at + 1));
+            vlnsim_fault(each.substr(1, equals - 1).c_str(), static_cast<unsigned>(nth),
+                         VLNSIM_STATUS, std::stoul(each.substr(equals + 1)));
+            _is_armed = true;
+        }
+    }
+
+    std::function<std::string()> operation(const Row& row) {
+        _outputs = {};
+        host::Manager& manager = _road.manager();
+        const host::ClassRepository& classes = manager.classes();
+        if (row.verb == "refresh")
+            return [this] { return refresh(); };
+        host::Instance instance;
+        if (row.verb == "create")
+            instance.path.class_name = word(row, 0);
+        else
+            instance = road::instance_of(_road, word(row, 0));
+        const host::Class& known = *classes.find(instance.path.class_name);
+        if (row.verb == "delete")
+            return [&manager, instance] { return word_of(manager.remove(instance.path)); };
+        if (row.verb == "call") {
+            const host::Method* method = known.find_method(word(row, 1));
+            if (!method)
+                throw std::runtime_error("no method " + word(row, 1));
+            const auto inputs =
+                mpcactl::read_inputs(classes, *method, values_of(row, 2), "root/vorlan");
+            return [=, this] { return called(instance.path, method->name, inputs); };
+        }
+        const bool is_created = row.verb == "create";
+        if (!is_created && row.verb != "change")
+            throw std::runtime_error("no verb");
+        std::vector<std::string> names;
+        for (const host::Named_Value& each :
+             mpcactl::read_properties(classes, known, values_of(row, 1), "root/vorlan")) {
+            host::set(instance.properties, each.name, each.value);
+            names.push_back(each.name);
+        }
+        return [=, &manager] {
+            return word_of(is_created ? manager.create(instance).status
+                                      : manager.modify(instance, names));
+        };
+    }
+
+    std::string called(const host::ObjectPath& path, const std::string& method,
+                       const host::Named_Values& inputs) {
+        const auto reply = _road.manager().invoke(path, method, inputs);
+        _outputs.properties = reply.value.outputs;
+        return reply.ok() ? std::to_string(reply.value.value.as_unsigned()) : word_of(reply.status);
+    }
+
+    std::string refresh() {
+        vlnsim_advance(STALE);
+        _road.enumerate("VLNMPCA_Card"); // starts it, and may see it already
+        _road.wait_for_refreshes(++_refreshes);
+        return "";
+    }
+
+    static void expect_line(const std::string& line, const std::string& log) {
+        if (line.starts_with("~ ")) {
+            EXPECT_EQ(log.find(line.substr(2)), std::string::npos) << line;
+        } else if (line.starts_with("> ")) {
+            std::string calls;
+            char text[512] = "";
+            for (std::size_t i = 0; vlnsim_recorded_call(i, text, sizeof text) == 0; ++i)
+                calls += std::string(text) + "\n";
+            EXPECT_NE(calls.find(line.substr(2)), std::string::npos) << line << "\n" << calls;
+        } else {
+            EXPECT_NE(log.find(line), std::string::npos) << line << "\n" << log;
+        }
+    }
+
+    Road _road;
+    std::size_t _refreshes = 0;
+    host::Instance _outputs; // of the last call, as properties
+    bool _is_armed = false;  // by the row that is played
+};
+
+class Tables : public testing::TestWithParam<Table> {};
+
+TEST_P(Tables, ArePlayed) {
+    Player player(GetParam().host);
+    for (const Row& row : GetParam().rows)
+        player.play(row);
+}
+
+INSTANTIATE_TEST_SUITE_P(Services, Tables, testing::ValuesIn(services::read_tables(VLN_TABLES)),
+                         [](const auto& info) { return info.param.name; });
+
+} // namespace

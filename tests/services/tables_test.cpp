@@ -6,6 +6,7 @@
 //     create CLASS PROPERTY=VALUE... -> FAILED                       names of statuses, what
 //     delete INSTANCE -> NOT_FOUND                                   tells them apart
 //     refresh                       the data are too old: new ones
+//     look CLASS                    there are instances
 //     show INSTANCE PROPERTY=TEXT   what is shown, as text_of gives it
 //     list CLASS PROPERTY -> TEXTS  of all instances
 //     count CLASS -> 3              instances
@@ -14,25 +15,29 @@
 //     calls FUNCTION -> 1           of the library
 //     set WWN TABLE NAME VALUE      of the running host
 //     fault FUNCTION STATUS [NTH]   from now on, until "clear"
+//     write FILE TEXT               below the host's root
+//     hold FUNCTION, held           its next call stands still, until "clear"; and now it does
+//     meanwhile ROW, begin, join    another client is to do it; all such begin; they are done
+//     wait                          for a refresh that something else has asked for
 //     advance SECONDS, reboot, forget (the calls that were counted)
 //
-// Behind the first five, lines stand that are logged meanwhile; "~ " before one: that are not, and
+// Behind the first six, lines stand that are logged meanwhile; "~ " before one: that are not, and
 // "> ": that tell a call of the library. Among their words, !FUNCTION=STATUS has the function's
 // next call fail, !FUNCTION=STATUS@2 the one after it. Values are as on mpcactl's command line,
 // and instances as road::instance_of has them.
+#include "tests/hostile/sudden_ends.h"
 #include "tests/road/properties.h"
 #include "tests/services/table_text.h"
 #include "tools/mpcactl/assignment.h"
 
 #include <cmath>
+#include <fstream>
 
 using road::Road;
 using services::Row;
 using services::Table;
 
 namespace {
-
-constexpr std::uint64_t STALE = 11ull * 60 * 1000000; // beyond the cache time-out
 
 std::string joined(const std::vector<std::string>& words) {
     std::string text;
@@ -46,6 +51,12 @@ std::string word_of(const host::Status& status) {
     const std::string name = host::rc_name(status.rc).substr(std::string("CMPI_RC_").size());
     return name.starts_with("ERR_") ? name.substr(4) : name;
 }
+
+struct Answer {
+    std::string word;
+    host::Named_Values outputs = {};
+};
+using Operation = std::function<Answer()>;
 
 class Player {
 public:
@@ -81,12 +92,26 @@ private:
             _road.enumerate("VLNMPCA_Card");
             _road.wait_for_refreshes(++_refreshes);
         }
-        if (row.verb == "clear")
+        if (row.verb == "write")
+            std::ofstream(_road.root() / word(row, 0)) << word(row, 1);
+        else if (row.verb == "clear")
             vlnsim_clear_faults();
         else if (row.verb == "reboot")
             vlnsim_reboot();
         else if (row.verb == "forget")
             vlnsim_clear_calls();
+        else if (row.verb == "hold")
+            sudden_ends::hold(word(row, 0).c_str());
+        else if (row.verb == "held")
+            sudden_ends::wait_until_held();
+        else if (row.verb == "meanwhile")
+            prepare_client(row);
+        else if (row.verb == "begin")
+            begin();
+        else if (row.verb == "join")
+            join();
+        else if (row.verb == "wait")
+            _road.wait_for_refreshes(++_refreshes);
         else if (row.verb == "advance")
             vlnsim_advance(static_cast<std::uint64_t>(std::llround(std::stod(word(row, 0)) * 1e6)));
         else
@@ -136,27 +161,55 @@ private:
     // ---- What changes something, or may ----
 
     void operate(const Row& row) {
-        const std::function<std::string()> make = operation(row);
+        const Operation make = operation(row);
         const bool is_recorded = !row.lines.empty() && row.lines.back().starts_with("> ");
-        arm(row);
+        const bool is_armed = arm(row);
         const std::size_t before = _road.log_text().size();
         vlnsim_record_calls(is_recorded);
-        const std::string answer = make();
+        const Answer answer = make();
         vlnsim_record_calls(0);
-        const std::string log = _road.log_text().substr(before);
-        if (row.verb != "refresh") {
-            EXPECT_EQ(answer, row.is_answered      ? row.answer.at(0)
-                              : row.verb == "call" ? "0"
-                                                   : "OK")
-                << log;
-            expect_properties(_outputs, row.answer, row.is_answered);
-        }
-        for (const std::string& line : row.lines)
-            expect_line(line, log);
-        if (_is_armed)
+        expect_answer(row, answer, before);
+        if (is_armed)
             vlnsim_clear_faults();
         if (is_recorded)
             vlnsim_clear_calls();
+    }
+
+    void expect_answer(const Row& row, const Answer& answer, std::size_t before) {
+        const std::string log = _road.log_text().substr(before);
+        EXPECT_EQ(answer.word, row.is_answered      ? row.answer.at(0)
+                               : row.verb == "call" ? "0"
+                                                    : "OK")
+            << log;
+        host::Instance outputs;
+        outputs.properties = answer.outputs;
+        expect_properties(outputs, row.answer, row.is_answered);
+        for (const std::string& line : row.lines)
+            expect_line(line, log);
+    }
+
+    // What the operation needs is found now: nobody may be able to ask when it begins.
+    void prepare_client(Row row) {
+        row.verb = word(row, 0);
+        row.words.erase(row.words.begin());
+        _prepared.emplace_back([=, this, make = operation(row)] {
+            SCOPED_TRACE(row.place);
+            const std::size_t before = _road.log_text().size();
+            const Answer answer = make();
+            expect_answer(row, answer, before);
+        });
+    }
+
+    void begin() {
+        for (std::function<void()>& client : _prepared)
+            _clients.emplace_back(std::move(client));
+        _prepared.clear();
+    }
+
+    void join() {
+        for (std::thread& client : _clients)
+            client.join();
+        _clients.clear();
     }
 
     // The words that give a value.
@@ -168,8 +221,8 @@ private:
         return values;
     }
 
-    void arm(const Row& row) {
-        _is_armed = false;
+    static bool arm(const Row& row) {
+        bool is_armed = false;
         for (const std::string& each : row.words) {
             if (!each.starts_with('!'))
                 continue;
@@ -177,16 +230,20 @@ private:
             const unsigned long nth = at == each.npos ? 1 : std::stoul(each.substr(at + 1));
             vlnsim_fault(each.substr(1, equals - 1).c_str(), static_cast<unsigned>(nth),
                          VLNSIM_STATUS, std::stoul(each.substr(equals + 1)));
-            _is_armed = true;
+            is_armed = true;
         }
+        return is_armed;
     }
 
-    std::function<std::string()> operation(const Row& row) {
-        _outputs = {};
+    Operation operation(const Row& row) {
         host::Manager& manager = _road.manager();
         const host::ClassRepository& classes = manager.classes();
         if (row.verb == "refresh")
             return [this] { return refresh(); };
+        if (row.verb == "look")
+            return [this, name = word(row, 0)] {
+                return Answer{_road.enumerate(name).empty() ? "nothing" : "OK"};
+            };
         host::Instance instance;
         if (row.verb == "create")
             instance.path.class_name = word(row, 0);
@@ -194,7 +251,7 @@ private:
             instance = road::instance_of(_road, word(row, 0));
         const host::Class& known = *classes.find(instance.path.class_name);
         if (row.verb == "delete")
-            return [&manager, instance] { return word_of(manager.remove(instance.path)); };
+            return [&manager, instance] { return Answer{word_of(manager.remove(instance.path))}; };
         if (row.verb == "call") {
             const host::Method* method = known.find_method(word(row, 1));
             if (!method)
@@ -213,23 +270,24 @@ private:
             names.push_back(each.name);
         }
         return [=, &manager] {
-            return word_of(is_created ? manager.create(instance).status
-                                      : manager.modify(instance, names));
+            return Answer{word_of(is_created ? manager.create(instance).status
+                                             : manager.modify(instance, names))};
         };
     }
 
-    std::string called(const host::ObjectPath& path, const std::string& method,
-                       const host::Named_Values& inputs) {
+    Answer called(const host::ObjectPath& path, const std::string& method,
+                  const host::Named_Values& inputs) {
         const auto reply = _road.manager().invoke(path, method, inputs);
-        _outputs.properties = reply.value.outputs;
-        return reply.ok() ? std::to_string(reply.value.value.as_unsigned()) : word_of(reply.status);
+        return {reply.ok() ? std::to_string(reply.value.value.as_unsigned())
+                           : word_of(reply.status),
+                reply.value.outputs};
     }
 
-    std::string refresh() {
-        vlnsim_advance(STALE);
+    Answer refresh() {
+        vlnsim_advance(sudden_ends::STALE);
         _road.enumerate("VLNMPCA_Card"); // starts it, and may see it already
         _road.wait_for_refreshes(++_refreshes);
-        return "";
+        return {"OK"};
     }
 
     static void expect_line(const std::string& line, const std::string& log) {
@@ -248,8 +306,8 @@ private:
 
     Road _road;
     std::size_t _refreshes = 0;
-    host::Instance _outputs; // of the last call, as properties
-    bool _is_armed = false;  // by the row that is played
+    std::vector<std::function<void()>> _prepared;
+    std::vector<std::thread> _clients;
 };
 
 class Tables : public testing::TestWithParam<Table> {};

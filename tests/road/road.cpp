@@ -193,7 +193,8 @@ host::Instance instance_of(Road& road, const std::string& text) {
             continue;
         if (parts[7].matched)
             for (host::Named_Values* values : {&instance.path.keys, &instance.properties})
-                host::set(*values, parts[8].str(), host::Value::text(parts[9]));
+                if (host::find(*values, parts[8].str()))
+                    host::set(*values, parts[8].str(), host::Value::text(parts[9]));
         return std::move(instance);
     }
     throw std::runtime_error("no " + text);

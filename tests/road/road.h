@@ -61,8 +61,8 @@ private:
 std::string text_of(const host::Instance& instance, const std::string& property);
 
 // The instance that a text names: the first of "CLASS", the second of "CLASS#2", the first whose
-// property is so, as text_of gives it, of "CLASS[PROPERTY=TEXT]"; and each of them under another
-// name, "CLASS!KEY=TEXT". Throws if there is none.
+// property is so, as text_of gives it, of "CLASS[PROPERTY=TEXT]"; and each of them with another
+// text, "CLASS!PROPERTY=TEXT". Throws if there is none.
 host::Instance instance_of(Road& road, const std::string& text);
 // The text with the path of the instance that "<CLASS...>" names, and the folder of the host's root
 // for "<>".

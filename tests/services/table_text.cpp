@@ -43,13 +43,15 @@ std::string filled_in(const std::string& text, const Words& known) {
 std::vector<std::string> words_of(const std::string& text) {
     std::vector<std::string> words;
     bool quoted = false, within = false;
-    for (const char c : text) {
-        if (c == '"')
-            quoted = !quoted;
-        const bool blank = !quoted && (c == ' ' || c == '\n');
+    for (std::size_t i = 0; i < text.size(); ++i) {
+        const bool escaped = text[i] == '\\' && text.substr(i + 1, 1) == "\"";
+        const char c = escaped ? text[++i] : text[i];
+        const bool quotes = c == '"' && !escaped;
+        quoted ^= quotes;
+        const bool blank = !quoted && c == ' ';
         if (!blank && !within)
             words.emplace_back();
-        if (!blank && c != '"')
+        if (!blank && !quotes)
             words.back() += c;
         within = !blank;
     }

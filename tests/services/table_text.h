@@ -26,10 +26,10 @@ struct Table {
 // All of the folder, in the order of their names.
 //
 // A line is a row; one that begins with a blank goes on with the row before it, and "#" begins a
-// remark. Blanks separate words, but within double quotes, which are left out. "host" and what
-// follows it is the host of the tests from there on: a scenario, or a JSON text, where $SCENARIOS
-// is their folder. "test NAME" begins a test. "let NAME TEXT" has $NAME stand for the text, to the
-// end of the file. {TEXT*3} is the text three times.
+// remark. Blanks separate words, but within double quotes, which are left out unless "\" stands
+// before them. "host" and what follows it is the host of the tests from there on: a scenario, or a
+// JSON text, where $SCENARIOS is their folder. "test NAME" begins a test. "let NAME TEXT" has $NAME
+// stand for the text, to the end of the file. {TEXT*3} is the text three times.
 std::vector<Table> read_tables(const std::string& folder);
 
 } // namespace services

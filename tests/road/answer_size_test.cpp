@@ -1,4 +1,5 @@
 // Answers over 4,096 units, in an object manager that sends no more than 10 MB at once.
+#include "tests/road/hosts.h"
 #include "tests/road/road.h"
 
 using road::Road;
@@ -26,6 +27,21 @@ TEST(Answer_Size, EveryClassCanBeSentAndSoCanWhatOneAssociationLeadsTo) {
     EXPECT_EQ(manager.associators(port, {path, "VLNMPCA_StorageVolume", "", ""}).value.size(),
               640u);
     EXPECT_EQ(manager.references(port, {path, "", "", ""}).value.size(), 640u);
+}
+
+// What is made while answering is given back as it is handed over.
+TEST(Answer_Size, ALargeAnswerHoldsNoMoreObjectsThanASmallOne) {
+    Road road({.scenario = road::card(R"({"use": "nic"}, {"use": "fcoe",
+        "targets": {"luns": 200, "wwpn": "50:25:64:C0:00:00:00:01"}})")});
+    EXPECT_EQ(road.enumerate("VLNMPCA_StorageVolume").size(), 200u);
+    host::Manager& manager = road.manager();
+    manager.restart_peak();
+    EXPECT_EQ(manager.enumerate_names("VLNMPCA_StorageVolume").value.size(), 200u);
+    EXPECT_EQ(road.enumerate("VLNMPCA_StorageVolume").size(), 200u);
+    const auto initiators = road.enumerate("VLNMPCA_SCSIProtocolEndpoint");
+    ASSERT_FALSE(initiators.empty());
+    EXPECT_GE(manager.associators(initiators[0].path).value.size(), 200u);
+    EXPECT_LT(manager.statistics().objects_peak, 50u);
 }
 
 } // namespace

@@ -1,87 +1,36 @@
-// What a client sees of the host's IP interfaces on the NIC ports.
+// IP endpoints of NIC and iSCSI ports where they are not as on every host (shown/two-port-cna.md).
+#include "tests/road/hosts.h"
 #include "tests/road/properties.h"
 
+using road::expect_counts;
+using road::expect_lines;
 using road::expect_properties;
 using road::Road;
 using road::text_of;
 
 namespace {
 
-void set_port(const char* wwn, const char* name, const char* value) {
-    char error[128] = "";
-    EXPECT_EQ(vlnsim_set_value(wwn, "portAttributes", name, value, error, sizeof error), 0)
-        << error;
-}
-
 constexpr char FIRST[] = "100002564C000000";
 
-// The card without its iSCSI functions, whose stacks are their own.
-constexpr char TWO_NICS[] = R"({"include": ")" VLN_SCENARIOS R"(/parts/cna.json",
-    "cards": [{"use": "cna", "ports": 2, "functions": [{"use": "nic"}]}]})";
+// Two ports whose NICs alone have a stack, that of the kernel.
+const std::string TWO_NICS = road::card(R"({"use": "nic"})", R"("ports": 2, )");
 
-TEST(IP, AnEndpointForEachInterfaceWithAnAddress) {
-    Road road({.scenario = TWO_NICS});
-    const auto endpoints = road.enumerate("VLNMPCA_IPProtocolEndpoint");
-    ASSERT_EQ(endpoints.size(), 2u);
-    expect_properties(
-        endpoints[0],
-        {{"CreationClassName", "VLNMPCA_IPProtocolEndpoint"},
-         {"SystemCreationClassName", "CIM_ComputerSystem"},
-         {"Name", "IPv4_0_0_192.0.2.100_vln0p0"},
-         {"Caption", "IPv4_<AdapterNumber>_<PortNumber>_<IPv4 Address>_<IPProtocolEndName>"},
-         {"ElementName", "Vorlan IP Endpoint VR10420117:100002564C000000:vln0p0"},
-         {"ProtocolIFType", "4096"},
-         {"EnabledState", "2"},
-         {"RequestedState", "2"},
-         {"IPv4Address", "192.0.2.100"},
-         {"SubnetMask", "255.255.255.0"},
-         {"AddressOrigin", "3"},
-         {"InterfaceName", "vln0p0"},
-         {"GatewayAddress", "192.0.2.1"}});
-    EXPECT_EQ(text_of(endpoints[1], "IPv4Address"), "192.0.2.101");
-
-    const auto settings = road.enumerate("VLNMPCA_StaticIPAssignmentSettingData");
-    ASSERT_EQ(settings.size(), 2u);
-    expect_properties(
-        settings[1], {{"InstanceID",
-                       "Static IP AssignmentSettingData for Interface:VR10420117:100002564C000101"},
-                      {"AddressOrigin", "3"},
-                      {"IPv4Address", "192.0.2.101"},
-                      {"SubnetMask", "255.255.255.0"},
-                      {"GatewayIPv4Address", "192.0.2.1"}});
-    const auto assignments = road.enumerate("VLNMPCA_IPAssignmentSettingData");
-    ASSERT_EQ(assignments.size(), 2u);
-    expect_properties(
-        assignments[0],
-        {{"InstanceID", "IP AssignmentSettingData for Interface:VR10420117:100002564C000000"},
-         {"AddressOrigin", "2"}});
-    const auto capabilities =
-        road.enumerate("VLNMPCA_EnabledLogicalIPProtocolEndpointCapabilities");
-    ASSERT_EQ(capabilities.size(), 2u);
-    EXPECT_EQ(text_of(capabilities[0], "InstanceID"),
-              "VLN:Enabled Logical IPProtocol Endpoint Capabilities for "
-              "IPv4_0_0_192.0.2.100_vln0p0");
+// The same with iSCSI functions of these network properties.
+std::string iscsi(const std::string& network) {
+    return road::card(R"({"use": "nic"}, {"use": "iscsi", "network": )" + network + "}",
+                      R"("ports": 2, )");
 }
 
-TEST(IP, PortsOfOneNetworkShareTheirGateway) {
-    Road road({.scenario = TWO_NICS});
-    const auto gateways = road.enumerate("VLNMPCA_RemoteServiceAccessPoint");
-    ASSERT_EQ(gateways.size(), 1u);
-    expect_properties(gateways[0], {{"Name", "192.0.2.1"},
-                                    {"InstanceID", "Default Gateway Address"},
-                                    {"AccessInfo", "192.0.2.1"},
-                                    {"InfoFormat", "3"},
-                                    {"AccessContext", "2"}});
-    EXPECT_EQ(road.enumerate("VLNMPCA_RemoteHostedAccessPoint").size(), 1u);
-    EXPECT_EQ(road.enumerate("VLNMPCA_RemoteAccessAvailableToElement").size(), 2u);
+void set_port(const char* name, const char* value) {
+    road::set_value(FIRST, "portAttributes", name, value);
 }
 
 TEST(IP, WhatTheKernelSaysDecides) {
     Road road({.scenario = TWO_NICS, .log = true});
-    set_port(FIRST, "FunctionalPortState", "6"); // the interface is down
-    set_port(FIRST, "AddressOrigin", R"("DHCP")");
-    set_port(FIRST, "SubnetMask", nullptr);
-    set_port(FIRST, "GatewayAddress", nullptr);
+    set_port("FunctionalPortState", "6"); // the interface is down
+    set_port("AddressOrigin", R"("DHCP")");
+    set_port("SubnetMask", nullptr);
+    set_port("GatewayAddress", nullptr);
     const auto endpoints = road.enumerate("VLNMPCA_IPProtocolEndpoint");
     ASSERT_EQ(endpoints.size(), 2u);
     expect_properties(endpoints[0], {{"EnabledState", "3"},
@@ -89,36 +38,78 @@ TEST(IP, WhatTheKernelSaysDecides) {
                                      {"SubnetMask", ""},
                                      {"AddressOrigin", "4"}});
     EXPECT_EQ(text_of(endpoints[1], "EnabledState"), "2");
-    EXPECT_EQ(road.enumerate("VLNMPCA_RemoteAccessAvailableToElement").size(), 1u);
-    EXPECT_EQ(road.enumerate("VLNMPCA_StaticIPAssignmentSettingData").size(), 2u);
-    road.close();
-    EXPECT_EQ(road.count_in_log("Failed to retrieve IPv4 Subnet for interface: [vln0p0]"), 1u);
+    expect_counts(road, {{"VLNMPCA_RemoteAccessAvailableToElement", 1},
+                         {"VLNMPCA_StaticIPAssignmentSettingData", 2}});
+    expect_lines(road, {{"Failed to retrieve IPv4 Subnet for interface: [vln0p0]", 1}});
 }
 
 // The port stays, and the service that could give it an address does too.
 TEST(IP, InterfacesWithoutAnIPv4AddressAreLeftOut) {
-    struct Row {
-        const char* name;
-        const char* value;
-        const char* line;
-    };
-    const Row rows[] = {
+    const char* const rows[][3] = {
         {"IPv4Address", nullptr, "Failed to retrieve IP AddressType for interface: [vln0p0]"},
         {"IPProtocolIFType", R"("IPv6")", "Failed to retrieve IP Address for interface: [vln0p0]"},
     };
-    for (const Row& row : rows) {
+    for (const auto& [name, value, line] : rows) {
+        SCOPED_TRACE(name);
         Road road({.scenario = TWO_NICS, .log = true});
-        set_port(FIRST, row.name, row.value);
-        const auto endpoints = road.enumerate("VLNMPCA_IPProtocolEndpoint");
-        ASSERT_EQ(endpoints.size(), 1u) << row.name;
-        EXPECT_EQ(text_of(endpoints[0], "InterfaceName"), "vln0p1");
-        EXPECT_EQ(road.enumerate("VLNMPCA_LANEndpoint").size(), 2u);
-        EXPECT_EQ(road.enumerate("VLNMPCA_BindsToLANEndpoint").size(), 1u);
-        EXPECT_EQ(road.enumerate("VLNMPCA_HostedIPProtocolEndpoint").size(), 1u);
-        EXPECT_EQ(road.enumerate("VLNMPCA_IPConfigurationService").size(), 1u);
-        road.close();
-        EXPECT_EQ(road.count_in_log(row.line), 1u) << row.name;
+        set_port(name, value);
+        EXPECT_EQ(road::first(road, "VLNMPCA_IPProtocolEndpoint", "InterfaceName"), "vln0p1");
+        expect_counts(road, {{"VLNMPCA_IPProtocolEndpoint", 1},
+                             {"VLNMPCA_LANEndpoint", 2},
+                             {"VLNMPCA_BindsToLANEndpoint", 1},
+                             {"VLNMPCA_HostedIPProtocolEndpoint", 1},
+                             {"VLNMPCA_IPConfigurationService", 1}});
+        expect_lines(road, {{line, 1}});
     }
+}
+
+TEST(ISCSI, WithoutAnAddressThereIsThePortAndNothingThatSpeaksTCP) {
+    for (const std::string address : {"0.0.0.0", "::"}) {
+        SCOPED_TRACE(address);
+        Road road({.scenario = iscsi(R"({"address": ")" + address + "\"}"), .log = true});
+        expect_counts(road, {{"VLNMPCA_EthernetPort", 4},
+                             {"VLNMPCA_iSCSIPortConformsToProfile", 2},
+                             {"VLNMPCA_PCIDevice", 4},
+                             {"VLNMPCA_IPProtocolEndpoint", 2}, // of the NICs
+                             {"VLNMPCA_TCPProtocolEndpoint", 0},
+                             {"VLNMPCA_HostedTCPAccesspoint", 0},
+                             {"VLNMPCA_TCPBindsToIP", 0},
+                             {"VLNMPCA_HostedIPAccessPoint", 0}});
+        expect_lines(road, {{"ip not set skipping creating the instance", 2}});
+    }
+}
+
+TEST(ISCSI, AnIPv6AddressIsShownAsOne) {
+    Road road({.scenario = iscsi(R"({"address": "2001:db8::7", "subnetMask": "ffff:ffff::",
+        "gateway": "0.0.0.0", "dhcp": true})")});
+    const auto endpoint = road::find(road, "VLNMPCA_IPProtocolEndpoint", "Description", "iSCSI");
+    expect_properties(endpoint,
+                      {{"ProtocolIFType", "4097"}, {"IPv4Address", "-"}, {"AddressOrigin", "4"}});
+    EXPECT_TRUE(text_of(endpoint, "IPv6Address").starts_with("201:"));
+}
+
+// On a card that has no NIC function there is no connector and no controller to tie it to.
+TEST(ISCSI, AFunctionWithoutANicBesideItHasItsPortAllTheSame) {
+    Road road({.scenario = road::cards(R"({"use": "cna", "functions": [{"use": "nic"}]},
+        {"use": "cna", "functions": [{"use": "iscsi"}], "serial": "S2",
+         "wwpn": "100002564C020000", "mac": "02:56:4C:02:00:00"})"),
+               .log = true});
+    expect_counts(road, {{"VLNMPCA_EthernetPort", 2},
+                         {"VLNMPCA_TCPProtocolEndpoint", 1},
+                         {"VLNMPCA_PCIDevice", 2},
+                         {"VLNMPCA_ControlledBy", 1},
+                         {"VLNMPCA_Realizes", 1}});
+    expect_lines(road, {{"Wrong input for", 0}});
+}
+
+TEST(ISCSI, WhatTheLibraryRefusesCostsThatPortAlone) {
+    Road road;
+    vlnsim_fault("AX_Ini_GetNetworkProperties", 1, VLNSIM_STATUS, 1);
+    vlnsim_fault("AX_DiagReadPCIRegistersV2", VLNSIM_EVERY, VLNSIM_STATUS, 1);
+    EXPECT_EQ(text_of(road::find(road, "VLNMPCA_EthernetPort", "Name", "iscsi"), "DeviceID"),
+              "100002564C000103");
+    expect_counts(
+        road, {{"VLNMPCA_EthernetPort", 3}, {"VLNMPCA_TCPBindsToIP", 1}, {"VLNMPCA_PCIDevice", 0}});
 }
 
 } // namespace

@@ -1,20 +1,14 @@
 // The platform's own computer system and chassis, fetched by up-calls, and the provider's when
 // there are none.
-#include "tests/road/road.h"
+#include "host/path_text.h"
+#include "tests/road/hosts.h"
+#include "tests/road/properties.h"
 
+using road::PLATFORM;
 using road::Road;
 using road::text_of;
 
 namespace {
-
-constexpr const char* PLATFORM = R"([
-  {"namespace": "root/ibmse", "class": "IBMSD_ComputerSystem",
-   "properties": {"CreationClassName": "IBMSD_ComputerSystem", "Name": "rack7-node3"}},
-  {"namespace": "root/ibmse", "class": "IBMSD_ComputerSystem",
-   "properties": {"CreationClassName": "IBMSD_ComputerSystem", "Name": "a second one"}},
-  {"namespace": "root/ibmse", "class": "IBMSD_Chassis",
-   "properties": {"CreationClassName": "IBMSD_Chassis", "Tag": "chassis 12"}}
-])";
 
 // Every SystemName of every instance, keys of references included.
 void collect(const host::ObjectPath& path, std::vector<std::string>& names) {
@@ -37,7 +31,7 @@ std::vector<std::string> system_names(Road& road) {
     return names;
 }
 
-TEST(Platform, ItsComputerSystemIsTheOneEverythingHangsOn) {
+TEST(Platform, ItsComputerSystemIsTheOneEverythingHangsOnAndItsChassisHoldsTheCard) {
     for (const bool elements_marked_null : {false, true}) {
         Road road({.platform = PLATFORM, .elements_marked_null = elements_marked_null});
         const auto names = system_names(road);
@@ -46,18 +40,12 @@ TEST(Platform, ItsComputerSystemIsTheOneEverythingHangsOn) {
             EXPECT_EQ(name, "rack7-node3");
         for (const host::Instance& port : road.enumerate("VLNMPCA_EthernetPort"))
             EXPECT_EQ(text_of(port, "SystemCreationClassName"), "IBMSD_ComputerSystem");
+        const auto links = road.enumerate("VLNMPCA_ChassisContainsCard");
+        ASSERT_EQ(links.size(), 1u);
+        const host::ObjectPath* chassis = links[0].property("GroupComponent")->as_reference();
+        EXPECT_EQ(host::path_to_text(*chassis, ""), "root/ibmse:IBMSD_Chassis.Tag=\"chassis 12\","
+                                                    "CreationClassName=\"IBMSD_Chassis\"");
     }
-}
-
-TEST(Platform, ItsChassisHoldsTheCard) {
-    Road road({.platform = PLATFORM});
-    const auto links = road.enumerate("VLNMPCA_ChassisContainsCard");
-    ASSERT_EQ(links.size(), 1u);
-    const host::ObjectPath* chassis = links[0].property("GroupComponent")->as_reference();
-    ASSERT_NE(chassis, nullptr);
-    EXPECT_EQ(chassis->class_name, "IBMSD_Chassis");
-    EXPECT_EQ(chassis->name_space, "root/ibmse");
-    EXPECT_EQ(chassis->key("Tag")->as_text(), "chassis 12");
 }
 
 TEST(Platform, WithoutOneTheProviderMakesItsOwn) {
@@ -96,10 +84,9 @@ TEST(Platform, AHostThatCannotBeResolvedHasUsableKeys) {
         {R"({"hostName": "box-9"})", "box-9", "Host ipAddress : 192.0.2.10"},
     };
     for (const auto& row : rows) {
-        Road road({.scenario = R"({"include": ")" VLN_SCENARIOS R"(/parts/cna.json", "server": )" +
-                               std::string(row.server) +
-                               R"(, "cards": [{"use": "cna", "functions": [{"use": "nic"}]}]})",
-                   .log = true});
+        std::string host = road::card(R"({"use": "nic"})");
+        host.insert(1, R"("server": )" + std::string(row.server) + ", ");
+        Road road({.scenario = host, .log = true});
         const auto names = system_names(road);
         EXPECT_GT(names.size(), 10u);
         for (const std::string& name : names)

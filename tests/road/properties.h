@@ -27,6 +27,30 @@ inline host::Instance find(Road& road, const std::string& class_name, const char
     return {};
 }
 
+// A property of the first instance of a class.
+inline std::string first(Road& road, const char* class_name, const char* property) {
+    const auto instances = road.enumerate(class_name);
+    return instances.empty() ? "no instance" : text_of(instances[0], property);
+}
+
+struct Count {
+    const char* what;
+    std::size_t count;
+};
+
+// How many instances there are of each class.
+inline void expect_counts(Road& road, std::initializer_list<Count> rows) {
+    for (const Count& row : rows)
+        EXPECT_EQ(road.enumerate(row.what).size(), row.count) << row.what;
+}
+
+// How often each text stands in the log of a host that ends.
+inline void expect_lines(Road& road, std::initializer_list<Count> rows) {
+    road.close();
+    for (const Count& row : rows)
+        EXPECT_EQ(road.count_in_log(row.what), row.count) << row.what;
+}
+
 // Changes a value of the running host, as vlnsim_set_value.
 inline void set_value(const char* wwn, const char* table, const char* name, const char* value) {
     char error[256] = "";

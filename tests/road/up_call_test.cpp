@@ -1,12 +1,14 @@
 // How often the object manager is asked back. Each up-call goes through its whole machinery, to
 // another process as a rule: 20 to 40 ms in a real one, and so more than all else that a request
 // costs.
+#include "tests/road/hosts.h"
 #include "tests/road/road.h"
 
 #include <algorithm>
 #include <mutex>
 #include <utility>
 
+using road::PLATFORM;
 using road::Road;
 
 namespace {
@@ -32,17 +34,6 @@ struct Up_Calls {
 };
 
 using Counts = std::map<std::string, std::size_t>;
-
-constexpr const char* PLATFORM = R"({
-  "classes": [{"name": "OMC_RegisteredBaseServerProfile", "superclass": "PG_RegisteredProfile"}],
-  "instances": [
-    {"namespace": "root/ibmse", "class": "IBMSD_ComputerSystem",
-     "properties": {"CreationClassName": "IBMSD_ComputerSystem", "Name": "rack7-node3"}},
-    {"namespace": "root/ibmse", "class": "IBMSD_Chassis",
-     "properties": {"CreationClassName": "IBMSD_Chassis", "Tag": "chassis 12"}},
-    {"namespace": "root/pg_interop", "class": "OMC_RegisteredBaseServerProfile",
-     "properties": {"InstanceID": "OMC:Server", "RegisteredName": "Base Server"}}
-  ]})";
 
 const Counts REFRESH = {{"enumerateInstances:IBMSD_ComputerSystem", 1},
                         {"enumerateInstances:IBMSD_Chassis", 1}};

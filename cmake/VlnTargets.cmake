@@ -52,6 +52,10 @@ function(vln_test name)
     if(NOT ARG_TIMEOUT)
         set(ARG_TIMEOUT 120)
     endif()
+    # Each process of a build with counters reads and writes them all at its end.
+    if(CMAKE_CXX_FLAGS_RELEASE MATCHES "--coverage")
+        math(EXPR ARG_TIMEOUT "${ARG_TIMEOUT} * 5")
+    endif()
     set_tests_properties(${name} PROPERTIES TIMEOUT ${ARG_TIMEOUT})
     if(VLN_SANITIZE STREQUAL "thread")
         set_tests_properties(${name} PROPERTIES ENVIRONMENT

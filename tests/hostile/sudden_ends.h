@@ -3,6 +3,7 @@
 #ifndef TESTS_HOSTILE_SUDDEN_ENDS_H
 #define TESTS_HOSTILE_SUDDEN_ENDS_H
 
+#include "tests/road/hosts.h"
 #include "tests/road/road.h"
 
 #include <atomic>
@@ -13,9 +14,8 @@
 namespace sudden_ends {
 
 // An Ethernet and an FCoE function with some units: both passes have work to do.
-inline const std::string SCENARIO = R"({"include": ")" VLN_SCENARIOS R"(/parts/cna.json",
-    "cards": [{"use": "cna", "functions": [{"use": "nic"},
-        {"use": "fcoe", "targets": {"luns": 4, "wwpn": "50:25:64:C{port}:00:00:00:{target:02X}"}}]}]})";
+inline const std::string SCENARIO = road::card(R"({"use": "nic"},
+    {"use": "fcoe", "targets": {"luns": 4, "wwpn": "50:25:64:C{port}:00:00:00:{target:02X}"}})");
 inline constexpr std::size_t UNITS = 4;
 inline constexpr std::uint64_t STALE = 11ull * 60 * 1000000; // beyond the cache time-out
 

@@ -142,9 +142,8 @@ TEST(SuddenEnds, JoinedClassesAreWholeAcrossARefresh) {
     constexpr const char* JOINED[] = {"VLNMPCA_SAPAvailableForEthernetPort",
                                       "VLNMPCA_iSCSIProtocolEndpointSAPImplementation",
                                       "VLNMPCA_iSCSIBindsToTCP"};
-    road::Road road({.scenario = R"({"include": ")" VLN_SCENARIOS R"(/parts/cna.json", "cards": [
-        {"use": "cna", "functions": [{"use": "nic"},
-         {"use": "iscsi", "iscsiTargets": {"sessions": {}}}]}]})",
+    road::Road road({.scenario = road::card(R"({"use": "nic"},
+        {"use": "iscsi", "iscsiTargets": {"sessions": {}}})"),
                      .log = true});
     for (const char* name : JOINED)
         EXPECT_EQ(road.enumerate(name).size(), 1u) << name;
@@ -169,10 +168,6 @@ TEST(SuddenEnds, JoinedClassesAreWholeAcrossARefresh) {
 
 // ---- Up-calls ----
 
-constexpr const char* PLATFORM = R"([
-  {"namespace": "root/ibmse", "class": "IBMSD_ComputerSystem",
-   "properties": {"CreationClassName": "IBMSD_ComputerSystem", "Name": "rack7-node3"}}])";
-
 // A provider of the platform that asks for our classes before it answers: on the same thread, and,
 // once there is something to see, through another one.
 TEST(SuddenEnds, APlatformProviderMayAskUsOnItsWay) {
@@ -191,7 +186,7 @@ TEST(SuddenEnds, APlatformProviderMayAskUsOnItsWay) {
             [&] { EXPECT_EQ(manager->enumerate("VLNMPCA_Product").value.size(), present); });
         other.join();
     };
-    road::Road road({.scenario = SCENARIO, .platform = PLATFORM, .log = true, .trace = ask});
+    road::Road road({.scenario = SCENARIO, .platform = road::PLATFORM, .log = true, .trace = ask});
     manager = &road.manager();
     for (std::size_t refresh = 1; refresh <= 2; ++refresh) {
         EXPECT_EQ(road.enumerate("VLNMPCA_Product").size(), 1u);

@@ -1,4 +1,5 @@
 // What the scans of adapters and of the SAN make of a host, and of failures on the way.
+#include "tests/road/hosts.h"
 #include "tests/road/scan_host.h"
 
 #include "device/fc_adapter.h"
@@ -10,6 +11,7 @@
 
 using namespace cimple;
 using road::Calls;
+using road::card;
 using road::Scan_Host;
 
 namespace {
@@ -20,13 +22,6 @@ struct Fault {
     std::uint64_t value;
     vlnsim_fault_kind kind = VLNSIM_STATUS;
 };
-
-// A card of one port with these functions.
-std::string card(const std::string& functions) {
-    return R"({"include": ")" VLN_SCENARIOS R"(/parts/cna.json", "cards": [{"use": "cna",
-        "functions": [)" +
-           functions + "]}]}";
-}
 
 const std::string NIC_AND_FCOE = card(R"({"use": "nic"}, {"use": "fcoe",
     "targets": {"wwpn": "50:25:64:C0:00:00:00:01", "luns": [{}, {"silent": true}]}})");

@@ -1,7 +1,11 @@
 // docs/simulator.md: its examples are scenarios that load, and it names every key that there is.
 #include "tests/simulator/simulated.h"
 
+#include <nlohmann/json.hpp>
+
+#include <algorithm>
 #include <fstream>
+#include <set>
 #include <sstream>
 
 namespace {
@@ -30,100 +34,74 @@ TEST_F(Simulated, DocumentedExamplesAreScenarios) {
     EXPECT_GE(examples, 7);
 }
 
+// Objects with a key that nobody knows, or with a word that none is: the message lists what is
+// known.
+// "[]" is a list, what stands in parentheses a key that has to be there.
+constexpr const char* UNKNOWN =
+    "? libraries/? libraries/local/? libraries/versions/? server/? faults[]/? cards[]/? "
+    "adapterAttributes/? portAttributes/? statistics/? features/? pci/? sff/? initiator/? "
+    "initiator/authentication=? initiator/loginOptions/? network/? arpTable[]/? "
+    "routeTable[]/? hba/? driverParameters[]/? qos/? virtualFunctions/? "
+    "unitPriorities[]/? unitPriorities[](target=5000024500000001)/option=? dumps/? "
+    "dumps/logType=? dumps/modules[]/? dumps/modules[](name=m)/ram/? bridging/? "
+    "bridging/dcbx/? bridging/lldp/? bridging/switch/? bridging/configured/pg/? "
+    "bridging/configured/applications[]/? fip/? fip/forwarders[]/? nameManagement/? "
+    "nameManagement/can=? nameManagement/factory/? virtualPorts[]/? "
+    "virtualPorts[](wwpn=2000024500000001)/machine/? portConfig/? portConfig/flags=? "
+    "portConfig/ports[]/? portConfig/ports[]/functions[]/? "
+    "portConfig/ports[]/functions[]/protocol=? channelManagement/? channels/? "
+    "channels/changeable=? channels/list[]/? channels/list[]/type=? personality/? "
+    "personality/current=? targets/? targets/type=? targets/luns/? "
+    "targets/luns/identifier/? targets/luns/responses/? iscsiNetwork/? "
+    "iscsiNetwork/portals/? iscsiNetwork/hosts/? iscsiStatistics/? isns/? iscsiTargets/? "
+    "iscsiTargets/luns/? iscsiTargets/sessions/? iscsiTargets/sessions/state=? "
+    "iscsiTargets/sessions/type=? iscsiTargets/sessions/connectionState=? "
+    "iscsiTargets/sessions/counters/? ";
+
+using Json = nlohmann::json;
+
+const std::set<std::string> OF_THE_HOST = {"?",      "libraries", "server",
+                                           "faults", "cards",     "iscsiNetwork"};
+
+Json object_of(const std::string& path) {
+    const std::size_t slash = path.find('/'), first = std::min(slash, path.size());
+    std::string name = path.substr(0, first);
+    if (name.ends_with("=?"))
+        return {{name.substr(0, name.size() - 2), "?"}};
+    if (slash == std::string::npos)
+        return {{name, 0}};
+    Json inner = object_of(path.substr(slash + 1));
+    if (const std::size_t at = name.find('('); at != std::string::npos) {
+        const std::size_t sign = name.find('=', at);
+        inner[name.substr(at + 1, sign - at - 1)] = name.substr(sign + 1, name.size() - sign - 2);
+        name.resize(at);
+    }
+    if (!name.ends_with("[]"))
+        return {{name, inner}};
+    return {{name.substr(0, name.size() - 2), Json::array({inner})}};
+}
+
 TEST_F(Simulated, EveryKeyIsDocumented) {
     const std::string text = documentation();
-    // Objects with a key that nobody knows: the message lists those that are known.
-    const char* const objects[] = {
-        R"({"?": 0})",
-        R"({"libraries": {"?": 0}})",
-        R"({"libraries": {"local": {"?": 0}}})",
-        R"({"libraries": {"versions": {"?": 0}}})",
-        R"({"server": {"?": 0}})",
-        R"({"faults": [{"?": 0}]})",
-        R"({"cards": [{"?": 0}]})",
-        R"({"adapterAttributes": {"?": 0}})",
-        R"({"portAttributes": {"?": 0}})",
-        R"({"statistics": {"?": 0}})",
-        R"({"features": {"?": 0}})",
-        R"({"pci": {"?": 0}})",
-        R"({"sff": {"?": 0}})",
-        R"({"initiator": {"?": 0}})",
-        R"({"initiator": {"authentication": "?"}})",
-        R"({"initiator": {"loginOptions": {"?": 0}}})",
-        R"({"network": {"?": 0}})",
-        R"({"arpTable": [{"?": 0}]})",
-        R"({"routeTable": [{"?": 0}]})",
-        R"({"hba": {"?": 0}})",
-        R"({"driverParameters": [{"?": 0}]})",
-        R"({"qos": {"?": 0}})",
-        R"({"virtualFunctions": {"?": 0}})",
-        R"({"unitPriorities": [{"?": 0}]})",
-        R"({"unitPriorities": [{"target": "5000024500000001", "option": "?"}]})",
-        R"({"dumps": {"?": 0}})",
-        R"({"dumps": {"logType": "?"}})",
-        R"({"dumps": {"modules": [{"?": 0}]}})",
-        R"({"dumps": {"modules": [{"name": "m", "ram": {"?": 0}}]}})",
-        R"({"bridging": {"?": 0}})",
-        R"({"bridging": {"dcbx": {"?": 0}}})",
-        R"({"bridging": {"lldp": {"?": 0}}})",
-        R"({"bridging": {"switch": {"?": 0}}})",
-        R"({"bridging": {"configured": {"pg": {"?": 0}}}})",
-        R"({"bridging": {"configured": {"applications": [{"?": 0}]}}})",
-        R"({"fip": {"?": 0}})",
-        R"({"fip": {"forwarders": [{"?": 0}]}})",
-        R"({"nameManagement": {"?": 0}})",
-        R"({"nameManagement": {"can": "?"}})",
-        R"({"nameManagement": {"factory": {"?": 0}}})",
-        R"({"virtualPorts": [{"?": 0}]})",
-        R"({"virtualPorts": [{"wwpn": "2000024500000001", "machine": {"?": 0}}]})",
-        R"({"portConfig": {"?": 0}})",
-        R"({"portConfig": {"flags": "?"}})",
-        R"({"portConfig": {"ports": [{"?": 0}]}})",
-        R"({"portConfig": {"ports": [{"functions": [{"?": 0}]}]}})",
-        R"({"portConfig": {"ports": [{"functions": [{"protocol": "?"}]}]}})",
-        R"({"channelManagement": {"?": 0}})",
-        R"({"channels": {"?": 0}})",
-        R"({"channels": {"changeable": "?"}})",
-        R"({"channels": {"list": [{"?": 0}]}})",
-        R"({"channels": {"list": [{"type": "?"}]}})",
-        R"({"personality": {"?": 0}})",
-        R"({"personality": {"current": "?"}})",
-        R"({"targets": {"?": 0}})",
-        R"({"targets": {"type": "?"}})",
-        R"({"targets": {"luns": {"?": 0}}})",
-        R"({"targets": {"luns": {"identifier": {"?": 0}}}})",
-        R"({"targets": {"luns": {"responses": {"?": 0}}}})",
-        R"({"iscsiNetwork": {"?": 0}})",
-        R"({"iscsiNetwork": {"portals": {"?": 0}}})",
-        R"({"iscsiNetwork": {"hosts": {"?": 0}}})",
-        R"({"iscsiStatistics": {"?": 0}})",
-        R"({"isns": {"?": 0}})",
-        R"({"iscsiTargets": {"?": 0}})",
-        R"({"iscsiTargets": {"luns": {"?": 0}}})",
-        R"({"iscsiTargets": {"sessions": {"?": 0}}})",
-        R"({"iscsiTargets": {"sessions": {"state": "?"}}})",
-        R"({"iscsiTargets": {"sessions": {"type": "?"}}})",
-        R"({"iscsiTargets": {"sessions": {"connectionState": "?"}}})",
-        R"({"iscsiTargets": {"sessions": {"counters": {"?": 0}}}})",
-    };
-    for (std::string object : objects) {
-        const bool is_top = object.starts_with("{\"?\"") || object.starts_with("{\"libraries") ||
-                            object.starts_with("{\"server") || object.starts_with("{\"faults") ||
-                            object.starts_with("{\"cards") || object.starts_with("{\"iscsiNetwork");
-        if (!is_top)
-            object = R"({"cards": [{"type": "fcoe", "wwpn": "1000024500000001", "functions": [)" +
-                     object + "]}]}";
+    std::istringstream paths(UNKNOWN);
+    for (std::string path; paths >> path;) {
+        Json object = object_of(path);
+        if (!OF_THE_HOST.contains(object.begin().key())) {
+            const Json function = {{"type", "fcoe"},
+                                   {"wwpn", "1000024500000001"},
+                                   {"functions", Json::array({object})}};
+            object = {{"cards", Json::array({function})}};
+        }
         char error[8192];
-        ASSERT_EQ(1, vlnsim_load_scenario_text(object.c_str(), "t", error, sizeof error));
+        ASSERT_EQ(1, vlnsim_load_scenario_text(object.dump().c_str(), "t", error, sizeof error));
         std::string known = error;
         const std::string mark = "known are: ";
         ASSERT_NE(std::string::npos, known.find(mark)) << object << ": " << error;
         std::istringstream names(known.substr(known.find(mark) + mark.size()));
-        for (std::string name; std::getline(names >> std::ws, name, ',');) {
+        for (std::string name; std::getline(names >> std::ws, name, ',');)
             EXPECT_TRUE(text.find('`' + name + '`') != std::string::npos ||
                         text.find('"' + name + '"') != std::string::npos)
                 << name << " of " << object;
-        }
     }
 }
 

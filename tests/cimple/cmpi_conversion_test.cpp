@@ -1,5 +1,6 @@
 // Values between CMPI objects and instances, both ways: into a provider that keeps what it is
 // given, and out of it again.
+#include "cimple/conversion.h"
 #include "host/scalar_text.h"
 #include "tests/cimple/cmpi_fixture.h"
 
@@ -172,6 +173,42 @@ TEST_F(Conversion_Test, ABadMemberFailsAlone) {
     EXPECT_FALSE(types->Installed.is_null()) << "the last one, behind all the bad ones";
     EXPECT_TRUE(types->U8.is_null() && types->U16.is_null() && types->Date.is_null());
     EXPECT_TRUE(types->Numbers.is_null() && types->Names.is_null() && types->Dates.is_null());
+}
+
+// What other object managers hand out, and this one never would.
+TEST_F(Conversion_Test, OddDataIsTakenForWhatItCanBe) {
+    const CMPIBroker* cmpi_broker = block(instance_mi()).adapter->broker;
+    host::Request request(*core, known("Test_Types"), "call", "root/test");
+    CMPIInstance* real = request.instance({{"root/test", "Test_Types", {}},
+                                           {{"B", Value::boolean(true)},
+                                            {"S8", Value::signed_number(CMPI_sint8, 1)},
+                                            {"Str", Value::text("text")},
+                                            {"Date", Value::datetime("")},
+                                            {"Dates", Value::array(CMPI_dateTime, {})}}});
+    CMPIInstanceFT table = *real->ft;
+    table.getPropertyAt = [](const CMPIInstance* odd, CMPICount index, CMPIString** name,
+                             CMPIStatus* status) {
+        const auto* real = static_cast<const CMPIInstance*>(odd->hdl);
+        CMPIData data = real->ft->getPropertyAt(real, index, name, status);
+        if (data.type == CMPI_boolean)
+            data.value.boolean = 2;
+        else if (data.type == CMPI_sint8)
+            data.state = CMPI_badValue;
+        else
+            data.value.string = nullptr;
+        return data;
+    };
+    table.getPropertyCount = [](const CMPIInstance* odd, CMPIStatus* status) {
+        const auto* real = static_cast<const CMPIInstance*>(odd->hdl);
+        return real->ft->getPropertyCount(real, status);
+    };
+    const CMPIInstance odd = {real, &table};
+    const Ref<Test_Types> types = make_cimple_instance({cmpi_broker, &meta_repository, "root/test"},
+                                                       &Test_Types::static_meta_class, &odd)
+                                      .release();
+    EXPECT_TRUE(types->B.value && !types->B.is_null()) << "any byte but zero is true";
+    EXPECT_TRUE(types->Str.value.empty() && !types->Str.is_null()) << "no string is an empty one";
+    EXPECT_TRUE(types->S8.is_null() && types->Date.is_null() && types->Dates.is_null());
 }
 
 TEST_F(Conversion_Test, StringArgumentsAreCastToSmallScalars) {

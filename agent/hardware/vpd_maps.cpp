@@ -236,24 +236,4 @@ uint32 VPD_Maps::GetLogicalPortAddress(const String& reference, uint32 type,
     return 0;
 }
 
-uint32 VPD_Maps::GetSoftwareInstanceName(const char* portAddress, String& name) const {
-    if (!portAddress) {
-        VLN_LOG(VLN_DBG, "Invalid PortAddress");
-        return VLN_NOT_FOUND;
-    }
-    const auto* port = find_in_system(_agent, _agent.m_VLNMPCA_EthernetPort_map,
-                                      &VLNMPCA_EthernetPort::DeviceID, portAddress);
-    if (!port)
-        return VLN_NOT_FOUND;
-    const auto* software = find_first(
-        _agent.m_VLNMPCA_SoftwareIdentity_map, [&](const VLNMPCA_SoftwareIdentity& candidate) {
-            return is_firmware(candidate) &&
-                   contains(port->OtherIdentifyingInfo.value, candidate.SerialNumber.value);
-        });
-    if (!software)
-        return VLN_NOT_FOUND;
-    name = software->InstanceID.value;
-    return 0;
-}
-
 } // namespace cimple

@@ -45,9 +45,6 @@ public:
     // card that has a port if it is empty. 0 or 32768.
     uint32 GetLogicalPortAddress(const String& reference, uint32 type, String* address) const;
 
-    // The instance name of the firmware of the card that the port belongs to. 0 or 32768.
-    uint32 GetSoftwareInstanceName(const char* portAddress, String& name) const;
-
 private:
     const VLNMPCA_FRUVitalProductData* findFRUData(const VLNMPCA_Card& card) const;
     uint32 takeFRUData(VLNMPCA_Card& card, const FRU_Source& function, uint32 index);

@@ -97,18 +97,6 @@ TEST_F(Narrowing_Test, EverythingButTheCopyIsAsBefore) {
                            {&Receiver::take, &receiver, &focus});
     EXPECT_EQ(log.count(VLN_DBG, "VLNMPCA_StorageVolume_Provider::enum_instances()"), 1);
     EXPECT_EQ(receiver.delivered, 0);
-
-    const Instance_Proc refuse = [](const Instance* instance, sint32, void*) -> bool {
-        unref(instance);
-        throw 1;
-    };
-    const auto wanted = physical<VLNMPCA_Card>("c");
-    agent->m_VLNMPCA_Card_map.insert(clone(wanted.get()));
-    const Enumeration_Focus card_focus = {Enumeration_Focus::KEYS, wanted.get()};
-    EXPECT_EQ(
-        pattern_enum_instances(pattern_table[PATTERN_VLNMPCA_Card], {refuse, nullptr, &card_focus}),
-        0);
-    EXPECT_EQ(log.count(VLN_CRIT, "Exception in Active CIM Provider Enumeration - do nothing"), 1);
 }
 
 // Keys that became equal by a fault empty every answer, the narrow ones too.

@@ -1,5 +1,6 @@
 #include "agent/software/software_identity.h"
 
+#include "agent/text.h"
 #include "operations/curl_library.h"
 
 #include <cstring>
@@ -36,6 +37,12 @@ TEST(Target_System, CodesFollowTheWordsOfTheText) {
             codes += name.c_str();
         EXPECT_EQ(codes, row.codes) << row.system;
     }
+}
+
+TEST(Text, IsWholeAndPureHoweverLong) {
+    for (const std::size_t length : {255u, 256u, 5000u})
+        EXPECT_EQ(format_text("%s\xFF", std::string(length, 'x').c_str()),
+                  String((std::string(length, 'x') + "\xEF\xBF\xBD").c_str()));
 }
 
 namespace {

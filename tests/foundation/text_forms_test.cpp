@@ -35,9 +35,7 @@ TEST_F(Text_Forms_Test, BytesToText) {
     uint8 swapped[4];
     VLN_Common::byteSwapCopy(BYTES, swapped, sizeof swapped);
     EXPECT_EQ(std::memcmp(swapped, "\xCD\xAB\x00\x10", 4), 0);
-}
-
-TEST_F(Text_Forms_Test, NullDestinationsAreNoOps) {
+    // Without a destination nothing is done.
     EXPECT_EQ(VLN_Common::wwnToString(nullptr, BYTES), 0);
     EXPECT_EQ(VLN_Common::wwn16ToString(nullptr, BYTES), 0);
     EXPECT_EQ(VLN_Common::macToText(BYTES, nullptr), 0);
@@ -129,42 +127,30 @@ TEST_F(Text_Forms_Test, AddressesAreTakenWholeOrNotAtAll) {
 }
 
 TEST_F(Text_Forms_Test, FirmwareVersions) {
-    struct Case {
-        const char* text;
-        sint32 status;
-        uint16 numbers[4];
-        const char* release;
+    const std::string none = "0 0 0 0 ";
+    const std::pair<const char*, std::string> cases[] = {
+        {"3.02a0", "3 0 2 0 a"},
+        {"3.02a0r7", "3 0 2 0 a"}, // a test release is not told apart
+        {"3.02a0rx", "3 0 2 0 a"},
+        {"9.87Z6 and words", "9 8 7 6 Z"},
+        {"3.2a0", none},
+        {"3.2a00", none},
+        {"x.02a0", none},
+        {"3,02a0", none},
+        {"3.x2a0", none},
+        {"3.0200", none},
+        {"3.02ax", none},
+        {"3.02\xE4\x30", none},
+        {"", none},
+        {nullptr, none},
     };
-    constexpr Case CASES[] = {
-        {"3.02a0", 0, {3, 0, 2, 0}, "a"},
-        {"3.02a0r7", 0, {3, 0, 2, 0}, "a"}, // a test release is not told apart
-        {"3.02a0rx", 0, {3, 0, 2, 0}, "a"},
-        {"9.87Z6 and words", 0, {9, 8, 7, 6}, "Z"},
-        {"3.2a0", 32769, {}, ""},
-        {"3.2a00", 32769, {}, ""},
-        {"x.02a0", 32769, {}, ""},
-        {"3,02a0", 32769, {}, ""},
-        {"3.x2a0", 32769, {}, ""},
-        {"3.0200", 32769, {}, ""},
-        {"3.02ax", 32769, {}, ""},
-        {"3.02\xE4"
-         "0",
-         32769,
-         {},
-         ""},
-        {"", 32769, {}, ""},
-        {nullptr, 32769, {}, ""},
-    };
-    for (const Case& c : CASES) {
-        SCOPED_TRACE(c.text ? c.text : "null");
+    for (const auto& [given, expected] : cases) {
         VLN_FirmwareVersion version;
-        EXPECT_EQ(VLN_Common::parseVersion(c.text, version), c.status);
-        EXPECT_EQ(version.major, c.numbers[0]);
-        EXPECT_EQ(version.minor, c.numbers[1]);
-        EXPECT_EQ(version.revision, c.numbers[2]);
-        EXPECT_EQ(version.build, c.numbers[3]);
-        EXPECT_EQ(version.releaseType, c.release);
-        EXPECT_EQ(version.testRevision, "");
+        EXPECT_EQ(VLN_Common::parseVersion(given, version), expected == none ? 32769 : 0);
+        std::string parts;
+        for (uint16 number : {version.major, version.minor, version.revision, version.build})
+            parts += std::to_string(number) + " ";
+        EXPECT_EQ(parts + version.releaseType + version.testRevision, expected);
     }
 }
 
@@ -203,16 +189,13 @@ TEST_F(Text_Forms_Test, AdapterAttributes) {
 
 TEST_F(Text_Forms_Test, DebugLines) {
     Log_Capture capture;
+    const Array<uint16> numbers{1, 65535};
     VLN_Common::traceInt("count", -3);
-    VLN_Common::traceString("name", "");
     VLN_Common::traceString("name", nullptr);
-    Array<uint16> array;
-    array.append(1);
-    array.append(65535);
-    VLN_Common::traceUint16Array("states", array);
-    EXPECT_TRUE(capture.has(VLN_DBG, "count: -3"));
-    EXPECT_TRUE(capture.has(VLN_DBG, "name: "));
-    EXPECT_TRUE(capture.has(VLN_DBG, "states: 1,65535"));
+    VLN_Common::traceUint16Array("states", numbers);
+    VLN_Common::traceInstance("nobody", nullptr);
+    for (const char* line : {"count: -3", "name: ", "states: 1,65535", "nobody: "})
+        EXPECT_TRUE(capture.has(VLN_DBG, line)) << line;
 }
 
 } // namespace cimple

@@ -100,21 +100,26 @@ TEST(MofParser, ReadsEveryKindOfDefault) {
             uint32  fixed[4] = { 1 };
         };)",
                                                    "t.mof");
-    EXPECT_TRUE(feature(document, "b").default_value->boolean);
-    EXPECT_EQ(feature(document, "hex").default_value->magnitude, 255u);
-    EXPECT_EQ(feature(document, "octal").default_value->magnitude, 15u);
-    EXPECT_EQ(feature(document, "binary").default_value->magnitude, 5u);
-    EXPECT_EQ(feature(document, "least").default_value->as_signed(), INT64_MIN);
-    EXPECT_EQ(feature(document, "real").default_value->real, -1500.0);
-    EXPECT_EQ(feature(document, "whole").default_value->kind, Value::Kind::real);
-    EXPECT_EQ(feature(document, "letter").default_value->magnitude, std::uint64_t('x'));
-    EXPECT_EQ(feature(document, "code").default_value->magnitude, 0x263Au);
-    EXPECT_EQ(feature(document, "wide").default_value->magnitude, 0xE9u);
-    EXPECT_EQ(feature(document, "joined").default_value->text, "ab\n\"\\A");
-    EXPECT_EQ(feature(document, "when").default_value->text, "20200102030405.000000+060");
-    EXPECT_EQ(feature(document, "list").default_value->elements.size(), 3u);
-    EXPECT_EQ(feature(document, "none").default_value->kind, Value::Kind::array);
-    EXPECT_EQ(feature(document, "nothing").default_value->kind, Value::Kind::null);
+    const auto value = [&](const char* name) -> const Value& {
+        return *feature(document, name).default_value;
+    };
+    EXPECT_TRUE(value("b").boolean);
+    for (const auto& [name, magnitude] :
+         std::initializer_list<std::pair<const char*, unsigned>>{{"hex", 255},
+                                                                 {"octal", 15},
+                                                                 {"binary", 5},
+                                                                 {"letter", 'x'},
+                                                                 {"code", 0x263A},
+                                                                 {"wide", 0xE9}})
+        EXPECT_EQ(value(name).magnitude, magnitude) << name;
+    EXPECT_EQ(value("least").as_signed(), INT64_MIN);
+    EXPECT_EQ(value("real").real, -1500.0);
+    EXPECT_EQ(value("whole").kind, Value::Kind::real);
+    EXPECT_EQ(value("joined").text, "ab\n\"\\A");
+    EXPECT_EQ(value("when").text, "20200102030405.000000+060");
+    EXPECT_EQ(value("list").elements.size(), 3u);
+    EXPECT_EQ(value("none").kind, Value::Kind::array);
+    EXPECT_EQ(value("nothing").kind, Value::Kind::null);
     EXPECT_EQ(feature(document, "fixed").array, 4);
 }
 

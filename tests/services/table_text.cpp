@@ -26,13 +26,17 @@ std::string replaced(const std::string& text, const std::regex& form,
 using Words = std::map<std::string, std::string>;
 
 std::string filled_in(const std::string& text, const Words& known) {
-    static const std::regex name(R"(\$([A-Z][A-Z0-9_]*))"), times(R"(\{([^{}*]*)\*(\d+)\})");
+    static const std::regex name(R"(\$(\(([A-Z0-9_]+)\)|[A-Z][A-Z0-9_]*))"),
+        times(R"(\{([^{}*]*)\*(\d+)\})"), byte(R"(\\x([0-9A-F]{2}))");
     const std::string whole = replaced(text, name, [&](const std::smatch& found) {
-        const auto word = known.find(found[1]);
+        const auto word = known.find(found[2].matched ? found[2] : found[1]);
         return word == known.end() ? throw std::runtime_error("unknown: " + found.str())
                                    : word->second;
     });
-    return replaced(whole, times, [](const std::smatch& found) {
+    const std::string spelt = replaced(whole, byte, [](const std::smatch& found) {
+        return std::string(1, static_cast<char>(std::stoi(found[1], nullptr, 16)));
+    });
+    return replaced(spelt, times, [](const std::smatch& found) {
         std::string many;
         for (int i = std::stoi(found[2]); i > 0; --i)
             many += found[1];

@@ -29,7 +29,7 @@ struct Table {
 // remark. Blanks separate words, but within double quotes, which are left out unless "\" stands
 // before them. "host" and what follows it is the host of the tests from there on: a scenario, or a
 // JSON text, where $SCENARIOS is their folder. "test NAME" begins a test. "let NAME TEXT" has $NAME
-// stand for the text, to the end of the file. {TEXT*3} is the text three times.
+// stand for the text, to the end of the file. {TEXT*3} is the text three times, \xE4 a byte.
 std::vector<Table> read_tables(const std::string& folder);
 
 } // namespace services

@@ -15,16 +15,18 @@
 //     calls FUNCTION -> 1           of the library
 //     set WWN TABLE NAME VALUE      of the running host
 //     fault FUNCTION STATUS [NTH]   from now on, until "clear"
-//     write FILE TEXT               below the host's root
+//     write FILE TEXT, move FILE FILE   below the host's root
+//     image FILE MODEL VERSION, cut FILE SIZE, there FILE -> yes
+//     happens LINE                  to the host's log
 //     hold FUNCTION, held           its next call stands still, until "clear"; and now it does
 //     meanwhile ROW, begin, join    another client is to do it; all such begin; they are done
 //     wait                          for a refresh that something else has asked for
 //     advance SECONDS, reboot, forget (the calls that were counted)
 //
-// Behind the first six, lines stand that are logged meanwhile; "~ " before one: that are not, and
-// "> ": that tell a call of the library. Among their words, !FUNCTION=STATUS has the function's
-// next call fail, !FUNCTION=STATUS@2 the one after it. Values are as on mpcactl's command line,
-// and instances as road::instance_of has them.
+// Behind the first six, lines stand that are logged meanwhile; "~ " before one: that are not; and
+// at the end "> ": that tells a call of the library, "< ": that is printed. Among their words,
+// !FUNCTION=STATUS has the function's next call fail, !FUNCTION=STATUS@2 the one after it. Values
+// are as on mpcactl's command line, and instances as road::instance_of has them.
 #include "tests/hostile/sudden_ends.h"
 #include "tests/road/properties.h"
 #include "tests/services/table_text.h"
@@ -94,6 +96,14 @@ private:
         }
         if (row.verb == "write")
             std::ofstream(_road.root() / word(row, 0)) << word(row, 1);
+        else if (row.verb == "move")
+            std::filesystem::rename(_road.root() / word(row, 0), _road.root() / word(row, 1));
+        else if (row.verb == "cut")
+            std::filesystem::resize_file(_road.root() / word(row, 0), std::stoul(word(row, 1)));
+        else if (row.verb == "image")
+            write_image(_road.root() / word(row, 0), word(row, 1), word(row, 2));
+        else if (row.verb == "happens")
+            vlnsim_log(joined(row.words).c_str());
         else if (row.verb == "clear")
             vlnsim_clear_faults();
         else if (row.verb == "reboot")
@@ -119,6 +129,16 @@ private:
         return true;
     }
 
+    static void write_image(const std::string& path, const std::string& model,
+                            const std::string& version) {
+        constexpr std::size_t SIZE = 1000;
+        char error[256] = "";
+        EXPECT_EQ(vlnsim_write_firmware(path.c_str(), model.c_str(), version.c_str(), SIZE, error,
+                                        sizeof error),
+                  0)
+            << error;
+    }
+
     void look(const Row& row) {
         const std::string answer = joined(row.answer);
         if (row.verb == "show")
@@ -135,18 +155,30 @@ private:
         else if (row.verb == "log")
             EXPECT_EQ(std::to_string(_road.count_in_log(row.lines.at(0))), answer)
                 << row.lines.at(0);
+        else if (row.verb == "there")
+            EXPECT_EQ(std::filesystem::exists(_road.root() / word(row, 0)) ? "yes" : "no", answer);
         else if (row.verb == "calls")
             EXPECT_EQ(std::to_string(vlnsim_calls(word(row, 0).c_str())), answer);
         else
             operate(row);
     }
 
+    // Of a property, or of an element, "PROPERTY[2]".
+    static std::string shown(host::Instance instance, const std::string& name) {
+        const std::size_t bracket = name.find('[');
+        const host::Value* list = instance.property(name.substr(0, bracket));
+        if (bracket == name.npos || !list)
+            return road::text_of(instance, name);
+        const host::Value element = list->as_array().at(std::stoul(name.substr(bracket + 1)));
+        host::set(instance.properties, name, element);
+        return road::text_of(instance, name);
+    }
+
     static void expect_properties(const host::Instance& instance,
                                   const std::vector<std::string>& texts, std::size_t from) {
         for (std::size_t i = from; i < texts.size(); ++i) {
             const std::size_t equals = texts[i].find('=');
-            EXPECT_EQ(road::text_of(instance, texts[i].substr(0, equals)),
-                      texts[i].substr(equals + 1))
+            EXPECT_EQ(shown(instance, texts[i].substr(0, equals)), texts[i].substr(equals + 1))
                 << texts[i];
         }
     }
@@ -162,11 +194,15 @@ private:
 
     void operate(const Row& row) {
         const Operation make = operation(row);
-        const bool is_recorded = !row.lines.empty() && row.lines.back().starts_with("> ");
+        const std::string last = row.lines.empty() ? "" : row.lines.back();
+        const bool is_recorded = last.starts_with("> "), is_printed = last.starts_with("< ");
         const bool is_armed = arm(row);
         const std::size_t before = _road.log_text().size();
         vlnsim_record_calls(is_recorded);
+        if (is_printed)
+            testing::internal::CaptureStdout();
         const Answer answer = make();
+        _printed = is_printed ? testing::internal::GetCapturedStdout() : "";
         vlnsim_record_calls(0);
         expect_answer(row, answer, before);
         if (is_armed)
@@ -290,9 +326,11 @@ private:
         return {"OK"};
     }
 
-    static void expect_line(const std::string& line, const std::string& log) {
+    void expect_line(const std::string& line, const std::string& log) {
         if (line.starts_with("~ ")) {
             EXPECT_EQ(log.find(line.substr(2)), std::string::npos) << line;
+        } else if (line.starts_with("< ")) {
+            EXPECT_NE(_printed.find(line.substr(2)), std::string::npos) << line << _printed;
         } else if (line.starts_with("> ")) {
             std::string calls;
             char text[512] = "";
@@ -306,6 +344,7 @@ private:
 
     Road _road;
     std::size_t _refreshes = 0;
+    std::string _printed; // by the operation before
     std::vector<std::function<void()>> _prepared;
     std::vector<std::thread> _clients;
 };

@@ -27,13 +27,10 @@ void set_words(CMPIInstance* inst) {
     CMPIArray* words = broker->eft->newArray(broker, 3, CMPI_string, nullptr);
     const char* texts[] = {"one", "two,three"};
     for (CMPICount i = 0; i < 2; ++i) {
-        CMPIValue value;
-        value.string = broker->eft->newString(broker, texts[i], nullptr);
+        const CMPIValue value = {.string = broker->eft->newString(broker, texts[i], nullptr)};
         words->ft->setElementAt(words, i, &value, CMPI_string);
     }
-    CMPIValue value;
-    value.array = words;
-    set(inst, "Words", value, CMPI_stringA);
+    set(inst, "Words", {.array = words}, CMPI_stringA);
 }
 
 CMPIInstance* new_instance(const std::string& name_space, const std::string& name, CMPIUint16 level,
@@ -42,21 +39,15 @@ CMPIInstance* new_instance(const std::string& name_space, const std::string& nam
     CMPIInstance* inst = broker->eft->newInstance(broker, path, nullptr);
     const char* keys[] = {"Name", nullptr};
     inst->ft->setPropertyFilter(inst, properties, keys);
-    CMPIValue value;
-    value.string = broker->eft->newString(broker, name.c_str(), nullptr);
-    set(inst, "Name", value, CMPI_string);
-    value.uint16 = level;
-    set(inst, "Level", value, CMPI_uint16);
-    value.uint64 = 18446744073709551615ull;
-    set(inst, "Big", value, CMPI_uint64);
-    value.sint16 = -5;
-    set(inst, "Offset", value, CMPI_sint16);
-    value.real32 = 0.1f;
-    set(inst, "Ratio", value, CMPI_real32);
-    value.boolean = 1;
-    set(inst, "Flag", value, CMPI_boolean);
-    value.dateTime = broker->eft->newDateTimeFromBinary(broker, 1000000, 0, nullptr);
-    set(inst, "When", value, CMPI_dateTime);
+    set(inst, "Name", {.string = broker->eft->newString(broker, name.c_str(), nullptr)},
+        CMPI_string);
+    set(inst, "Level", {.uint16 = level}, CMPI_uint16);
+    set(inst, "Big", {.uint64 = 18446744073709551615ull}, CMPI_uint64);
+    set(inst, "Offset", {.sint16 = -5}, CMPI_sint16);
+    set(inst, "Ratio", {.real32 = 0.1f}, CMPI_real32);
+    set(inst, "Flag", {.boolean = 1}, CMPI_boolean);
+    set(inst, "When", {.dateTime = broker->eft->newDateTimeFromBinary(broker, 1000000, 0, nullptr)},
+        CMPI_dateTime);
     set_words(inst);
     inst->ft->setProperty(inst, "Note", nullptr, CMPI_string);
     return inst;
@@ -64,7 +55,8 @@ CMPIInstance* new_instance(const std::string& name_space, const std::string& nam
 
 // ---- Instances ----
 
-CMPIStatus cleanup(CMPIInstanceMI*, const CMPIContext*, CMPIBoolean) {
+template <class MI>
+CMPIStatus nothing_to_clean_up(MI*, const CMPIContext*, CMPIBoolean) {
     return kit::OK;
 }
 
@@ -137,14 +129,11 @@ CMPIStatus query(CMPIInstanceMI*, const CMPIContext*, const CMPIResult*, const C
     return {CMPI_RC_ERR_NOT_SUPPORTED, nullptr};
 }
 
-CMPIInstanceMIFT instance_table = {100,    100,    "good", cleanup, enumerate_names, enumerate, get,
-                                   create, modify, remove, query};
+CMPIInstanceMIFT instance_table = {
+    100,    100,    "good", nothing_to_clean_up, enumerate_names, enumerate, get, create,
+    modify, remove, query};
 
 // ---- Methods ----
-
-CMPIStatus method_cleanup(CMPIMethodMI*, const CMPIContext*, CMPIBoolean) {
-    return kit::OK;
-}
 
 void copy_argument(const CMPIArgs* in, CMPIArgs* out, const char* from, const char* to) {
     const CMPIData data = in->ft->getArg(in, from, nullptr);
@@ -201,13 +190,9 @@ CMPIStatus invoke(CMPIMethodMI*, const CMPIContext* context, const CMPIResult* r
     return kit::answer_number(result, 42);
 }
 
-CMPIMethodMIFT method_table = {100, 100, "good", method_cleanup, invoke};
+CMPIMethodMIFT method_table = {100, 100, "good", nothing_to_clean_up, invoke};
 
 // ---- Associations: each instance is linked to the next one ----
-
-CMPIStatus association_cleanup(CMPIAssociationMI*, const CMPIContext*, CMPIBoolean) {
-    return kit::OK;
-}
 
 // Calls visit(first, second) for each link that has the instance at an end in the role.
 template <class Visit>
@@ -262,9 +247,7 @@ CMPIStatus references(CMPIAssociationMI*, const CMPIContext*, const CMPIResult* 
     for_each_link(op, role, [&](const std::string& first, const std::string& second) {
         CMPIInstance* inst =
             broker->eft->newInstance(broker, link_path(op, first, second), nullptr);
-        CMPIValue value;
-        value.uint16 = 7;
-        set(inst, "Strength", value, CMPI_uint16);
+        set(inst, "Strength", {.uint16 = 7}, CMPI_uint16);
         result->ft->returnInstance(result, inst);
     });
     return kit::OK;
@@ -279,7 +262,7 @@ CMPIStatus reference_names(CMPIAssociationMI*, const CMPIContext*, const CMPIRes
 }
 
 CMPIAssociationMIFT association_table = {100,         100,
-                                         "good",      association_cleanup,
+                                         "good",      nothing_to_clean_up,
                                          associators, associator_names,
                                          references,  reference_names};
 

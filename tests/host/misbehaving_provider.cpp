@@ -32,203 +32,43 @@ CMPIrc set(const char* class_name, const char* property, CMPIValue value, CMPITy
     return inst->ft->setProperty(inst, property, &value, type).rc;
 }
 
-CMPIrc unknown_property(const Wrong&) {
-    return set("Test_Bad", "Nonsense", {.uint64 = 1}, CMPI_uint16);
-}
-
-CMPIrc wrong_type(const Wrong&) {
-    return set("Test_Bad", "Level", {.string = new_string("1")}, CMPI_string);
-}
-
-CMPIrc wild_text(const Wrong&) {
-    return set("Test_Bad", "Name", {.string = new_string("a\xC3(")}, CMPI_string);
-}
-
-CMPIrc wrong_width(const Wrong&) {
-    return set("Test_Bad", "Level", {.uint64 = 1}, CMPI_uint32);
-}
-
-CMPIrc scalar_for_array(const Wrong&) {
-    return set("Test_Bad", "Words", {.string = new_string("1")}, CMPI_string);
-}
-
-CMPIrc wrong_reference(const Wrong&) {
-    return set("Test_Link", "First", {.ref = kit::new_path(broker, "root/test", "Test_Bad", "x")},
-               CMPI_ref);
-}
-
-CMPIrc unknown_key(const Wrong&) {
-    CMPIObjectPath* path = kit::new_path(broker, "root/test", "Test_Bad");
-    CMPIValue value = {.uint64 = 1};
-    return path->ft->addKey(path, "Level", &value, CMPI_uint16).rc;
-}
-
-CMPIrc unknown_class(const Wrong&) {
-    CMPIStatus status = kit::OK;
-    CMPIObjectPath* path = kit::new_path(broker, "root/test", "Nonsense");
-    broker->eft->newInstance(broker, path, &status);
-    return status.rc;
-}
-
-CMPIrc incomplete_up_call(const Wrong& wrong) {
-    CMPIStatus status = kit::OK;
-    CMPIObjectPath* path = kit::new_path(broker, "root/test", "Test_Platform");
-    broker->bft->getInstance(broker, wrong.context, path, nullptr, &status);
-    return status.rc;
-}
-
-CMPIrc recursion(const Wrong& wrong) {
-    CMPIStatus status = kit::OK;
-    CMPIObjectPath* path = kit::new_path(broker, "root/test", "Test_Bad", "x");
-    broker->bft->getInstance(broker, wrong.context, path, nullptr, &status);
-    return status.rc;
-}
-
-CMPIrc leak_clone(const Wrong&) {
-    const CMPIString* string = new_string("never released");
-    string->ft->clone(string, nullptr);
-    return CMPI_RC_OK;
-}
-
-CMPIrc leak_context(const Wrong& wrong) {
-    broker->bft->prepareAttachThread(broker, wrong.context);
-    return CMPI_RC_OK;
-}
-
-CMPIrc double_release(const Wrong&) {
-    CMPIString* string = new_string("x");
-    const CMPIStringFT* ft = string->ft;
-    ft->release(string);
-    return ft->release(string).rc;
-}
-
-CMPIrc use_after_release(const Wrong&) {
-    CMPIString* string = new_string("x");
-    const CMPIStringFT* ft = string->ft;
-    ft->release(string);
+// What reading a text answers.
+CMPIrc read(const CMPIStringFT* ft, const CMPIString* string) {
     CMPIStatus status = kit::OK;
     ft->getCharPtr(string, &status);
     return status.rc;
 }
 
-CMPIrc keep(const Wrong&) {
-    kept = new_string("kept");
-    return CMPI_RC_OK;
-}
-
-CMPIrc use_after_call(const Wrong&) {
+CMPIrc get_from(const Wrong& wrong, const CMPIObjectPath* path) {
     CMPIStatus status = kit::OK;
-    kept->ft->getCharPtr(kept, &status);
+    broker->bft->getInstance(broker, wrong.context, path, nullptr, &status);
     return status.rc;
 }
 
-CMPIrc foreign_object(const Wrong&) {
-    CMPIString own = *new_string("x");
-    CMPIStatus status = kit::OK;
-    own.ft->getCharPtr(&own, &status);
-    return status.rc;
+CMPIObjectPath* path_of(const char* class_name) {
+    return kit::new_path(broker, "root/test", class_name);
 }
 
-CMPIrc overwritten_object(const Wrong&) {
-    CMPIString* string = new_string("x");
-    string->hdl = &string;
-    CMPIStatus status = kit::OK;
-    string->ft->getCharPtr(string, &status);
-    return status.rc;
-}
-
-CMPIrc other_kind(const Wrong& wrong) {
-    CMPIStatus status = kit::OK;
-    const CMPIString* string = new_string("x");
-    string->ft->getCharPtr(reinterpret_cast<const CMPIString*>(wrong.context), &status);
-    return status.rc;
-}
-
-CMPIrc release_parameter(const Wrong& wrong) {
-    return wrong.context->ft->release(const_cast<CMPIContext*>(wrong.context)).rc;
-}
-
-// What an object contains goes with it.
-CMPIrc release_contents(const Wrong& wrong) {
-    const CMPIData how = wrong.in->ft->getArg(wrong.in, "How", nullptr);
-    return how.value.string->ft->release(how.value.string).rc;
-}
-
-CMPIrc stale_element(const Wrong&) {
-    CMPIArray* array = broker->eft->newArray(broker, 1, CMPI_string, nullptr);
-    CMPIString* string = new_string("x");
-    CMPIValue value = {.string = string};
-    array->ft->setElementAt(array, 0, &value, CMPI_string);
-    string->ft->release(string);
-    return set("Test_Bad", "Words", {.array = array}, CMPI_stringA);
-}
-
-CMPIrc index_out_of_range(const Wrong&) {
-    CMPIArray* array = broker->eft->newArray(broker, 1, CMPI_uint8, nullptr);
-    CMPIValue value = {.uint64 = 1};
-    return array->ft->setElementAt(array, 1, &value, CMPI_uint8).rc;
-}
-
-CMPIrc null_text(const Wrong&) {
-    CMPIStatus status = kit::OK;
-    broker->eft->newString(broker, nullptr, &status);
-    return status.rc;
-}
-
-CMPIrc bad_datetime(const Wrong&) {
-    CMPIStatus status = kit::OK;
-    broker->eft->newDateTimeFromChars(broker, "20240230120000.000000+000", &status);
-    return status.rc;
-}
-
-CMPIrc result_twice(const Wrong& wrong) {
+CMPIrc return_number(const Wrong& wrong, CMPIType type) {
     CMPIValue value = {.uint64 = 0};
-    wrong.result->ft->returnData(wrong.result, &value, CMPI_uint32);
-    return wrong.result->ft->returnData(wrong.result, &value, CMPI_uint32).rc;
+    return wrong.result->ft->returnData(wrong.result, &value, type).rc;
 }
 
-CMPIrc result_of_other_type(const Wrong& wrong) {
+CMPIrc put_out(const Wrong& wrong, const char* name) {
     CMPIValue value = {.uint64 = 0};
-    return wrong.result->ft->returnData(wrong.result, &value, CMPI_uint16).rc;
+    return wrong.out->ft->addArg(wrong.out, name, &value, CMPI_uint8).rc;
 }
 
-CMPIrc result_of_other_kind(const Wrong& wrong) {
-    return wrong.result->ft->returnInstance(wrong.result, new_instance("Test_Bad")).rc;
-}
-
-CMPIrc unknown_output(const Wrong& wrong) {
-    CMPIValue value = {.uint64 = 0};
-    return wrong.out->ft->addArg(wrong.out, "How", &value, CMPI_uint8).rc;
-}
-
-CMPIrc output_of_other_type(const Wrong& wrong) {
-    CMPIValue value = {.uint64 = 0};
-    return wrong.out->ft->addArg(wrong.out, "Output", &value, CMPI_uint8).rc;
-}
-
-CMPIrc unattached_thread(const Wrong&) {
-    std::thread([] { new_string("x"); }).join();
-    return CMPI_RC_OK;
-}
-
-CMPIrc undetached_thread(const Wrong& wrong) {
+CMPIrc on_a_thread(const Wrong& wrong, bool leaves_something, bool detaches) {
     CMPIContext* own = broker->bft->prepareAttachThread(broker, wrong.context);
-    std::thread([own] { broker->bft->attachThread(broker, own); }).join();
-    return CMPI_RC_OK;
-}
-
-CMPIrc left_at_detach(const Wrong& wrong) {
-    CMPIContext* own = broker->bft->prepareAttachThread(broker, wrong.context);
-    std::thread([own] {
+    std::thread([=] {
         broker->bft->attachThread(broker, own);
-        new_string("x");
-        broker->bft->detachThread(broker, own);
+        if (leaves_something)
+            new_string("x");
+        if (detaches)
+            broker->bft->detachThread(broker, own);
     }).join();
     return CMPI_RC_OK;
-}
-
-CMPIrc attached_twice(const Wrong& wrong) {
-    return broker->bft->attachThread(broker, wrong.context).rc;
 }
 
 struct Row {
@@ -236,41 +76,78 @@ struct Row {
     CMPIrc (*act)(const Wrong& wrong);
 };
 
+#define DOES(...) [](const Wrong& wrong [[maybe_unused]]) -> CMPIrc { __VA_ARGS__ }
+
 constexpr Row ROWS[] = {
-    {"unknown property", unknown_property},
-    {"wrong type", wrong_type},
-    {"wild text", wild_text},
-    {"wrong width", wrong_width},
-    {"scalar for array", scalar_for_array},
-    {"wrong reference", wrong_reference},
-    {"unknown key", unknown_key},
-    {"unknown class", unknown_class},
-    {"incomplete up-call", incomplete_up_call},
-    {"recursion", recursion},
-    {"leak of a clone", leak_clone},
-    {"leak of a context", leak_context},
-    {"double release", double_release},
-    {"use after release", use_after_release},
-    {"keep", keep},
-    {"use after call", use_after_call},
-    {"foreign object", foreign_object},
-    {"overwritten object", overwritten_object},
-    {"other kind", other_kind},
-    {"release of a parameter", release_parameter},
-    {"release of contents", release_contents},
-    {"stale element", stale_element},
-    {"index out of range", index_out_of_range},
-    {"null text", null_text},
-    {"bad datetime", bad_datetime},
-    {"result twice", result_twice},
-    {"result of other type", result_of_other_type},
-    {"result of other kind", result_of_other_kind},
-    {"unknown output", unknown_output},
-    {"output of other type", output_of_other_type},
-    {"unattached thread", unattached_thread},
-    {"undetached thread", undetached_thread},
-    {"left at detach", left_at_detach},
-    {"attached twice", attached_twice},
+    {"unknown property", DOES(return set("Test_Bad", "Nonsense", {.uint64 = 1}, CMPI_uint16);)},
+    {"wrong type",
+     DOES(return set("Test_Bad", "Level", {.string = new_string("1")}, CMPI_string);)},
+    {"wild text",
+     DOES(return set("Test_Bad", "Name", {.string = new_string("a\xC3(")}, CMPI_string);)},
+    {"wrong width", DOES(return set("Test_Bad", "Level", {.uint64 = 1}, CMPI_uint32);)},
+    {"scalar for array",
+     DOES(return set("Test_Bad", "Words", {.string = new_string("1")}, CMPI_string);)},
+    {"wrong reference",
+     DOES(return set("Test_Link", "First",
+                     {.ref = kit::new_path(broker, "root/test", "Test_Bad", "x")}, CMPI_ref);)},
+    {"unknown key",
+     DOES(CMPIObjectPath* path = path_of("Test_Bad"); CMPIValue value = {.uint64 = 1};
+          return path->ft->addKey(path, "Level", &value, CMPI_uint16).rc;)},
+    {"unknown class",
+     DOES(CMPIStatus status = kit::OK;
+          broker->eft->newInstance(broker, path_of("Nonsense"), &status); return status.rc;)},
+    {"incomplete up-call", DOES(return get_from(wrong, path_of("Test_Platform"));)},
+    {"recursion",
+     DOES(return get_from(wrong, kit::new_path(broker, "root/test", "Test_Bad", "x"));)},
+    {"leak of a clone", DOES(const CMPIString* string = new_string("never released");
+                             string->ft->clone(string, nullptr); return CMPI_RC_OK;)},
+    {"leak of a context",
+     DOES(broker->bft->prepareAttachThread(broker, wrong.context); return CMPI_RC_OK;)},
+    {"double release",
+     DOES(CMPIString* string = new_string("x"); const CMPIStringFT* ft = string->ft;
+          ft->release(string); return ft->release(string).rc;)},
+    {"use after release",
+     DOES(CMPIString* string = new_string("x"); const CMPIStringFT* ft = string->ft;
+          ft->release(string); return read(ft, string);)},
+    {"keep", DOES(kept = new_string("kept"); return CMPI_RC_OK;)},
+    {"use after call", DOES(return read(kept->ft, kept);)},
+    {"foreign object", DOES(CMPIString own = *new_string("x"); return read(own.ft, &own);)},
+    {"overwritten object", DOES(CMPIString* string = new_string("x"); string->hdl = &string;
+                                return read(string->ft, string);)},
+    {"other kind",
+     DOES(return read(new_string("x")->ft, reinterpret_cast<const CMPIString*>(wrong.context));)},
+    {"release of a parameter",
+     DOES(return wrong.context->ft->release(const_cast<CMPIContext*>(wrong.context)).rc;)},
+    // What an object contains goes with it.
+    {"release of contents",
+     DOES(const CMPIData how = wrong.in->ft->getArg(wrong.in, "How", nullptr);
+          return how.value.string->ft->release(how.value.string).rc;)},
+    {"stale element",
+     DOES(CMPIArray* array = broker->eft->newArray(broker, 1, CMPI_string, nullptr);
+          CMPIValue value = {.string = new_string("x")};
+          array->ft->setElementAt(array, 0, &value, CMPI_string);
+          value.string->ft->release(value.string);
+          return set("Test_Bad", "Words", {.array = array}, CMPI_stringA);)},
+    {"index out of range",
+     DOES(CMPIArray* array = broker->eft->newArray(broker, 1, CMPI_uint8, nullptr);
+          CMPIValue value = {.uint64 = 1};
+          return array->ft->setElementAt(array, 1, &value, CMPI_uint8).rc;)},
+    {"null text", DOES(CMPIStatus status = kit::OK;
+                       broker->eft->newString(broker, nullptr, &status); return status.rc;)},
+    {"bad datetime", DOES(CMPIStatus status = kit::OK; broker->eft->newDateTimeFromChars(
+                         broker, "20240230120000.000000+000", &status);
+                          return status.rc;)},
+    {"result twice",
+     DOES(return_number(wrong, CMPI_uint32); return return_number(wrong, CMPI_uint32);)},
+    {"result of other type", DOES(return return_number(wrong, CMPI_uint16);)},
+    {"result of other kind",
+     DOES(return wrong.result->ft->returnInstance(wrong.result, new_instance("Test_Bad")).rc;)},
+    {"unknown output", DOES(return put_out(wrong, "How");)},
+    {"output of other type", DOES(return put_out(wrong, "Output");)},
+    {"unattached thread", DOES(std::thread([] { new_string("x"); }).join(); return CMPI_RC_OK;)},
+    {"undetached thread", DOES(return on_a_thread(wrong, false, false);)},
+    {"left at detach", DOES(return on_a_thread(wrong, true, true);)},
+    {"attached twice", DOES(return broker->bft->attachThread(broker, wrong.context).rc;)},
 };
 
 CMPIStatus method_cleanup(CMPIMethodMI*, const CMPIContext*, CMPIBoolean) {

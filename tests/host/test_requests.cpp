@@ -1,5 +1,5 @@
-// What the object manager refuses by itself, and what it takes from a provider. Operations that work are
-// those of mpcactl's tests.
+// What the object manager refuses by itself, and what it takes from a provider. Operations that
+// work are those of mpcactl's tests.
 
 #include "host/manager.h"
 

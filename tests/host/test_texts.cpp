@@ -2,7 +2,6 @@
 
 #include "host/datetime.h"
 #include "host/path_text.h"
-#include "host/scalar_text.h"
 #include "host/value_json.h"
 
 #include <gtest/gtest.h>
@@ -88,25 +87,6 @@ TEST(PathText, SaysWhatIsWrong) {
     EXPECT_NE(parse(nested).error, "");
 }
 
-TEST(ScalarText, NumbersAreExact) {
-    std::string error;
-    const auto back = [&](CMPIType type, const char* text) {
-        error.clear();
-        return host::number_to_text(host::scalar_from_text(type, text, error));
-    };
-    EXPECT_EQ(back(CMPI_uint64, "18446744073709551615"), "18446744073709551615");
-    EXPECT_EQ(back(CMPI_sint64, "-9223372036854775808"), "-9223372036854775808");
-    EXPECT_EQ(back(CMPI_real32, "0.1"), "0.1");
-    EXPECT_EQ(back(CMPI_real64, "1e300"), "1e+300");
-    for (const auto& [type, text] :
-         {std::pair(CMPI_uint64, "18446744073709551616"), std::pair(CMPI_sint8, "128"),
-          std::pair(CMPI_uint8, ""), std::pair(CMPI_uint8, "1 "), std::pair(CMPI_boolean, "1"),
-          std::pair(CMPI_real64, "x")}) {
-        back(type, text);
-        EXPECT_NE(error, "") << text;
-    }
-}
-
 TEST(Json, IsExactAndReadsBack) {
     const host::Class& known = *classes().find("Test_Base");
     const host::Json json = {{"Big", 18446744073709551615ull},
@@ -150,14 +130,6 @@ TEST(DateTime, BothFormsAgree) {
           "2024010100000a.000000+000", "00000001020304.000005:001", "20240101240000.000000+000"})
         EXPECT_FALSE(host::parse_datetime(text)) << text;
     EXPECT_TRUE(host::parse_datetime("20240101******.******+***"));
-}
-
-TEST(Names, TheNearestOnesAreSuggested) {
-    const std::vector<std::string> known = {"VLNMPCA_Card", "VLNMPCA_CardContainsChip",
-                                            "VLNMPCA_Chip", "CIM_Card"};
-    EXPECT_EQ(host::did_you_mean("VLNMPCA_Crad", known), "; did you mean VLNMPCA_Card?");
-    EXPECT_EQ(host::did_you_mean("Quartz", known), "");
-    EXPECT_EQ(host::nearest_names("card", known).size(), 3u);
 }
 
 } // namespace

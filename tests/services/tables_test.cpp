@@ -5,6 +5,7 @@
 //     change INSTANCE PROPERTY=VALUE... -> FAILED                OK without an arrow; of the
 //     create CLASS PROPERTY=VALUE... -> FAILED                       names of statuses, what
 //     delete INSTANCE -> NOT_FOUND                                   tells them apart
+//     get INSTANCE -> NOT_FOUND
 //     refresh                       the data are too old: new ones
 //     look CLASS                    there are instances
 //     show INSTANCE PROPERTY=TEXT   what is shown, as text_of gives it
@@ -23,7 +24,7 @@
 //     wait                          for a refresh that something else has asked for
 //     advance SECONDS, reboot, forget (the calls that were counted)
 //
-// Behind the first six, lines stand that are logged meanwhile; "~ " before one: that are not; and
+// Behind the first seven, lines stand that are logged meanwhile; "~ " before one: that are not; and
 // at the end "> ": that tells a call of the library, "< ": that is printed. Among their words,
 // !FUNCTION=STATUS has the function's next call fail, !FUNCTION=STATUS@2 the one after it. Values
 // are as on mpcactl's command line, and instances as road::instance_of has them.
@@ -286,6 +287,9 @@ private:
         else
             instance = road::instance_of(_road, word(row, 0));
         const host::Class& known = *classes.find(instance.path.class_name);
+        if (row.verb == "get")
+            return
+                [&manager, instance] { return Answer{word_of(manager.get(instance.path).status)}; };
         if (row.verb == "delete")
             return [&manager, instance] { return Answer{word_of(manager.remove(instance.path))}; };
         if (row.verb == "call") {

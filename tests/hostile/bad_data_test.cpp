@@ -72,6 +72,7 @@ TEST(Bad_Data, OverlongTextsAreCutAndWildBytesHarmNobody) {
     const std::string longest(255, 'x');
     set_value(FIRST_NIC, "portAttributes", "IfName", ("\"" + longest + "yyy\"").c_str());
     set_value(SECOND_NIC, "portAttributes", "IfName", R"({"bytes": "41FF80C328F09F"})");
+    set_value(FIRST_NIC, "adapterAttributes", "Model", ("\"" + longest + "\"").c_str());
     set_value(FIRST_NIC, "adapterAttributes", "HWVersion", R"("1.2")");
     set_value(FIRST_NIC, "adapterAttributes", "FirmwareVersion", R"("....")");
     set_value(SECOND_NIC, "adapterAttributes", "FirmwareVersion", R"("10.2.x.-4294967296")");
@@ -79,6 +80,7 @@ TEST(Bad_Data, OverlongTextsAreCutAndWildBytesHarmNobody) {
     const auto ports = road.enumerate("VLNMPCA_EthernetPort");
     ASSERT_EQ(ports.size(), 2u);
     EXPECT_EQ(text_of(ports[0], "Name"), longest);
+    EXPECT_EQ(road::first(road, "VLNMPCA_PortController", "Name"), longest + ":VR10420117:0");
     EXPECT_EQ(text_of(ports[1], "Name"),
               "A\xEF\xBF\xBD\xEF\xBF\xBD\xEF\xBF\xBD(\xEF\xBF\xBD\xEF\xBF\xBD");
     road.census();

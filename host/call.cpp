@@ -42,7 +42,7 @@ Call::Call(Core& made_by, std::string name, const char* what)
 
 Call::~Call() {
     top_call = _outer;
-    core.left += destroy_all(arena);
+    core.left.fetch_add(destroy_all(arena), std::memory_order_relaxed);
 }
 
 Call* Call::top() {

@@ -8,6 +8,17 @@
 #include <new>
 #include <vector>
 
+#if defined(__SANITIZE_THREAD__)
+extern "C" {
+void AnnotateIgnoreReadsBegin(const char* file, int line);
+void AnnotateIgnoreReadsEnd(const char* file, int line);
+void AnnotateIgnoreWritesBegin(const char* file, int line);
+void AnnotateIgnoreWritesEnd(const char* file, int line);
+void AnnotateIgnoreSyncBegin(const char* file, int line);
+void AnnotateIgnoreSyncEnd(const char* file, int line);
+}
+#endif
+
 namespace host {
 
 const char* to_string(Kind kind) {
@@ -26,6 +37,43 @@ Live_Counts Counters::snapshot() const {
 }
 
 namespace {
+
+constexpr auto RELAXED = std::memory_order_relaxed; // a count orders nothing
+
+// What goes on in the store is nothing to the thread sanitizer: its lock, taken for every object
+// that a provider makes, would put all calls into an order, and so hide the races of the provider.
+class Unseen {
+public:
+    Unseen() { begin(); }
+    ~Unseen() { end(); }
+    Unseen(const Unseen&) = delete;
+    Unseen& operator=(const Unseen&) = delete;
+
+#if defined(__SANITIZE_THREAD__)
+    static void begin() {
+        AnnotateIgnoreReadsBegin(__FILE_NAME__, __LINE__);
+        AnnotateIgnoreWritesBegin(__FILE_NAME__, __LINE__);
+        AnnotateIgnoreSyncBegin(__FILE_NAME__, __LINE__);
+    }
+    static void end() {
+        AnnotateIgnoreSyncEnd(__FILE_NAME__, __LINE__);
+        AnnotateIgnoreWritesEnd(__FILE_NAME__, __LINE__);
+        AnnotateIgnoreReadsEnd(__FILE_NAME__, __LINE__);
+    }
+#else
+    static void begin() {}
+    static void end() {}
+#endif
+};
+
+// But for this: who gets a slot comes after who had it.
+class Seen_Again {
+public:
+    Seen_Again() { Unseen::end(); }
+    ~Seen_Again() { Unseen::begin(); }
+    Seen_Again(const Seen_Again&) = delete;
+    Seen_Again& operator=(const Seen_Again&) = delete;
+};
 
 constexpr std::size_t CHUNK_SIZE = 64 * 1024; // and alignment
 constexpr std::size_t RESTING_SLOTS = 4096;   // released slots that are not used again yet
@@ -83,6 +131,7 @@ public:
 
     Object* add(Core& core, Kind kind, const void* table, std::unique_ptr<Body> body,
                 Arena& arena) {
+        const Unseen unseen;
         const std::lock_guard lock(_mutex);
         Object* object = take_slot();
         object->hdl = body.get();
@@ -98,6 +147,7 @@ public:
     }
 
     void remove(Object& object) {
+        const Unseen unseen;
         Bodies ended;
         const std::lock_guard lock(_mutex);
         unlink(object);
@@ -105,6 +155,7 @@ public:
     }
 
     std::size_t remove_all(Arena& arena, bool at_once) {
+        const Unseen unseen;
         Bodies ended;
         const std::lock_guard lock(_mutex);
         const std::size_t count = arena.count;
@@ -113,6 +164,7 @@ public:
     }
 
     void adopt(Object& object, Arena& arena) {
+        const Unseen unseen;
         const std::lock_guard lock(_mutex);
         unlink(object);
         link(object, arena);
@@ -157,6 +209,8 @@ private:
             Object* object = _oldest;
             _oldest = object->next;
             --_resting_count;
+            const Seen_Again seen;
+            object->state.load(std::memory_order_acquire);
             return object;
         }
         if (!_chunk || _chunk->used == Chunk::slots) {
@@ -168,10 +222,13 @@ private:
 
     // Bodies that may go go to ended: their destructors run without the lock.
     void retire(Object& object, Bodies& ended, bool at_once) {
-        object.state.store(Object::dead, std::memory_order_release);
+        {
+            const Seen_Again seen;
+            object.state.store(Object::dead, std::memory_order_release);
+        }
         Counters& counters = object.core->counters;
-        --counters.live[static_cast<std::size_t>(object.kind)];
-        --counters.alive;
+        counters.live[static_cast<std::size_t>(object.kind)].fetch_sub(1, RELAXED);
+        counters.alive.fetch_sub(1, RELAXED);
         std::unique_ptr<Body> body(object.body);
         retire_all(body->contents, ended, at_once);
         object.body = nullptr;
@@ -227,11 +284,12 @@ Verdict examine(const void* pointer) {
 Object* create_object(Core& core, Kind kind, const void* table, std::unique_ptr<Body> body,
                       Arena& arena) {
     Object* object = Store::the().add(core, kind, table, std::move(body), arena);
-    ++core.counters.live[static_cast<std::size_t>(kind)];
-    ++core.counters.created;
-    const std::size_t alive = ++core.counters.alive;
-    std::size_t peak = core.counters.peak.load();
-    while (peak < alive && !core.counters.peak.compare_exchange_weak(peak, alive)) {
+    Counters& counters = core.counters;
+    counters.live[static_cast<std::size_t>(kind)].fetch_add(1, RELAXED);
+    counters.created.fetch_add(1, RELAXED);
+    const std::size_t alive = counters.alive.fetch_add(1, RELAXED) + 1;
+    std::size_t peak = counters.peak.load(RELAXED);
+    while (peak < alive && !counters.peak.compare_exchange_weak(peak, alive, RELAXED)) {
     }
     return object;
 }

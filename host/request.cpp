@@ -14,7 +14,7 @@ B* body(typename B::Cmpi* object) {
 Request::Request(Core& core, const Class& known, const char* operation,
                  const std::string& name_space)
     : _call(core, known.name, operation), _name_space(name_space) {
-    ++core.calls;
+    core.calls.fetch_add(1, std::memory_order_relaxed);
     core.trace("call " + known.name + " " + operation);
     ContextBody entries;
     entries.entries = {{CMPIInvocationFlags, Value::unsigned_number(CMPI_uint32, 0)},

@@ -29,6 +29,7 @@ class Prepared_Change {
 public:
     Prepared_Change(road::Road& road, const Change& change);
 
+    const std::string& class_name() const { return _instance.path.class_name; }
     void make_ready() const; // makes what stands before it
     // As "OK 0" or "CMPI_RC_ERR_FAILED": the status, and what a method returned.
     std::string make() const;

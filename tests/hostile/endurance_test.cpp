@@ -3,118 +3,19 @@
 //
 // The suite does a little of each. VLN_OPERATIONS in the environment says how many requests are
 // made, and a fiftieth of them loads; ./run endure sets it, and gets a line now and then.
-#include "tests/hostile/changes.h"
+#include "tests/hostile/consoles.h"
 #include "tests/hostile/footprint.h"
 
 #include <algorithm>
 #include <cstdio>
-#include <cstdlib>
-#include <random>
-#include <set>
-#include <thread>
 
 namespace hostile {
 
 namespace {
 
-using host::ObjectPath;
-
-constexpr std::uint64_t SECOND = 1000000;
-constexpr std::uint64_t MORE_THAN_THE_CACHE = 11 * 60 * SECOND;
-
-std::size_t wanted_operations() {
-    constexpr std::size_t IN_THE_SUITE = 10000;
-    const char* text = std::getenv("VLN_OPERATIONS");
-    const std::size_t number = text ? std::strtoul(text, nullptr, 10) : 0;
-    return number ? number : IN_THE_SUITE;
-}
-
-bool tells_progress() {
-    return std::getenv("VLN_OPERATIONS") != nullptr;
-}
-
-// Some consoles on one host. What they may be answered depends on what others have done before, so
-// only the object manager's checks of the provider judge the answers.
-class Consoles {
-public:
-    Consoles(road::Road& road, const std::string& scenario, std::mt19937& random)
-        : _manager(road.manager()), _random(random) {
-        for (const Change& change : read_changes())
-            if (change.scenario == scenario)
-                _changes.emplace_back(road, change);
-        for (const host::Class* known : _manager.provider_classes()) {
-            _classes.push_back(known->name);
-            if (known->is_association)
-                _links.push_back(known->name);
-            for (ObjectPath& path : _manager.enumerate_names(known->name).value)
-                _paths.push_back(std::move(path));
-        }
-    }
-
-    void make_request() {
-        std::vector<unsigned> weights;
-        for (const Kind& kind : KINDS)
-            weights.push_back(kind.weight);
-        std::discrete_distribution<std::size_t> choose(weights.begin(), weights.end());
-        (this->*KINDS[choose(_random)].make)();
-    }
-
-private:
-    struct Kind {
-        unsigned weight; // of a hundred
-        void (Consoles::*make)();
-    };
-    static const Kind KINDS[9];
-
-    template <class List>
-    auto& any(List& list) {
-        return list[std::uniform_int_distribution<std::size_t>(0, list.size() - 1)(_random)];
-    }
-
-    void enumerate() { _manager.enumerate(any(_classes)); }
-    void list_names() { _manager.enumerate_names(any(_classes)); }
-    void get() { _manager.get(any(_paths)); }
-    void get_some() { _manager.get(any(_paths), {{"InstanceID", "DeviceID", "ElementName"}}); }
-    void walk_names() {
-        host::Association_Filter filter;
-        filter.via = any(_links);
-        _manager.associator_names(any(_paths), filter);
-    }
-    void walk_all_names() { _manager.reference_names(any(_paths)); }
-    void walk_all() { _manager.associators(any(_paths)); }
-    void change() {
-        if (!_changes.empty())
-            any(_changes).make();
-    }
-    void let_time_pass() {
-        vlnsim_advance(
-            std::uniform_int_distribution<std::uint64_t>(1, MORE_THAN_THE_CACHE)(_random));
-    }
-
-    host::Manager& _manager;
-    std::mt19937& _random;
-    std::vector<std::string> _classes, _links;
-    std::vector<ObjectPath> _paths;
-    std::vector<Prepared_Change> _changes;
-};
-
-const Consoles::Kind Consoles::KINDS[] = {
-    {35, &Consoles::enumerate}, {15, &Consoles::list_names}, {15, &Consoles::get},
-    {10, &Consoles::get_some},  {12, &Consoles::walk_names}, {3, &Consoles::walk_all_names},
-    {1, &Consoles::walk_all},   {6, &Consoles::change},      {3, &Consoles::let_time_pass},
-};
-
-// The hosts that the table of changes knows, each with all of its changes.
-std::vector<std::string> scenarios() {
-    std::set<std::string> names;
-    for (const Change& change : read_changes())
-        names.insert(change.scenario);
-    return {names.begin(), names.end()};
-}
-
 TEST(Endurance, MixedRequestsLeaveNothing) {
     const std::size_t operations = wanted_operations();
-    const std::vector<std::string> hosts = scenarios();
+    const std::vector<std::string> hosts = changed_hosts();
     constexpr std::size_t VISITS = 3; // of each host in the suite; the first ones find its size
     const std::size_t rounds = std::max(VISITS * hosts.size(), operations / 4000);
     std::mt19937 random(operations);
@@ -127,9 +28,12 @@ TEST(Endurance, MixedRequestsLeaveNothing) {
         {
             road::Road road({.scenario = scenario});
             root = road.root();
-            Consoles consoles(road, scenario, random);
+            std::vector<Change> changes = read_changes();
+            std::erase_if(changes, [&](const Change& row) { return row.scenario != scenario; });
+            Known_Host known(road, changes);
+            Console console(known, random);
             for (std::size_t i = 0; i < operations / rounds; ++i)
-                consoles.make_request();
+                console.make_request();
         }
         std::filesystem::remove_all(root);
         if (tells_progress()) {
@@ -173,13 +77,6 @@ TEST(Endurance, LoadsInAnyOrderOfClassesLeaveNothing) {
         std::filesystem::remove_all(road.root());
     }
     expect_no_growth(start, Footprint::now());
-}
-
-// Until the thread of a refresh has ended: this one and that of the port status are left.
-void wait_for_refresh() {
-    constexpr std::ptrdiff_t OTHER_THREADS = 2;
-    while (Footprint::now().threads > OTHER_THREADS)
-        std::this_thread::yield();
 }
 
 // A console that is left open looks now and then. The host has as many refreshes as its cache asks

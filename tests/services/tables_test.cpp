@@ -22,6 +22,7 @@
 //     hold FUNCTION, held           its next call stands still, until "clear"; and now it does
 //     meanwhile ROW, begin, join    another client is to do it; all such begin; they are done
 //     wait                          for a refresh that something else has asked for
+//     until INSTANCE                is there, after as many refreshes as that takes
 //     advance SECONDS, reboot, forget (the calls that were counted)
 //
 // Behind the first seven, lines stand that are logged meanwhile; "~ " before one: that are not; and
@@ -123,11 +124,25 @@ private:
             join();
         else if (row.verb == "wait")
             _road.wait_for_refreshes(++_refreshes);
+        else if (row.verb == "until")
+            wait_until_there(word(row, 0));
         else if (row.verb == "advance")
             vlnsim_advance(static_cast<std::uint64_t>(std::llround(std::stod(word(row, 0)) * 1e6)));
         else
             return false;
         return true;
+    }
+
+    // By whichever refresh shows it: the provider may have started some of its own.
+    void wait_until_there(const std::string& name) {
+        while (true) {
+            try {
+                road::instance_of(_road, name);
+                return;
+            } catch (const std::runtime_error&) {
+                vlnsim_advance(sudden_ends::STALE);
+            }
+        }
     }
 
     static void write_image(const std::string& path, const std::string& model,

@@ -64,7 +64,11 @@ AX_STATUS add_portal(const ISCSI_Call& call, const Login_Arguments& login,
     properties = wanted;
     properties.options.headerDigest = 0;
     properties.options.dataDigest = 0;
-    return VLN_MethodWrapper::AddTargetPortal(&call.name, call.portal, &properties);
+    const AX_STATUS added =
+        VLN_MethodWrapper::AddTargetPortal(&call.name, call.portal, &properties);
+    if (added != AX_STATUS_OK)
+        call.agent.requestSANRefresh(); // as only a success does else, and the portal is gone
+    return added;
 }
 
 // Asks for the refresh, or logs what the library answered.

@@ -2,6 +2,7 @@
 #include "tests/hostile/sweep.h"
 
 #include "host/core.h"
+#include "tests/road/hosts.h"
 
 #include <algorithm>
 #include <fstream>
@@ -14,18 +15,6 @@ namespace sweep {
 namespace {
 
 namespace fs = std::filesystem;
-
-// What up-calls find.
-constexpr const char* PLATFORM = R"({
-  "classes": [{"name": "OMC_RegisteredBaseServerProfile", "superclass": "PG_RegisteredProfile"}],
-  "instances": [
-    {"namespace": "root/ibmse", "class": "IBMSD_ComputerSystem",
-     "properties": {"CreationClassName": "IBMSD_ComputerSystem", "Name": "rack7-node3"}},
-    {"namespace": "root/ibmse", "class": "IBMSD_Chassis",
-     "properties": {"CreationClassName": "IBMSD_Chassis", "Tag": "chassis 12"}},
-    {"namespace": "root/pg_interop", "class": "OMC_RegisteredBaseServerProfile",
-     "properties": {"InstanceID": "OMC:Server", "RegisteredName": "Base Server"}}
-  ]})";
 
 // Points of one kind and operation in the suite's sample.
 #if defined(__SANITIZE_ADDRESS__) || defined(__SANITIZE_THREAD__)
@@ -200,7 +189,7 @@ std::string Point::text() const {
 
 Stage::Stage(const std::string& scenario, bool log)
     : _road({.scenario = scenario,
-             .platform = PLATFORM,
+             .platform = road::PLATFORM, // what up-calls find
              .log = log,
              .refuse = [this](bool is_up_call, const char* function, CMPIrc& code) {
                  return refuses(is_up_call, function, code);

@@ -1,5 +1,6 @@
 // The sweep, and what it needs to be complete.
 #include "tests/hostile/sweep.h"
+#include "tests/road/hosts.h"
 
 #include <cstdlib>
 #include <fstream>
@@ -67,8 +68,7 @@ TEST(Sweep, EachImplementedChangeHasARow) {
 }
 
 // A card with two kinds of function.
-const std::string SCENARIO = R"({"include": ")" VLN_SCENARIOS R"(/parts/cna.json",
-    "cards": [{"use": "cna", "functions": [{"use": "nic"}, {"use": "iscsi"}]}]})";
+const std::string SCENARIO = road::card(R"({"use": "nic"}, {"use": "iscsi"})");
 
 // Without memory for the agent a class is loaded without a share in it: its cleanup takes nothing
 // from the class that has found memory since.

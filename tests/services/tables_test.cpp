@@ -107,13 +107,13 @@ private:
         else if (row.verb == "happens")
             vlnsim_log(joined(row.words).c_str());
         else if (row.verb == "clear")
-            vlnsim_clear_faults();
+            end_hold();
         else if (row.verb == "reboot")
             vlnsim_reboot();
         else if (row.verb == "forget")
             vlnsim_clear_calls();
         else if (row.verb == "hold")
-            sudden_ends::hold(word(row, 0).c_str());
+            begin_hold(word(row, 0).c_str());
         else if (row.verb == "held")
             sudden_ends::wait_until_held();
         else if (row.verb == "meanwhile")
@@ -210,6 +210,7 @@ private:
 
     void operate(const Row& row) {
         const Operation make = operation(row);
+        settle();
         const std::string last = row.lines.empty() ? "" : row.lines.back();
         const bool is_recorded = last.starts_with("> "), is_printed = last.starts_with("< ");
         const bool is_armed = arm(row);
@@ -250,6 +251,16 @@ private:
             const Answer answer = make();
             expect_answer(row, answer, before);
         });
+    }
+
+    void begin_hold(const char* function) {
+        _is_held = true;
+        sudden_ends::hold(function);
+    }
+
+    void end_hold() {
+        _is_held = false;
+        vlnsim_clear_faults();
     }
 
     void begin() {
@@ -338,11 +349,23 @@ private:
                 reply.value.outputs};
     }
 
+    // A refresh that a change has asked for comes first: it need not bring new data of all.
     Answer refresh() {
-        vlnsim_advance(sudden_ends::STALE);
-        _road.enumerate("VLNMPCA_Card"); // starts it, and may see it already
-        _road.wait_for_refreshes(++_refreshes);
+        for (const std::uint64_t time : {std::uint64_t{0}, sudden_ends::STALE}) {
+            vlnsim_advance(time);
+            _road.enumerate("VLNMPCA_Card"); // starts it, and may see it already
+            settle();
+        }
         return {"OK"};
+    }
+
+    // Until no refresh is on its way any more: it would meet the failures that are meant for
+    // others.
+    void settle() {
+        if (_is_held)
+            return;
+        _refreshes = _road.count_in_log("---Created DataFetch_Handler thread");
+        _road.wait_for_refreshes(_refreshes);
     }
 
     void expect_line(const std::string& line, const std::string& log) {
@@ -363,7 +386,8 @@ private:
 
     Road _road;
     std::size_t _refreshes = 0;
-    std::string _printed; // by the operation before
+    bool _is_held = false; // a call of the library, until "clear"
+    std::string _printed;  // by the operation before
     std::vector<std::function<void()>> _prepared;
     std::vector<std::thread> _clients;
 };

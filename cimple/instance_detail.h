@@ -28,18 +28,7 @@ inline bool is_key(const Meta_Feature* feature) {
 // Calls visit(Meta_Key) for each key of the class in the features' order, until one answers false.
 template <class Visit>
 bool each_key(const Meta_Class* meta_class, Visit visit) {
-    const uint32 count = meta_class->num_keys;
-    if (meta_class->keys)
-        return std::all_of(meta_class->keys, meta_class->keys + count, visit);
-    for (uint32 i = 0, met = 0; i < meta_class->num_meta_features && met < count; ++i) {
-        const Meta_Feature* feature = meta_class->meta_features[i];
-        if (!is_key(feature))
-            continue;
-        ++met;
-        if (!visit(Meta_Key{key_name_hash(feature->name), i}))
-            return false;
-    }
-    return true;
+    return std::all_of(meta_class->keys, meta_class->keys + meta_class->num_keys, visit);
 }
 
 template <class T>

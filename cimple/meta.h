@@ -149,7 +149,7 @@ struct Meta_Class : Meta_Features {
     const Meta_Class* super_meta_class; // null at a root
     uint32 num_keys;
     const Meta_Repository* meta_repository;
-    const Meta_Key* keys = nullptr; // num_keys of them, ascending; null: nobody has listed them
+    const Meta_Key* keys = nullptr; // num_keys of them, ascending
 };
 
 // The classes, with a table that finds them by name: name_slot tells where a name stands, unless

@@ -2,6 +2,7 @@
 #ifndef TESTS_SERVICES_TABLE_TEXT_H
 #define TESTS_SERVICES_TABLE_TEXT_H
 
+#include <ostream>
 #include <string>
 #include <vector>
 
@@ -21,6 +22,8 @@ struct Table {
     std::string name; // "file_test"
     std::string host; // a file of the scenarios, or a JSON text
     std::vector<Row> rows;
+
+    friend void PrintTo(const Table& table, std::ostream* out) { *out << table.name; }
 };
 
 // All of the folder, in the order of their names.

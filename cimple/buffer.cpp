@@ -60,21 +60,6 @@ void Buffer::append(std::size_t count, char c) {
         append(c);
 }
 
-void Buffer::remove(std::size_t position, std::size_t size) {
-    if (position >= _size)
-        return;
-    size = std::min(size, _size - position);
-    std::memmove(_data + position, _data + position + size, _size - position - size);
-    _size -= size;
-    _data[_size] = '\0';
-}
-
-void Buffer::clear() noexcept {
-    _size = 0;
-    if (_data)
-        _data[0] = '\0';
-}
-
 int Buffer::format(const char* format, ...) {
     std::va_list arguments;
     va_start(arguments, format);

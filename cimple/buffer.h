@@ -29,8 +29,6 @@ public:
     void append(const char* text);
     void append(char c) { insert(_size, &c, 1); }
     void append(std::size_t count, char c);
-    void remove(std::size_t position, std::size_t size);
-    void clear() noexcept;
 
     // Append printed text and answer its length, or -1 (and append nothing) if it cannot be
     // printed.

@@ -86,21 +86,9 @@ uint64 hash_text(const String& text) {
     return hash_bytes(text.c_str(), text.size());
 }
 
-uint64 hash_array(const Array_Base& array, uint32 type) {
-    uint64 hash = array.size();
-    if (type != TYPE_STRING && type != TYPE_DATETIME)
-        return mix(hash ^ hash_bytes(array.data(), std::size_t{array.size()} * type_size(type)));
-    for (uint32 i = 0; i < array.size(); ++i) {
-        hash = mix(hash + (type == TYPE_STRING
-                               ? hash_text(static_cast<const String*>(array.data())[i])
-                               : static_cast<const Datetime*>(array.data())[i].usec()));
-    }
-    return hash;
-}
-
 uint64 hash_value(const Instance* instance, const Meta_Property* p) {
     if (p->subscript != 0)
-        return hash_array(member_as<Array_Base>(instance, p->offset), p->type);
+        return member_as<Array_Base>(instance, p->offset).size(); // CIM knows no such key
     if (p->type == TYPE_STRING)
         return hash_text(member_as<String>(instance, p->offset));
     if (p->type == TYPE_DATETIME)

@@ -127,15 +127,6 @@ void String::prepend(const String& text) {
     swap(sum);
 }
 
-void String::reserve(uint32 capacity) {
-    const std::size_t wanted = capacity > size() ? capacity : size();
-    if (writable(wanted))
-        return;
-    String grown(allocate(wanted));
-    add(grown._rep, c_str(), size());
-    swap(grown);
-}
-
 String& String::operator+=(const String& text) {
     append(text);
     return *this;
@@ -176,11 +167,6 @@ bool operator==(const String& a, const String& b) noexcept {
 bool operator==(const String& a, const char* b) noexcept {
     const std::size_t size = text_length(b);
     return a.size() == size && (size == 0 || std::memcmp(a.c_str(), b, size) == 0);
-}
-
-bool operator<(const String& a, const String& b) noexcept {
-    const int order = std::memcmp(a.c_str(), b.c_str(), a.size() < b.size() ? a.size() : b.size());
-    return order != 0 ? order < 0 : a.size() < b.size();
 }
 
 String operator+(const String& a, const String& b) {

@@ -57,7 +57,6 @@ public:
     void append(char c) { append(&c, 1); }
     void prepend(const String& text);
     void clear() noexcept { String().swap(*this); }
-    void reserve(uint32 capacity);
     String& operator+=(const String& text);
 
     // Index of the first match, or -1.
@@ -89,7 +88,6 @@ private:
 // Exact, length first.
 bool operator==(const String& a, const String& b) noexcept;
 bool operator==(const String& a, const char* b) noexcept;
-bool operator<(const String& a, const String& b) noexcept; // by bytes
 String operator+(const String& a, const String& b);
 
 // Without regard to case.

@@ -80,6 +80,17 @@ TEST_F(Log_Death_Test, OffUnlessTurnedOn) {
         EXPECT_EQ(log_of(settings, one_of_each), "-") << (settings ? settings : "no CIMPLE_HOME");
 }
 
+// Warnings of the conversion have a switch of their own.
+TEST_F(Log_Death_Test, WarningsCanBeSwitchedOff) {
+    const std::string log = log_of("LOG_LEVEL=DBG\n", [] {
+        if (set_log_enabled(true) != -1 || set_log_enabled(false) != 0)
+            std::_Exit(1);
+        one_of_each();
+    });
+    EXPECT_EQ(log.find("a warning"), std::string::npos);
+    EXPECT_NE(log.find("detail 7"), std::string::npos);
+}
+
 // The trace of calls tells more than the answers do.
 TEST_F(Log_Death_Test, CallsAreTraced) {
     const std::string log = log_of("LOG_LEVEL=DBG\n", [this] {

@@ -68,6 +68,9 @@ TEST(Instance, ClonesShareNothingThatChanges) {
     EXPECT_NE(second->Objects.value[2], holder->Objects.value[2]);
     second->Objects.value[2]->Slot.set(4);
     EXPECT_FALSE(identical(holder.get(), second.get()));
+    second->Objects.append(nullptr);
+    EXPECT_FALSE(identical(holder.get(), second.get()));
+    EXPECT_FALSE(identical(holder.get(), types.get()));
 
     Ref<Test_Link> link(create<Test_Link>());
     Ref<Test_Link> unlinked(clone(link.get()));
@@ -113,6 +116,26 @@ TEST(Instance, CopyReplacesReferencesAndNeedsOneClass) {
     copy_keys(base.get(), keys.get());
     EXPECT_TRUE(key_eq(base.get(), keys.get()));
     EXPECT_TRUE(base->Caption.is_null());
+}
+
+Test_Crowd* make_crowd() {
+    auto* crowd = create_null<Test_Crowd>();
+    crowd->Head = make_base("head", 1);
+    crowd->Others.append(make_base("one", 1));
+    crowd->Others.append(nullptr);
+    return crowd;
+}
+
+TEST(Instance, KeysMayBeTakenAway) {
+    Ref<Test_Base> base(make_base("a", 1));
+    base->Caption.set("stays");
+    nullify_keys(base.get());
+    EXPECT_TRUE(base->Id.is_null() && base->Slot.is_null());
+    EXPECT_EQ(base->Caption.value, String("stays"));
+    Ref<Test_Crowd> crowd(make_crowd());
+    nullify_keys(crowd.get());
+    EXPECT_NE(crowd->Head, nullptr); // a reference has no flag of its own
+    EXPECT_EQ(crowd->Others.value.size(), 2u);
 }
 
 TEST(Instance, ClearEmptiesEverything) {
@@ -189,6 +212,27 @@ TEST(Instance, Prints) {
                                          "        uint32 Slot = 2;\n"
                                          "    };\n"
                                          "}\n");
+    Ref<Test_Crowd> crowd(make_crowd());
+    EXPECT_EQ(printed(crowd.get(), false), "Test_Crowd\n"
+                                           "{\n"
+                                           "    Test_Base Head = Test_Base\n"
+                                           "    {\n"
+                                           "        string Id = \"head\";\n"
+                                           "        uint32 Slot = 1;\n"
+                                           "        string Caption = NULL;\n"
+                                           "    };\n"
+                                           "    Test_Base Tail = NULL;\n"
+                                           "    Test_Base Others = { Test_Base\n"
+                                           "    {\n"
+                                           "        string Id = \"one\";\n"
+                                           "        uint32 Slot = 1;\n"
+                                           "        string Caption = NULL;\n"
+                                           "    }, NULL };\n"
+                                           "}\n");
+    crowd->Others.null = 1;
+    EXPECT_NE(printed(crowd.get(), false).find("    Test_Base Others = NULL;\n"), std::string::npos);
+    base->Id.set("\f\r");
+    EXPECT_NE(printed(base.get(), true).find("Id = \"\\f\\r\""), std::string::npos);
     Ref<Test_Types> types(create<Test_Types>(true));
     types->B.set(true);
     types->C16.set(u'\u20AC');

@@ -15,6 +15,11 @@ TEST(Meta, NamesAreFoundInAnyCase) {
     EXPECT_EQ(find_meta_class(nullptr, "Test_Sub"), nullptr);
     const Meta_Repository none{nullptr, 0};
     EXPECT_EQ(find_meta_class(&none, "Test_Sub"), nullptr);
+    Meta_Repository unsorted = meta_repository; // without the table of names
+    unsorted.num_name_slots = 0;
+    EXPECT_EQ(find_meta_class(&unsorted, "test_SUB"), &Test_Sub::static_meta_class);
+    EXPECT_EQ(find_meta_class(&unsorted, "Test_Su"), nullptr);
+    EXPECT_EQ(find_class_in_tree(nullptr, "Test_Sub"), nullptr);
     EXPECT_TRUE(name_equal(nullptr, nullptr));
     EXPECT_FALSE(name_equal("", nullptr));
 
@@ -29,6 +34,15 @@ TEST(Meta, NamesAreFoundInAnyCase) {
               &Test_Base::static_meta_class);
     EXPECT_EQ(find_class_in_tree(&Test_Sub::static_meta_class, "Test_Link"),
               &Test_Link::static_meta_class);
+}
+
+TEST(Meta, WordsOfMofStandForTypesAndFlags) {
+    for (uint32 type = 0; type < NUM_TYPES; ++type)
+        EXPECT_EQ(type_name_to_code(type_name(type)), static_cast<Type>(type));
+    EXPECT_EQ(type_name_to_code("UINT64"), TYPE_UINT64);
+    EXPECT_EQ(type_name_to_code("uint65"), TYPE_NONE);
+    EXPECT_EQ(flag_by_name("key"), FLAG_KEY);
+    EXPECT_EQ(flag_by_name("lock"), 0u);
 }
 
 TEST(Meta, SubclassesAreRelatedByPointerOrName) {

@@ -1,6 +1,8 @@
 // Strings, arrays, datetimes and buffers: the values that members hold.
 #include "cimple/array.h"
+#include "cimple/assert.h"
 #include "cimple/buffer.h"
+#include "cimple/cimom.h"
 #include "cimple/datetime.h"
 #include "cimple/string.h"
 #include "cimple/thread.h"
@@ -43,6 +45,20 @@ TEST(String, MayBeAppendedToItself) {
     EXPECT_STREQ(text.c_str(), "ff");
     text.prepend(text);
     EXPECT_STREQ(text.c_str(), "ffff");
+}
+
+TEST(String, ComparesByLengthAndThenInAnyCaseIfTold) {
+    EXPECT_FALSE(String("abc") == String("abd") || String("abc") == String("abcd"));
+    EXPECT_TRUE(equali(String("aBc"), String("AbC")) && equali(String("aBc"), "AbC"));
+    EXPECT_FALSE(equali(String("abc"), String("abcd")) || equali(String("abc"), String("abd")));
+    EXPECT_FALSE(equali(String("abc"), "abd") || equali(String("abc"), nullptr));
+    String text("ab");
+    text.append("cd");
+    text.append(static_cast<const char*>(nullptr));
+    EXPECT_EQ(text, String("abcd"));
+    text.erase(4);
+    text.erase(1, 0);
+    EXPECT_EQ(text, String("abcd"));
 }
 
 TEST(String, CountsAreKeptAcrossThreads) {
@@ -102,6 +118,18 @@ TEST(Array, ElementsOfItselfMayBeInserted) {
     EXPECT_FALSE(wide == (Array<uint64>{1, 3}));
 }
 
+TEST(Array, ReservesExactlyWhatIsAskedFor) {
+    Array<uint16> a{1};
+    EXPECT_EQ(a.capacity(), 8u);
+    a.reserve(4);
+    EXPECT_EQ(a.capacity(), 8u);
+    a.reserve(19);
+    EXPECT_EQ(a.capacity(), 19u);
+    EXPECT_THROW(a.reserve(UINT32_MAX), std::bad_alloc);
+    EXPECT_THROW(a.resize(UINT32_MAX, 0), std::bad_alloc);
+    EXPECT_TRUE(a == (Array<uint16>{1}));
+}
+
 // ---- Datetime ----
 
 // The host's zone for a test, put back afterwards.
@@ -153,6 +181,9 @@ TEST(Datetime, ReadsAndWritesBothForms) {
         EXPECT_STREQ(value.ascii().c_str(), c.text);
         EXPECT_STREQ(value.readable().c_str(), c.readable);
     }
+    Datetime moved(1500000, -300, true);
+    moved.usec(2000000);
+    EXPECT_STREQ(moved.ascii().c_str(), "19700101000002.000000-300");
     Datetime carried;
     EXPECT_TRUE(carried.set("20239931000000.000000+000"));
     EXPECT_STREQ(carried.ascii().c_str(), "20310331000000.000000+000");
@@ -224,6 +255,52 @@ TEST(Buffer, FormatsTextsLongerThanItsRoom) {
     EXPECT_EQ(buffer.size(), 14004u);
     EXPECT_EQ(std::string(buffer.data()).substr(13998), "yyy|7>");
     EXPECT_EQ(buffer.format("%s", ""), 0);
+    buffer.insert(1, "abc", 3);
+    buffer.insert(SIZE_MAX, "end", 3);
+    buffer.insert(0, "", 0);
+    EXPECT_EQ(std::string(buffer.data()).substr(0, 5), "xabcx");
+    EXPECT_EQ(std::string(buffer.data()).substr(14003), "y|7>end");
+    EXPECT_THROW(buffer.reserve(SIZE_MAX), std::bad_alloc);
+    EXPECT_THROW(buffer.insert(0, "x", SIZE_MAX / 4), std::bad_alloc);
+    EXPECT_EQ(buffer.size(), 14010u);
+}
+
+// ---- What a developer is told ----
+
+TEST(Diagnostics, GoToStandardError) {
+    testing::internal::CaptureStderr();
+    __cimple_trace("here.cpp", 7, "text");
+    EXPECT_EQ(testing::internal::GetCapturedStderr(), "TRACE: here.cpp(7): text\n");
+    EXPECT_DEATH(__cimple_assert("here.cpp", 7, "f", "a == b"),
+                 "^here.cpp\\(7\\): f\\(\\): assert: a == b\n");
+    Array<Instance*> instances;
+    EXPECT_DEATH(cimom::enum_instances("root/test", nullptr, instances),
+                 "^NOT IMPLEMENTED.\n.*: assert: false\n");
+}
+
+// ---- Thread ----
+
+TEST(Thread, ADetachedOneRunsAndTellsItsMaker) {
+    struct Meeting {
+        Mutex mutex;
+        Cond cond;
+        bool done = false;
+    } static meeting;
+    Thread thread;
+    ASSERT_EQ(Thread::create_detached(
+                  thread,
+                  [](void* argument) -> void* {
+                      auto& there = *static_cast<Meeting*>(argument);
+                      Auto_Mutex lock(there.mutex);
+                      there.done = true;
+                      there.cond.signal();
+                      return nullptr;
+                  },
+                  &meeting),
+              0);
+    Auto_Mutex lock(meeting.mutex);
+    while (!meeting.done)
+        meeting.cond.wait(meeting.mutex);
 }
 
 } // namespace

@@ -16,6 +16,7 @@ constexpr uint32 PROFILE_MANAGEMENT = 436, CHANGE_PERSONALITY = 422, SRIOV = 35;
 
 AX_AdapterPortConfig told; // by AX_GetAdapterPortConfig
 uint32 told_channels, told_personalities, told_capabilities;
+AX_STATUS refusal; // of what no service asks for
 std::string calls; // those that set something
 
 class Port_Configuration : public testing::Test {
@@ -31,6 +32,7 @@ protected:
         told.port[0].function[0].protocol = AX_PROTOCOL_NIC;
         told.port[0].function[0].flags = AX_FUNCTION_NIC;
         told_channels = told_personalities = told_capabilities = 0;
+        refusal = AX_STATUS_OK;
         calls.clear();
         log_capture::take();
     }
@@ -84,6 +86,14 @@ TEST_F(Port_Configuration, WhatNoServiceAsksFor) {
     fake.features = {{CHANGE_PERSONALITY, 1}};
     EXPECT_EQ(VLN_MethodWrapper::ChangeAdapterPersonality(&NAME, 2), 0u);
     EXPECT_EQ(calls, "defaults, personality 2, ");
+    refusal = 190;
+    EXPECT_EQ(VLN_MethodWrapper::ChangeAdapterPersonality(&NAME, 2), 190u);
+    EXPECT_TRUE(logged("AX_ChangeAdapterPersonality error: 190"));
+    fake.features = {{PROFILE_MANAGEMENT, 1}};
+    EXPECT_EQ(VLN_MethodWrapper::FactoryDefaults(&NAME), 190u);
+    EXPECT_TRUE(logged("AX_SetAdapterPortConfigDefaults error: 190"));
+    fake.featureFailures = {{PROFILE_MANAGEMENT, 191}};
+    EXPECT_EQ(VLN_MethodWrapper::ChangeAdapterPersonality(&NAME, 2), 191u);
 }
 
 TEST_F(Port_Configuration, MoreThanARecordHasRoomForIsRefused) {
@@ -120,7 +130,7 @@ AX_STATUS AX_SetAdapterPortConfig(AX_WWN, const AX_AdapterPortConfig* config) {
 }
 AX_STATUS AX_SetAdapterPortConfigDefaults(AX_WWN) {
     calls += "defaults, ";
-    return AX_STATUS_OK;
+    return refusal;
 }
 AX_STATUS AX_SetAriFuncs(AX_WWN, uint32_t count) {
     calls += "functions " + std::to_string(count) + ", ";
@@ -149,7 +159,7 @@ AX_STATUS AX_GetAdapterPersonalityInfo(AX_WWN, AX_AdapterPersonalityInfo* info) 
 }
 AX_STATUS AX_ChangeAdapterPersonality(AX_WWN, uint32_t personality) {
     calls += "personality " + std::to_string(personality) + ", ";
-    return AX_STATUS_OK;
+    return refusal;
 }
 
 // Not asked here.

@@ -110,6 +110,37 @@ TEST(Hardware, ACardIsKnownThroughAnyOfItsFunctions) {
     }
 }
 
+TEST(Hardware, WhatAPortTakesAndShowsToTheEye) {
+    const struct {
+        const char* function;
+        const char* connector;
+        const char* light;
+    } rows[] = {
+        {R"("adapterAttributes": {"PortConnectionType": 1}, "beacon": 3)",
+         "LocalPhysicalPort:0,Transceiver:SFP", "2"},
+        {R"("adapterAttributes": {"PortConnectionType": 2}, "beacon": 2)",
+         "LocalPhysicalPort:0,Transceiver:10GBaseT", "3"},
+        {R"("adapterAttributes": {"PortConnectionType": 3}, "beacon": null)", "LocalPhysicalPort:0",
+         "-"},
+    };
+    for (const auto& row : rows) {
+        SCOPED_TRACE(row.function);
+        Road road({.scenario = card(R"({"use": "nic", )" + std::string(row.function) + "}")});
+        EXPECT_EQ(first(road, "VLNMPCA_PhysicalConnector", "OtherIdentifyingInfo"), row.connector);
+        EXPECT_EQ(first(road, "VLNMPCA_EthernetPort", "LocationIndicator"), row.light);
+    }
+}
+
+// A module that does not measure itself is shown by its name plate.
+TEST(Hardware, AModuleWithoutDiagnosticsHasNoReadings) {
+    Road road({.scenario = card(R"({"use": "nic", "sff": {"a0": {
+        "0": {"bytes": "03 04 07"}, "20": "VORLAN          ", "92": {"bytes": "00"}}, "a2": "FF"}})")});
+    expect_properties(road.enumerate("VLNMPCA_Transceiver").at(0),
+                      {{"Manufacturer", "VORLAN"},
+                       {"SFPStatus", "-"},
+                       {"TemperatureUnit", "-"}});
+}
+
 TEST(Hardware, VitalProductDataOfACard) {
     Road road({.scenario = card(R"({"use": "nic", "vpd": {"ZZ": "nobody's", "PA": "Adapter",
         "FN": "0123456789ABCDEF more", "CF": 80, "RI": 254,

@@ -37,7 +37,7 @@ bool parse_number(std::string_view text, Number& number) {
 }
 
 std::string out_of_range(CMPIType type, std::string_view text) {
-    return "\"" + std::string(text) + "\" is no " + type_name(type);
+    return "\"" + cut(text) + "\" is no " + type_name(type);
 }
 
 Value integer_from_text(CMPIType type, std::string_view text, std::string& error) {
@@ -80,13 +80,13 @@ Value scalar_from_text(CMPIType type, std::string_view text, std::string& error)
     case CMPI_boolean:
         if (same_name(text, "true") || same_name(text, "false"))
             return Value::boolean(same_name(text, "true"));
-        error = "\"" + std::string(text) + "\" is neither TRUE nor FALSE";
+        error = "\"" + cut(text) + "\" is neither TRUE nor FALSE";
         return Value::null(type);
     case CMPI_string:
         return Value::text(std::string(text));
     case CMPI_dateTime:
         if (!parse_datetime(text))
-            error = "\"" + std::string(text) +
+            error = "\"" + cut(text) +
                     "\" is no datetime (yyyymmddhhmmss.mmmmmm+UTC or ddddddddhhmmss.mmmmmm:000)";
         return Value::datetime(std::string(text));
     case CMPI_real32:
@@ -99,6 +99,12 @@ Value scalar_from_text(CMPIType type, std::string_view text, std::string& error)
     default:
         return integer_from_text(type, text, error);
     }
+}
+
+std::string cut(std::string_view text) {
+    constexpr std::size_t LONGEST = 200;
+    return text.size() > LONGEST ? std::string(text.substr(0, LONGEST)) + "..."
+                                 : std::string(text);
 }
 
 } // namespace host

@@ -14,6 +14,9 @@ std::string number_to_text(const Value& value);
 // goes to error.
 Value scalar_from_text(CMPIType type, std::string_view text, std::string& error);
 
+// A text of somebody else's as messages show it: a long one is cut.
+std::string cut(std::string_view text);
+
 } // namespace host
 
 #endif // HOST_SCALAR_TEXT_H

@@ -1,6 +1,7 @@
 #include "host/value_check.h"
 
 #include "host/datetime.h"
+#include "host/scalar_text.h"
 
 namespace host {
 
@@ -28,7 +29,7 @@ Complaint check_contents(const ClassRepository& classes, const Slot_Type& slot,
     if (const Instance* instance = value.as_instance())
         return check_class(classes, instance->class_name(), slot.target);
     if (value.type == CMPI_dateTime && !parse_datetime(value.as_text()))
-        return "\"" + value.as_text() + "\" is no datetime";
+        return "\"" + cut(value.as_text()) + "\" is no datetime";
     return std::nullopt;
 }
 

@@ -201,6 +201,7 @@ TEST(Mpcactl, LargeAndWildLinesDoNotHurt) {
     const std::string wrong = run_shell("mpcactl $GOOD run script").err;
     EXPECT_NE(wrong.find("is no uint16"), std::string::npos);
     EXPECT_NE(wrong.find("nested too deeply"), std::string::npos);
+    EXPECT_LT(wrong.size(), 1500u);
 }
 
 TEST(Mpcactl, TypedAloneItAsks) {

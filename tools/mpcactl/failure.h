@@ -2,6 +2,7 @@
 #ifndef MPCACTL_FAILURE_H
 #define MPCACTL_FAILURE_H
 
+#include "host/scalar_text.h"
 #include "host/value.h"
 
 #include <stdexcept>
@@ -30,8 +31,7 @@ public:
 
 // A word of the user's as messages show it: an empty one can be seen, a long one is cut.
 inline std::string shown(const std::string& word) {
-    constexpr std::size_t longest = 200;
-    return word.empty() ? "\"\"" : word.size() > longest ? word.substr(0, longest) + "..." : word;
+    return word.empty() ? "\"\"" : host::cut(word);
 }
 
 } // namespace mpcactl

@@ -220,9 +220,10 @@ void read_server(const Node& values, Host& host) {
         const auto node = values.member(key);
         if (!node)
             return;
-        if (node->text().size() >= size)
+        const std::string text = values.wild_text(key, {});
+        if (text.size() >= size)
             node->fail("longer than " + std::to_string(size - 1) + " bytes");
-        copy_text(node->text(), field, size);
+        copy_text(text, field, size);
     };
     copy("hostName", host.server.hostName, sizeof host.server.hostName);
     copy("targetOS", host.server.targetOS, sizeof host.server.targetOS);

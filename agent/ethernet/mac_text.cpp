@@ -2,6 +2,7 @@
 
 #include "cimple/assert.h"
 #include "foundation/log.h"
+#include "foundation/utf8.h"
 
 #include <cstring>
 
@@ -15,7 +16,8 @@ bool removeSeptr(const std::string& address, String& portPermMACAddr) {
 #ifdef CIMPLE_CHECK_LOCKS
     CIMPLE_ASSERT(12 == strlen(portPermMACAddr.c_str()));
 #endif
-    if (portPermMACAddr.size() == MAC_DIGITS)
+    if (portPermMACAddr.size() == MAC_DIGITS &&
+        is_utf8({portPermMACAddr.c_str(), portPermMACAddr.size()}))
         return true;
     VLN_LOG(VLN_ERR, "Skipping port: [%s] is not a MAC address", address.c_str());
     return false;

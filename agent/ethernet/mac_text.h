@@ -11,8 +11,9 @@ namespace cimple {
 inline constexpr uint32 MAC_DIGITS = 12;
 
 // The address without its separators ("-", ":" or blanks). An address that does not come to 12
-// characters is the library's fault: builds that check locks, the ones for development, end there;
-// the others log the text and answer false, and the port is left out.
+// bytes is the library's fault: builds that check locks, the ones for development, end there; the
+// others log the text and answer false, and the port is left out. So it is in all builds if the
+// bytes are no text.
 bool removeSeptr(const std::string& address, String& portPermMACAddr);
 
 } // namespace cimple

@@ -115,7 +115,7 @@ void setTargetOSTypes(CIM_SoftwareIdentity& software) {
     if (const AX_STATUS status = VLN_MethodWrapper::getTargetOS_info(system))
         VLN_LOG(VLN_ERR, "getTargetOS_info failed with %d", status);
     else
-        append_target_system(software, String(system));
+        append_target_system(software, text(system));
 }
 
 void append_target_system(CIM_SoftwareIdentity& software, const String& system) {

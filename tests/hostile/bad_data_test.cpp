@@ -66,6 +66,18 @@ TEST(Bad_Data, AnAddressWithoutTwelveDigitsCostsItsPortAndNoOther) {
 }
 #endif
 
+TEST(Bad_Data, AnAddressOfTwelveWildBytesCostsItsPortAndNoOther) {
+    for (const char* kind : {"CurrentMACAddress", "PermanentMACAddress"}) {
+        SCOPED_TRACE(kind);
+        Road road({.scenario = card(""), .log = true});
+        set_value(FIRST_NIC, "portAttributes", kind, R"({"bytes": "3032FF3634633A303030303A3031"})");
+        road.census();
+        expect_counts(road, {{"VLNMPCA_EthernetPort", 1}, {"VLNMPCA_Card", 1}});
+        road.close();
+        EXPECT_GE(road.count_in_log("is not a MAC address"), 1u);
+    }
+}
+
 // The longest text that a reader keeps has 255 bytes; each byte that is no UTF-8 is replaced.
 TEST(Bad_Data, OverlongTextsAreCutAndWildBytesHarmNobody) {
     Road road({.scenario = card("")});
@@ -107,9 +119,14 @@ TEST(Bad_Data, NoWildByteReachesAClient) {
             values += (values.empty() ? "\"" : ", \"") + name + R"(": {"bytes": "41FF80C328F09F"})";
         return "{" + values + "}";
     };
-    Road road({.scenario = card(R"("adapterAttributes": )" + wild(ADAPTER_TEXTS) +
-                                R"(, "portAttributes": )" + wild(PORT_TEXTS))});
+    std::string scenario =
+        card(R"("adapterAttributes": )" + wild(ADAPTER_TEXTS) + R"(, "portAttributes": )" +
+             wild(PORT_TEXTS));
+    scenario.insert(1, R"("server": {"targetOS": {"bytes": "41FF80C328F09F"}}, )");
+    Road road({.scenario = scenario});
     road.census();
+    EXPECT_EQ(road::first(road, "VLNMPCA_SoftwareIdentity", "TargetOperatingSystems"),
+              "{A\xEF\xBF\xBD\xEF\xBF\xBD\xEF\xBF\xBD(\xEF\xBF\xBD\xEF\xBF\xBD}");
     expect_counts(road, {{"VLNMPCA_EthernetPort", 2}, {"VLNMPCA_Card", 1}, {"VLNMPCA_FCPort", 2}});
     EXPECT_EQ(road::first(road, "VLNMPCA_PortController", "ConfiguredPortSpeed"),
               "A\xEF\xBF\xBD\xEF\xBF\xBD\xEF\xBF\xBD(\xEF\xBF\xBD\xEF\xBF\xBD");

@@ -288,9 +288,12 @@ void create_port_settings(const Settings_Scope& scope) {
     create_statistics(scope);
 }
 
-// Calls body(port, attributes) for each iSCSI port of the device model.
+// Calls body(port, attributes) for each iSCSI port of the device model. There is none where the
+// library has refused to come up.
 template <class Body>
 void for_each_iscsi_port(const ProviderAgent& agent, Body body) {
+    if (!agent.m_pData)
+        return;
     for (const auto& adapter : agent.m_pData->adapters)
         if (adapter->getAdapterType() == ADAPTER_ISCSI)
             for (const auto& port : adapter->getPorts())

@@ -4,6 +4,8 @@
 
 #include <cstdlib>
 #include <fstream>
+#include <map>
+#include <set>
 #include <sstream>
 #include <thread>
 
@@ -65,6 +67,28 @@ TEST(Sweep, EachImplementedChangeHasARow) {
     ASSERT_GT(implemented.size(), 60u);
     for (const std::string& change : implemented)
         EXPECT_TRUE(rows.contains(change)) << change;
+}
+
+// What clients know of a host is asked of it when its library has refused to come up: there is an
+// agent then, with empty stores and without a device model.
+TEST(Refused, WithoutTheLibraryNothingIsChanged) {
+    std::map<std::string, std::vector<hostile::Change>> changes;
+    for (const hostile::Change& change : hostile::read_changes())
+        changes[change.scenario].push_back(change);
+    for (const auto& [scenario, of_host] : changes) {
+        road::Road road({.scenario = scenario});
+        std::vector<hostile::Prepared_Change> prepared;
+        for (const hostile::Change& change : of_host)
+            prepared.emplace_back(road, change);
+        EXPECT_TRUE(road.manager().cleanup(true).ok());
+        vlnsim_restart();
+        vlnsim_fault("AX_InitLib", VLNSIM_EVERY, VLNSIM_STATUS, 1);
+        for (std::size_t i = 0; i < prepared.size(); ++i)
+            EXPECT_NE(prepared[i].make(), "OK 0") << scenario << " " << of_host[i].what;
+        for (const host::Class* known : road.manager().provider_classes())
+            road.enumerate(known->name);
+        EXPECT_EQ(road.enumerate("VLNMPCA_Card").size(), 0u);
+    }
 }
 
 // A card with two kinds of function.

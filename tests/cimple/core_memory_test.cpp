@@ -38,6 +38,9 @@ extern "C" void* __wrap_realloc(void* block, std::size_t size) {
         return block;
     throw std::bad_alloc();
 }
+[[gnu::noinline]] void* operator new(std::size_t size, const std::nothrow_t&) noexcept {
+    return std::malloc(size);
+}
 [[gnu::noinline]] void operator delete(void* block) noexcept {
     std::free(block);
 }
